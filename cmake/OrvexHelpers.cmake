@@ -1,0 +1,63 @@
+# Shared build helpers: warnings, test executables for both builds, fuzz targets.
+
+# Warnings every target of ours gets (third-party code such as GoogleTest does not).
+function(orvex_warnings target)
+  target_compile_options(${target} PRIVATE -Wall -Wextra -Wshadow -Wno-unused-parameter)
+  if(ORVEX_WERROR)
+    target_compile_options(${target} PRIVATE -Werror)
+  endif()
+endfunction()
+
+# The cross build compiles GoogleTest from the sources Debian ships in /usr/src/googletest.
+macro(orvex_add_windows_gtest)
+  set(gtest_force_shared_crt OFF CACHE BOOL "" FORCE)
+  set(INSTALL_GTEST OFF CACHE BOOL "" FORCE)
+  set(BUILD_GMOCK ON CACHE BOOL "" FORCE)
+  add_subdirectory(/usr/src/googletest ${CMAKE_BINARY_DIR}/googletest EXCLUDE_FROM_ALL)
+  if(NOT TARGET GTest::gtest_main)
+    add_library(GTest::gtest ALIAS gtest)
+    add_library(GTest::gtest_main ALIAS gtest_main)
+    add_library(GTest::gmock ALIAS gmock)
+  endif()
+endmacro()
+
+# orvex_gtest(NAME SOURCES a.cpp b.cpp LIBS lib1 lib2 [WORKING_DIRECTORY dir])
+# A GoogleTest executable. Natively each case becomes its own ctest test; in the Windows build the
+# executable runs once under Wine (tools/wine-run), which keeps Wine's start-up cost to one per file.
+function(orvex_gtest name)
+  cmake_parse_arguments(T "" "WORKING_DIRECTORY" "SOURCES;LIBS" ${ARGN})
+  add_executable(${name} ${T_SOURCES})
+  target_link_libraries(${name} PRIVATE ${T_LIBS} GTest::gtest_main GTest::gmock)
+  orvex_warnings(${name})
+  if(NOT T_WORKING_DIRECTORY)
+    set(T_WORKING_DIRECTORY ${CMAKE_CURRENT_BINARY_DIR})
+  endif()
+  if(WIN32)
+    add_test(NAME ${name} COMMAND ${CMAKE_CROSSCOMPILING_EMULATOR} $<TARGET_FILE:${name}>
+             WORKING_DIRECTORY ${T_WORKING_DIRECTORY})
+  else()
+    gtest_discover_tests(${name} WORKING_DIRECTORY ${T_WORKING_DIRECTORY} DISCOVERY_TIMEOUT 60)
+  endif()
+endfunction()
+
+# orvex_fuzz_target(NAME SOURCES f.cpp LIBS lib)  -- only in the fuzz preset (clang, libFuzzer).
+function(orvex_fuzz_target name)
+  if(NOT ORVEX_FUZZ OR WIN32)
+    return()
+  endif()
+  cmake_parse_arguments(F "" "" "SOURCES;LIBS" ${ARGN})
+  add_executable(${name} ${F_SOURCES})
+  target_link_libraries(${name} PRIVATE ${F_LIBS})
+  target_compile_options(${name} PRIVATE -fsanitize=fuzzer,address,undefined)
+  target_link_options(${name} PRIVATE -fsanitize=fuzzer,address,undefined)
+  set_property(GLOBAL APPEND PROPERTY ORVEX_FUZZ_TARGETS ${name})
+endfunction()
+
+# Portable libraries also get the fuzzer's coverage instrumentation in the fuzz build.
+function(orvex_portable_library name)
+  add_library(${name} STATIC ${ARGN})
+  orvex_warnings(${name})
+  if(ORVEX_FUZZ AND NOT WIN32)
+    target_compile_options(${name} PRIVATE -fsanitize=fuzzer-no-link,address,undefined)
+  endif()
+endfunction()
