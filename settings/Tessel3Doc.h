@@ -1,0 +1,39 @@
+// The explorer's document: the settings the explorer keeps between runs. The constructor loads them
+// from the settings file, the explorer reads and changes the fields while it runs, and the destructor
+// writes them back. Portable: no <windows.h>.
+#pragma once
+
+#include "framework/afxdoc.h"
+#include "settings/IniFile.h"
+
+#include <string>
+
+class CTessel3Doc : public CDocument {
+public:
+    // Loads the settings file beside the extension module (ExplorerSettingsPath).
+    CTessel3Doc();
+    // Loads the given settings file.
+    explicit CTessel3Doc(const std::string& settingsFile);
+    // Saves the fields into the file; a file that cannot be written is passed over silently.
+    ~CTessel3Doc() override;
+
+    std::string m_strPath;      // current folder of the browser          [CurrentPath] Path
+    std::string m_strName;      // selected drawing within m_strPath       [CurrentPath] Name
+    std::string m_strShellPath; // folder selected in the shell tree        [CurrentPath] ShellPath
+    int m_nSplitterSize = 0;    // width of the left pane, 100 when unset  [Size] SplitterSize
+    int m_nWindowWidth = 0;     // frame width, 0 keeps the created size   [Size] WindowWidth
+    int m_nWindowHeight = 0;    //                                          [Size] WindowHeight
+    int m_nPictureWidth = 0;    // thumbnail picture size, used when both  [View] PictureWidth
+    int m_nPictureHeight = 0;   // are non-zero                            [View] PictureHeight
+    int m_nSort = 0;            // 0 name, 1 date, 2 size                  [View] Sort
+
+    // Kept for the document's lifetime so keys the explorer does not know survive the save.
+    CIniFile m_IniFile;
+
+private:
+    void Load(const std::string& settingsFile);
+    void Save();
+};
+
+// The one explorer document, set by its constructor and never cleared; test it for null before use.
+extern CTessel3Doc* g_pTessel3Doc;

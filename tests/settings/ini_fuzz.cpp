@@ -1,0 +1,82 @@
+// Fuzzes the ini reader: any bytes are read, written back and read again; from the first write on the
+// file must stay the same (the store read from it writes the very same bytes).
+#include "settings/IniFile.h"
+
+#include <cstdint>
+#include <cstdio>
+#include <cstdlib>
+#include <string>
+#include <unistd.h>
+
+namespace {
+
+std::string g_fileName;
+
+void WriteBytes(const std::string& fileName, const uint8_t* data, size_t size) {
+    std::FILE* file = std::fopen(fileName.c_str(), "wb");
+    if (!file)
+        std::abort();
+    if (size != 0 && std::fwrite(data, 1, size, file) != size)
+        std::abort();
+    std::fclose(file);
+}
+
+std::string ReadBytes(const std::string& fileName) {
+    std::string bytes;
+    std::FILE* file = std::fopen(fileName.c_str(), "rb");
+    if (!file)
+        std::abort();
+    char buffer[4096];
+    size_t n;
+    while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0)
+        bytes.append(buffer, n);
+    std::fclose(file);
+    return bytes;
+}
+
+bool SameStore(const CIniFile& a, const CIniFile& b) {
+    if (a.GetNumKeys() != b.GetNumKeys())
+        return false;
+    for (int k = 0; k < a.GetNumKeys(); ++k) {
+        if (a.names[k] != b.names[k] || a.keys[k].names.GetSize() != b.keys[k].names.GetSize())
+            return false;
+        for (int j = 0; j < a.keys[k].names.GetSize(); ++j) {
+            if (a.keys[k].names[j] != b.keys[k].names[j] || a.keys[k].values[j] != b.keys[k].values[j])
+                return false;
+        }
+    }
+    return true;
+}
+
+} // namespace
+
+extern "C" int LLVMFuzzerInitialize(int*, char***) {
+    char pattern[] = "/tmp/ini_fuzz_XXXXXX";
+    int fd = ::mkstemp(pattern);
+    if (fd < 0)
+        std::abort();
+    ::close(fd);
+    g_fileName = pattern;
+    std::atexit([] { std::remove(g_fileName.c_str()); });
+    return 0;
+}
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+    WriteBytes(g_fileName, data, size);
+
+    CIniFile first(g_fileName);
+    if (!first.ReadFile())
+        std::abort();
+    first.WriteFile();
+    const std::string written = ReadBytes(g_fileName);
+
+    CIniFile second(g_fileName);
+    if (!second.ReadFile())
+        std::abort();
+    if (!SameStore(first, second))
+        std::abort();
+    second.WriteFile();
+    if (ReadBytes(g_fileName) != written)
+        std::abort();
+    return 0;
+}
