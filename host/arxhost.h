@@ -32,8 +32,8 @@ typedef HWND__* HWND;
 
 // ---- Status codes ----------------------------------------------------------------------------------
 enum : int {
-    RTNORM = 5100,  // request succeeded
-    RTNONE = 5000,  // no result
+    RTNORM = 5100, // request succeeded
+    RTNONE = 5000, // no result
     RTERROR = -5001,
     RTCAN = -5002,
     RTREJ = -5003,
@@ -172,11 +172,11 @@ public:
     virtual void addRef() = 0;
     virtual void release() = 0;
     virtual long numRefs() const = 0;
-    virtual void* sysData() = 0;         // the module's instance handle
-    virtual void deleteModule() = 0;     // destroys the module object (frees it with odrxFree)
+    virtual void* sysData() = 0;     // the module's instance handle
+    virtual void deleteModule() = 0; // destroys the module object (frees it with odrxFree)
     virtual OdString moduleName() const = 0;
-    virtual void initApp() = 0;          // load notification
-    virtual void uninitApp() = 0;        // unload notification
+    virtual void initApp() = 0;   // load notification
+    virtual void uninitApp() = 0; // unload notification
 
 protected:
     ~OdRxModule() = default;
@@ -184,33 +184,33 @@ protected:
 
 // ---- Operations --------------------------------------------------------------------------------------
 // X(return type, export name, parameter list). This is the one list of names the library binds.
-#define ORVEX_HOST_OPERATIONS(X)                                                                            \
-    X(int, acedDefun, (const wchar_t* name, int funcNumber))                                                \
-    X(int, acedUndef, (const wchar_t* name, int funcNumber))                                                \
-    X(int, acedGetFunCode, ())                                                                              \
-    X(resbuf*, acedGetArgs, ())                                                                             \
-    X(int, acedRetList, (const resbuf* list))                                                               \
-    X(int, acedRetNil, ())                                                                                  \
-    X(int, acedRetVoid, ())                                                                                 \
-    X(resbuf*, acutBuildList, (int restype, ...))                                                           \
-    X(resbuf*, acutNewRb, (int restype))                                                                    \
-    X(int, acutRelRb, (resbuf * rb))                                                                        \
-    X(int, acutPrintf, (const wchar_t* format, ...))                                                        \
-    X(int, acedAlert, (const wchar_t* text))                                                                \
-    X(void, acdbFail, (const wchar_t* text))                                                                \
-    X(AcApDocManager*, acDocManagerPtr, ())                                                                 \
-    X(AcRxDictionary*, acrxSysRegistry, ())                                                                 \
-    X(const AcRxClass*, acrxDynamicLinkerDesc, ())                                                          \
-    X(HWND, acedGetAcadFrame, ())                                                                           \
-    X(HWND, acedGetAcadWinApp, ())                                                                          \
-    X(HWND, acedGetAcadDwgView, ())                                                                         \
-    X(bool, acdbGetLayerColor, (const wchar_t* layerName, int* colorIndex))                                 \
-    X(bool, acedSetColorDialog, (int* colorIndex, bool allowMetaColor, int currentLayerColor))              \
-    X(std::uint32_t, acedGetRGB, (int colorIndex))                                                          \
+#define ORVEX_HOST_OPERATIONS(X)                                                                             \
+    X(int, acedDefun, (const wchar_t* name, int funcNumber))                                                 \
+    X(int, acedUndef, (const wchar_t* name, int funcNumber))                                                 \
+    X(int, acedGetFunCode, ())                                                                               \
+    X(resbuf*, acedGetArgs, ())                                                                              \
+    X(int, acedRetList, (const resbuf* list))                                                                \
+    X(int, acedRetNil, ())                                                                                   \
+    X(int, acedRetVoid, ())                                                                                  \
+    X(resbuf*, acutBuildList, (int restype, ...))                                                            \
+    X(resbuf*, acutNewRb, (int restype))                                                                     \
+    X(int, acutRelRb, (resbuf * rb))                                                                         \
+    X(int, acutPrintf, (const wchar_t* format, ...))                                                         \
+    X(int, acedAlert, (const wchar_t* text))                                                                 \
+    X(void, acdbFail, (const wchar_t* text))                                                                 \
+    X(AcApDocManager*, acDocManagerPtr, ())                                                                  \
+    X(AcRxDictionary*, acrxSysRegistry, ())                                                                  \
+    X(const AcRxClass*, acrxDynamicLinkerDesc, ())                                                           \
+    X(HWND, acedGetAcadFrame, ())                                                                            \
+    X(HWND, acedGetAcadWinApp, ())                                                                           \
+    X(HWND, acedGetAcadDwgView, ())                                                                          \
+    X(bool, acdbGetLayerColor, (const wchar_t* layerName, int* colorIndex))                                  \
+    X(bool, acedSetColorDialog, (int* colorIndex, bool allowMetaColor, int currentLayerColor))               \
+    X(std::uint32_t, acedGetRGB, (int colorIndex))                                                           \
     X(bool, acdbDisplayPreviewFromDwg, (const wchar_t* fileName, HWND window, const std::uint32_t* bgColor)) \
-    X(int, onLoadArxApp, (const wchar_t* moduleFileName))                                                   \
-    X(int, onUnloadArxApp, (const wchar_t* moduleFileName))                                                 \
-    X(void*, odrxAlloc, (std::size_t size))                                                                 \
+    X(int, onLoadArxApp, (const wchar_t* moduleFileName))                                                    \
+    X(int, onUnloadArxApp, (const wchar_t* moduleFileName))                                                  \
+    X(void*, odrxAlloc, (std::size_t size))                                                                  \
     X(void, odrxFree, (void* block))
 
 // Meanings, for the host's implementer:
@@ -234,6 +234,6 @@ protected:
 extern "C" {
 typedef AcRx::AppRetCode (*AcrxEntryPointFn)(AcRx::AppMsgCode msg, void* appId);
 typedef int (*AcrxGetApiVersionFn)(std::uint32_t* major, std::uint32_t* minor, std::uint32_t* build,
-                                  std::uint32_t* patch);
+                                   std::uint32_t* patch);
 typedef OdRxModule* (*OdrxCreateModuleObjectFn)();
 }

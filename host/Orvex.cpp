@@ -1,0 +1,158 @@
+#include "host/Orvex.h"
+
+#include "host/AdsListUser.h"
+#include "host/HostApi.h"
+#include "host/TextConv.h"
+#include "settings/IniFile.h"
+#include "settings/Tessel3Doc.h"
+
+#include <cstring>
+#include <cwchar>
+
+char g_szAcceptCaption[kCaptionChars] = "OK";
+char g_szCancelCaption[kCaptionChars] = "CANCEL";
+char g_szStartShellPath[kPathChars] = "";
+HWND g_hHostMainWnd = nullptr;
+
+namespace {
+
+const wchar_t kMissingParameters[] = L"\nMissing parametrs\n";
+const wchar_t kNotShort[] = L"\nArgument should be an short";
+
+void PrintAndAlert(const wchar_t* text) {
+    acutPrintf(L"%ls", text);
+    acedAlert(text);
+}
+
+// Copies a narrow text into a fixed buffer; false (buffer untouched) when it does not fit.
+template <std::size_t N> bool CopyBounded(char (&buffer)[N], const std::string& text) {
+    if (text.size() + 1 > N)
+        return false;
+    std::memcpy(buffer, text.c_str(), text.size() + 1);
+    return true;
+}
+
+// A string argument that does not fit its buffer is refused as a whole: better no start than a wrong one.
+bool RefuseTooLong(const wchar_t* what, std::size_t length, std::size_t limit) {
+    if (length < limit)
+        return false;
+    acutPrintf(L"\nOrvex: the %ls is too long (%d characters; at most %d)\n", what, static_cast<int>(length),
+               static_cast<int>(limit - 1));
+    acedAlert(L"\nOrvex: an argument is too long");
+    return true;
+}
+
+void AppendParameters(ads_list_user& list, const std::string& folder) {
+    CIniFile ini;
+    ini.SetPath(folder + "datains.ini");
+    if (ini.ReadFile()) {
+        const std::string layer = ini.GetValue("Default Parameters", "Layer");
+        const std::string color = ini.GetValue("Default Parameters", "Color");
+        const std::string command = ini.GetValue("Default Parameters", "Lisp command");
+        list + BeginList() + layer.c_str() + color.c_str() + command.c_str() + EndList();
+    } else {
+        list + BeginList() + "" + "" + "" + EndList();
+    }
+}
+
+} // namespace
+
+std::string PickedPath(CTessel3Doc& doc) {
+    if (doc.m_strPath.empty() || doc.m_strPath.back() != '\\')
+        doc.m_strPath += '\\';
+    return doc.m_strPath + doc.m_strName;
+}
+
+namespace {
+PickerPlatform* g_pPickerPlatform = nullptr;
+} // namespace
+
+PickerPlatform& CurrentPickerPlatform() {
+    return g_pPickerPlatform ? *g_pPickerPlatform : DefaultPickerPlatform();
+}
+void SetPickerPlatform(PickerPlatform* platform) {
+    g_pPickerPlatform = platform;
+}
+
+int Orvex() {
+    return OrvexWith(CurrentPickerPlatform());
+}
+
+int OrvexWith(PickerPlatform& platform) {
+    resbuf* args = acedGetArgs();
+    if (!args) {
+        PrintAndAlert(kMissingParameters);
+        return 0;
+    }
+    if (args->restype != RTSHORT) {
+        acutPrintf(L"%ls", kNotShort);
+        acedAlert(kNotShort);
+        acutRelRb(args);
+        return 0;
+    }
+    const resbuf* second = args->rbnext;
+    if (!second) {
+        acutPrintf(L"%ls", kMissingParameters);
+        acedAlert(kNotShort); // the alert repeats the type message on purpose
+        acutRelRb(args);
+        return 0;
+    }
+    const resbuf* path = second->rbnext;
+    const resbuf* accept = path ? path->rbnext : nullptr;
+    const resbuf* cancel = accept ? accept->rbnext : nullptr;
+    auto isString = [](const resbuf* rb) { return rb && rb->restype == RTSTR && rb->resval.rstring; };
+    if (second->restype != RTSHORT || !isString(path) || !isString(accept) || !isString(cancel)) {
+        acutRelRb(args);
+        acedAlert(kNotShort);
+        acutPrintf(L"%ls", kNotShort);
+        return 0;
+    }
+
+    // Copies of the three texts, bounded like the buffers they end up in.
+    const std::size_t pathLength = std::wcslen(path->resval.rstring);
+    const std::size_t acceptLength = std::wcslen(accept->resval.rstring);
+    const std::size_t cancelLength = std::wcslen(cancel->resval.rstring);
+    if (RefuseTooLong(L"start path", pathLength, kPathChars) ||
+        RefuseTooLong(L"accept caption", acceptLength, kCaptionChars) ||
+        RefuseTooLong(L"cancel caption", cancelLength, kCaptionChars)) {
+        acutRelRb(args);
+        return 0;
+    }
+    const std::wstring startPath(path->resval.rstring, pathLength);
+    const std::wstring acceptText(accept->resval.rstring, acceptLength);
+    const std::wstring cancelText(cancel->resval.rstring, cancelLength);
+    acutRelRb(args);
+
+    const std::string acceptCaption = acceptText.empty() ? "Ok" : NarrowAnsi(acceptText);
+    const std::string cancelCaption = cancelText.empty() ? "Cancel" : NarrowAnsi(cancelText);
+    const std::string narrowPath = NarrowAnsi(startPath);
+    if (!CopyBounded(g_szAcceptCaption, acceptCaption) || !CopyBounded(g_szCancelCaption, cancelCaption)) {
+        RefuseTooLong(L"caption", kCaptionChars, kCaptionChars); // multi-byte code pages can grow a text
+        return 0;
+    }
+
+    g_szStartShellPath[0] = 0;
+    if (!narrowPath.empty()) {
+        g_hHostMainWnd = acedGetAcadWinApp();
+        const std::string shellPath = platform.StartShellPath(narrowPath);
+        if (!CopyBounded(g_szStartShellPath, shellPath))
+            acutPrintf(L"\nOrvex: the start folder's shell path is too long; starting at the last folder\n");
+    }
+
+    const int result = platform.RunDialog();
+    CTessel3Doc* doc = platform.Document();
+    if (result == 1 && doc) {
+        const std::string picked = PickedPath(*doc);
+        ads_list_user list;
+        list + picked.c_str();
+        AppendParameters(list, doc->m_strPath);
+        list.RetList();
+        list.Release();
+    } else {
+        acedRetNil();
+    }
+
+    platform.DestroyDocument();
+    platform.FocusHostView();
+    return 1;
+}

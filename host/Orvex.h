@@ -1,0 +1,48 @@
+// The library's one LISP function and the process-wide values it hands to the explorer.
+#pragma once
+
+#include "host/arxhost.h"
+
+#include <string>
+
+// Bounds of the fixed text buffers. Arguments that do not fit are refused with a message.
+enum : int {
+    kCaptionChars = 128,
+    kPathChars = 260,
+};
+
+extern char g_szAcceptCaption[kCaptionChars]; // "OK" until the first call
+extern char g_szCancelCaption[kCaptionChars]; // "CANCEL" until the first call
+extern char g_szStartShellPath[kPathChars];   // display-name path of the start folder, or empty
+extern HWND g_hHostMainWnd;                   // the host application's main window
+
+// What the picker needs from the platform: the shell, the run dialog and the explorer document.
+// The Windows build supplies the real ones; unit tests supply fakes.
+class CTessel3Doc;
+struct PickerPlatform {
+    virtual ~PickerPlatform() = default;
+    // The shell's display-name path of a file-system path (folder part only), or "" when it has none.
+    virtual std::string StartShellPath(const std::string& fileSystemPath) = 0;
+    // Runs the invisible modal dialog that hosts the explorer; 1 = picked, 2 = cancelled.
+    virtual int RunDialog() = 0;
+    // The explorer document of this run (created while the dialog initialised), or nullptr.
+    virtual CTessel3Doc* Document() = 0;
+    // Destroys the explorer document, which saves the explorer's settings.
+    virtual void DestroyDocument() = 0;
+    // Gives the keyboard focus back to the host's active drawing view.
+    virtual void FocusHostView() = 0;
+};
+
+// The platform `Orvex` uses: the built-in one unless a test installed another (nullptr restores it).
+PickerPlatform& CurrentPickerPlatform();
+void SetPickerPlatform(PickerPlatform* platform);
+PickerPlatform& DefaultPickerPlatform(); // per build: Windows shell and dialog, or a cancelling stand-in
+
+// `Orvex`: checks the five LISP arguments, runs the explorer and sets the LISP result.
+// Returns 1 after a completed run (picked or cancelled), 0 after an argument error.
+int Orvex();
+int OrvexWith(PickerPlatform& platform);
+
+// The path picked in the explorer's document: its folder (given a trailing separator, in the document
+// itself) followed by its current file name. Exposed for the result list and its tests.
+std::string PickedPath(CTessel3Doc& doc);

@@ -1,0 +1,105 @@
+#include "FakeHost.h"
+#include "host/EntryPoint.h"
+#include "host/Orvex.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+struct CountingPlatform : PickerPlatform {
+    int runs = 0;
+    std::string StartShellPath(const std::string&) override { return {}; }
+    int RunDialog() override {
+        ++runs;
+        return 2;
+    }
+    CTessel3Doc* Document() override { return nullptr; }
+    void DestroyDocument() override {}
+    void FocusHostView() override {}
+};
+
+struct EntryPointTest : ::testing::Test {
+    FakeHost host;
+    CountingPlatform platform;
+    void SetUp() override { SetPickerPlatform(&platform); }
+    void TearDown() override { SetPickerPlatform(nullptr); }
+    void* appId = reinterpret_cast<void*>(std::uintptr_t{42});
+};
+
+TEST_F(EntryPointTest, UnusedMessagesDoNothing) {
+    for (int message : {0, 2, 6, 7, 100, -1}) {
+        EXPECT_EQ(DispatchEntryMessage(message, appId), AcRx::kRetOK);
+    }
+    EXPECT_TRUE(host.calls.empty());
+    EXPECT_TRUE(host.events.empty());
+    EXPECT_EQ(host.result, "unset");
+}
+
+TEST_F(EntryPointTest, InitialisationUnlocksAndRegistersAsMdiAware) {
+    EXPECT_EQ(DispatchEntryMessage(AcRx::kInitAppMsg, appId), AcRx::kRetOK);
+    EXPECT_EQ(host.calls, (std::vector<std::string>{"lookup DynamicLinker", "unlock 42",
+                                                    "lookup DynamicLinker", "mdi 42"}));
+}
+
+TEST_F(EntryPointTest, DrawingLoadDefinesAndUnloadUndefinesOrvexAsCodeZero) {
+    DispatchEntryMessage(AcRx::kLoadDwgMsg, appId);
+    DispatchEntryMessage(AcRx::kUnloadDwgMsg, appId);
+    EXPECT_EQ(host.calls, (std::vector<std::string>{"defun Orvex 0", "undef Orvex 0"}));
+}
+
+TEST_F(EntryPointTest, FailedDefinitionStillAnswersOk) {
+    host.failDefunAt = 1;
+    EXPECT_EQ(DispatchEntryMessage(AcRx::kLoadDwgMsg, appId), AcRx::kRetOK);
+    EXPECT_EQ(host.calls.size(), 1u);
+}
+
+TEST_F(EntryPointTest, InvokeWithCodeZeroRunsThePickerOnce) {
+    host.funCode = 0;
+    host.AddShort(1);
+    host.AddShort(2);
+    host.AddString(L"");
+    host.AddString(L"");
+    host.AddString(L"");
+    DispatchEntryMessage(AcRx::kInvkSubrMsg, appId);
+    EXPECT_EQ(platform.runs, 1);
+    EXPECT_EQ(host.result, "nil");
+}
+
+TEST_F(EntryPointTest, InvokeWithAnotherCodeRunsNothingAndLeavesNoValue) {
+    for (int code : {-1, -5, 1, 2}) {
+        host.funCode = code;
+        host.result = "unset";
+        DispatchEntryMessage(AcRx::kInvkSubrMsg, appId);
+        EXPECT_EQ(host.result, "void") << code;
+    }
+    EXPECT_EQ(platform.runs, 0);
+}
+
+TEST(ApiVersionTest, ReportsNineteenFiveZeroZero) {
+    std::uint32_t v[4] = {9, 9, 9, 9};
+    ApiVersion(&v[0], &v[1], &v[2], &v[3]);
+    EXPECT_EQ(v[0], 19u);
+    EXPECT_EQ(v[1], 5u);
+    EXPECT_EQ(v[2], 0u);
+    EXPECT_EQ(v[3], 0u);
+}
+
+TEST(HostApiTest, MissingOperationDegradesAndIsReportedOnce) {
+    SetHostApi(HostApi{});
+    EXPECT_EQ(acedDefun(L"Orvex", 0), RTERROR);
+    EXPECT_EQ(acutNewRb(RTSHORT), nullptr);
+    EXPECT_EQ(acedGetArgs(), nullptr);
+    EXPECT_NE(MissingHostOperations().find("acedDefun"), std::string::npos);
+    // Only once per operation, with printing available:
+    FakeHost host;
+    HostApi api = Host();
+    api.acedAlert = nullptr;
+    SetHostApi(api);
+    acedAlert(L"x");
+    acedAlert(L"y");
+    ASSERT_EQ(host.events.size(), 1u);
+    EXPECT_EQ(host.events[0],
+              "print:\nOrvex1: the host does not provide acedAlert; that feature is not available.\n");
+}
+
+} // namespace
