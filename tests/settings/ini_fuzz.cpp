@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
+#include <cstring>
 #include <string>
 #include <unistd.h>
 
@@ -51,8 +52,14 @@ bool SameStore(const CIniFile& a, const CIniFile& b) {
 } // namespace
 
 extern "C" int LLVMFuzzerInitialize(int*, char***) {
-    char pattern[] = "/tmp/ini_fuzz_XXXXXX";
+    // Memory-backed when available: every input is written and read three times.
+    char pattern[] = "/dev/shm/ini_fuzz_XXXXXX";
+    char fallback[] = "/tmp/ini_fuzz_XXXXXX";
     int fd = ::mkstemp(pattern);
+    if (fd < 0) {
+        fd = ::mkstemp(fallback);
+        std::memcpy(pattern, fallback, sizeof fallback);
+    }
     if (fd < 0)
         std::abort();
     ::close(fd);
