@@ -1,0 +1,17 @@
+// The invisible modal dialog whose loop the explorer lives in. The explorer ends it by posting the
+// first application message with 1 (picked) or 2 (cancelled).
+#pragma once
+
+#include "framework/afxwin.h"
+
+constexpr UINT IDD_DIALOG_RUN = 200;
+constexpr UINT WM_ORVEX_RESULT = WM_APP; // wParam: 1 accept, 2 cancel
+
+class CDialogRun : public CDialog {
+public:
+    CDialogRun() : CDialog(IDD_DIALOG_RUN, nullptr) {}
+
+protected:
+    bool OnInitDialog() override;
+    bool PreTranslateMessage(MSG* pMsg) override;
+};
