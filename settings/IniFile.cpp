@@ -3,6 +3,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <sys/stat.h>
+#include <utility>
 
 #ifdef _WIN32
 #include <share.h>
@@ -127,7 +128,7 @@ bool CIniFile::ReadFile() {
         std::string::size_type eq = line.find('=');
         std::string valuename = eq == std::string::npos ? std::string() : line.substr(0, eq);
         std::string value = line.substr(valuename.size() + 1);
-        SetValue(keyname, valuename, value, true);
+        SetValue(keyname, std::move(valuename), std::move(value), true);
     }
 
     std::fclose(file);
@@ -219,7 +220,7 @@ bool CIniFile::SetValue(std::string keyname, std::string valuename, std::string 
         keys.SetSize(keys.GetSize() + 1);
         names.SetSize(names.GetSize() + 1);
         keynum = names.GetSize() - 1;
-        names[keynum] = keyname;
+        names[keynum] = std::move(keyname);
     }
 
     int valuenum = FindValue(keynum, valuename);
@@ -230,7 +231,7 @@ bool CIniFile::SetValue(std::string keyname, std::string valuename, std::string 
         section.names.SetSize(section.names.GetSize() + 1);
         section.values.SetSize(section.names.GetSize() + 1);
         valuenum = section.names.GetSize() - 1;
-        section.names[valuenum] = valuename;
+        section.names[valuenum] = std::move(valuename);
     }
 
     keys[keynum].values[valuenum] = std::move(value);
