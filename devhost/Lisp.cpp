@@ -1,0 +1,539 @@
+#include "devhost/Lisp.h"
+
+#include "devhost/ResultBuffers.h"
+#include "devhost/Text.h"
+
+#include <cerrno>
+#include <cinttypes>
+#include <climits>
+#include <cmath>
+#include <cstdio>
+#include <cstdlib>
+#include <cwctype>
+
+namespace devhost {
+namespace {
+
+constexpr int kMaxListDepth = 64;
+
+bool IsSpace(wchar_t c) {
+    return c == L' ' || c == L'\t' || c == L'\r' || c == L'\n' || c == L'\f' || c == L'\v';
+}
+
+bool IsDelimiter(wchar_t c) {
+    return IsSpace(c) || c == L'(' || c == L')' || c == L'"' || c == L'\'' || c == L';';
+}
+
+bool IsDigit(wchar_t c) {
+    return c >= L'0' && c <= L'9';
+}
+
+// A short excerpt of the user's text for an error line: one line, control characters spelled out.
+std::wstring Excerpt(std::wstring_view text) {
+    constexpr std::size_t kMax = 40;
+    std::wstring out = EscapeControls(text.substr(0, kMax));
+    if (text.size() > kMax)
+        out += L"...";
+    return out;
+}
+
+bool EqualsIgnoreCase(std::wstring_view a, std::wstring_view b) {
+    if (a.size() != b.size())
+        return false;
+    for (std::size_t i = 0; i < a.size(); ++i)
+        if (std::towlower(a[i]) != std::towlower(b[i]))
+            return false;
+    return true;
+}
+
+bool IsIntegerToken(std::wstring_view token) {
+    std::size_t i = (token[0] == L'+' || token[0] == L'-') ? 1 : 0;
+    if (i == token.size())
+        return false;
+    for (; i < token.size(); ++i)
+        if (!IsDigit(token[i]))
+            return false;
+    return true;
+}
+
+// [+-] (digits [. digits*] | . digits) [(e|E) [+-] digits], with a dot or an exponent.
+bool IsRealToken(std::wstring_view token) {
+    std::size_t i = (token[0] == L'+' || token[0] == L'-') ? 1 : 0;
+    std::size_t digits = 0;
+    bool dot = false, exponent = false;
+    for (; i < token.size() && IsDigit(token[i]); ++i)
+        ++digits;
+    if (i < token.size() && token[i] == L'.') {
+        dot = true;
+        for (++i; i < token.size() && IsDigit(token[i]); ++i)
+            ++digits;
+    }
+    if (digits == 0)
+        return false;
+    if (i < token.size() && (token[i] == L'e' || token[i] == L'E')) {
+        exponent = true;
+        ++i;
+        if (i < token.size() && (token[i] == L'+' || token[i] == L'-'))
+            ++i;
+        std::size_t exponentDigits = 0;
+        for (; i < token.size() && IsDigit(token[i]); ++i)
+            ++exponentDigits;
+        if (exponentDigits == 0)
+            return false;
+    }
+    return i == token.size() && (dot || exponent);
+}
+
+class Reader {
+public:
+    explicit Reader(std::wstring_view text) : m_text(text) {}
+
+    bool ReadCall(LispCall& call) {
+        SkipSpace();
+        if (AtEnd())
+            return Fail(L"empty expression");
+        if (Peek() != L'(')
+            return Fail(L"expected a call in parentheses, found: " + Excerpt(m_text.substr(m_pos)));
+        ++m_pos;
+        SkipSpace();
+        if (AtEnd())
+            return Fail(L"missing ) at the end of the call");
+        if (Peek() == L')')
+            return Fail(L"no function in ()");
+        if (IsDelimiter(Peek()))
+            return Fail(L"bad function: " + Excerpt(m_text.substr(m_pos, 1)));
+        const std::wstring_view name = ReadToken();
+        if (IsIntegerToken(name) || IsRealToken(name))
+            return Fail(L"bad function: " + Excerpt(name));
+        call.function.assign(name.begin(), name.end());
+        call.args.clear();
+        for (;;) {
+            SkipSpace();
+            if (AtEnd())
+                return Fail(L"missing ) at the end of the call");
+            if (Peek() == L')') {
+                ++m_pos;
+                break;
+            }
+            LispValue value;
+            if (!ReadValue(value, 0))
+                return false;
+            if (value.kind != LispValue::Kind::Nil)
+                call.args.push_back(std::move(value));
+        }
+        SkipSpace();
+        if (!AtEnd())
+            return Fail(L"extra text after the call: " + Excerpt(m_text.substr(m_pos)));
+        return true;
+    }
+
+    const std::wstring& Error() const { return m_error; }
+
+private:
+    bool AtEnd() const { return m_pos >= m_text.size(); }
+    wchar_t Peek() const { return m_text[m_pos]; }
+
+    bool Fail(std::wstring message) {
+        m_error = std::move(message);
+        return false;
+    }
+
+    void SkipSpace() {
+        while (!AtEnd()) {
+            if (IsSpace(Peek())) {
+                ++m_pos;
+            } else if (Peek() == L';') { // comment to the end of the line
+                while (!AtEnd() && Peek() != L'\n')
+                    ++m_pos;
+            } else {
+                break;
+            }
+        }
+    }
+
+    std::wstring_view ReadToken() {
+        const std::size_t start = m_pos;
+        while (!AtEnd() && !IsDelimiter(Peek()))
+            ++m_pos;
+        return m_text.substr(start, m_pos - start);
+    }
+
+    bool ReadValue(LispValue& value, int depth) {
+        const wchar_t c = Peek();
+        if (c == L'"')
+            return ReadString(value);
+        if (c == L'\'') {
+            ++m_pos;
+            SkipSpace();
+            if (AtEnd() || Peek() != L'(')
+                return Fail(L"only lists can be quoted: '" + Excerpt(m_text.substr(m_pos)));
+            return ReadList(value, depth + 1);
+        }
+        if (c == L'(') {
+            if (depth == 0)
+                return Fail(L"nested calls are not evaluated; quote lists as '(...)");
+            return ReadList(value, depth + 1);
+        }
+        if (c == L')')
+            return Fail(L"unexpected )");
+        return ReadAtom(value);
+    }
+
+    bool ReadList(LispValue& value, int depth) {
+        if (depth > kMaxListDepth)
+            return Fail(L"lists nested too deeply");
+        ++m_pos; // (
+        value.kind = LispValue::Kind::List;
+        value.items.clear();
+        for (;;) {
+            SkipSpace();
+            if (AtEnd())
+                return Fail(L"missing ) at the end of a list");
+            if (Peek() == L')') {
+                ++m_pos;
+                break;
+            }
+            LispValue item;
+            if (!ReadValue(item, depth))
+                return false;
+            value.items.push_back(std::move(item));
+        }
+        if (value.items.empty()) // '() is nil
+            value.kind = LispValue::Kind::Nil;
+        return true;
+    }
+
+    bool ReadString(LispValue& value) {
+        const std::size_t start = m_pos;
+        ++m_pos; // opening quote
+        value.kind = LispValue::Kind::String;
+        value.text.clear();
+        while (!AtEnd()) {
+            wchar_t c = m_text[m_pos++];
+            if (c == L'"')
+                return true;
+            if (c == L'\\') {
+                if (AtEnd())
+                    break;
+                const wchar_t e = m_text[m_pos++];
+                switch (e) {
+                case L'\\':
+                case L'"':
+                    c = e;
+                    break;
+                case L'n':
+                    c = L'\n';
+                    break;
+                case L'r':
+                    c = L'\r';
+                    break;
+                case L't':
+                    c = L'\t';
+                    break;
+                case L'e':
+                    c = 27;
+                    break;
+                default:
+                    return Fail(L"unknown escape \\" + Excerpt(std::wstring_view(&e, 1)) +
+                                L" in a string (write a backslash as \\\\)");
+                }
+            }
+            value.text += c;
+        }
+        return Fail(L"unterminated string: " + Excerpt(m_text.substr(start)));
+    }
+
+    bool ReadAtom(LispValue& value) {
+        const std::wstring_view token = ReadToken();
+        if (token.empty()) // a delimiter the caller does not handle, such as a stray quote
+            return Fail(L"unexpected character: " + Excerpt(m_text.substr(m_pos, 1)));
+        if (IsIntegerToken(token)) {
+            std::string narrow(token.begin(), token.end());
+            errno = 0;
+            const long long number = std::strtoll(narrow.c_str(), nullptr, 10);
+            if (errno == ERANGE || number < INT32_MIN || number > INT32_MAX)
+                return Fail(L"integer out of range: " + Excerpt(token));
+            value.kind =
+                (number >= SHRT_MIN && number <= SHRT_MAX) ? LispValue::Kind::Short : LispValue::Kind::Long;
+            value.number = static_cast<long>(number);
+            return true;
+        }
+        if (IsRealToken(token)) {
+            std::string narrow(token.begin(), token.end());
+            const double real = std::strtod(narrow.c_str(), nullptr);
+            if (!std::isfinite(real))
+                return Fail(L"real out of range: " + Excerpt(token));
+            value.kind = LispValue::Kind::Real;
+            value.real = real;
+            return true;
+        }
+        if (EqualsIgnoreCase(token, L"nil")) {
+            value.kind = LispValue::Kind::Nil;
+            return true;
+        }
+        if (EqualsIgnoreCase(token, L"T")) {
+            value.kind = LispValue::Kind::True;
+            return true;
+        }
+        return Fail(L"cannot pass the symbol " + Excerpt(token) +
+                    L" (only numbers, strings, nil, T and quoted lists)");
+    }
+
+    std::wstring_view m_text;
+    std::size_t m_pos = 0;
+    std::wstring m_error;
+};
+
+// Appends the nodes of one value to a chain; false when out of memory.
+bool AppendValue(const LispValue& value, resbuf*& head, resbuf*& tail) {
+    auto append = [&](int type) -> resbuf* {
+        resbuf* node = NewNode(type);
+        if (node) {
+            (tail ? tail->rbnext : head) = node;
+            tail = node;
+        }
+        return node;
+    };
+    switch (value.kind) {
+    case LispValue::Kind::Short: {
+        resbuf* node = append(RTSHORT);
+        if (!node)
+            return false;
+        node->resval.rint = static_cast<short>(value.number);
+        return true;
+    }
+    case LispValue::Kind::Long: {
+        resbuf* node = append(RTLONG);
+        if (!node)
+            return false;
+        node->resval.rlong = static_cast<std::int32_t>(value.number);
+        return true;
+    }
+    case LispValue::Kind::Real: {
+        resbuf* node = append(RTREAL);
+        if (!node)
+            return false;
+        node->resval.rreal = value.real;
+        return true;
+    }
+    case LispValue::Kind::String: {
+        wchar_t* copy = DuplicateString(value.text.c_str());
+        if (!copy)
+            return false;
+        resbuf* node = append(RTSTR);
+        if (!node) {
+            std::free(copy);
+            return false;
+        }
+        node->resval.rstring = copy;
+        return true;
+    }
+    case LispValue::Kind::List:
+        if (!append(RTLB))
+            return false;
+        for (const LispValue& item : value.items)
+            if (!AppendValue(item, head, tail))
+                return false;
+        return append(RTLE) != nullptr;
+    case LispValue::Kind::Nil:
+        return append(RTNIL) != nullptr;
+    case LispValue::Kind::True:
+        return append(kRtT) != nullptr;
+    }
+    return false;
+}
+
+std::wstring Widen(const char* text) {
+    return std::wstring(text, text + std::char_traits<char>::length(text));
+}
+
+void PrintAtom(const resbuf* node, std::wstring& out) {
+    switch (node->restype) {
+    case RTSHORT:
+        out += std::to_wstring(node->resval.rint);
+        break;
+    case RTLONG:
+        out += std::to_wstring(node->resval.rlong);
+        break;
+    case RTREAL:
+        out += PrintLispReal(node->resval.rreal);
+        break;
+    case RTSTR:
+        out += PrintLispString(node->resval.rstring ? std::wstring_view(node->resval.rstring)
+                                                    : std::wstring_view());
+        break;
+    case RTPOINT:
+        out += L"(" + PrintLispReal(node->resval.rpoint[0]) + L" " + PrintLispReal(node->resval.rpoint[1]) +
+               L" " + PrintLispReal(node->resval.rpoint[2]) + L")";
+        break;
+    case RTENAME: {
+        char buffer[40];
+        std::snprintf(buffer, sizeof buffer, "<Entity name: %" PRIx64 ">",
+                      static_cast<std::uint64_t>(node->resval.rlname[0]));
+        out += Widen(buffer);
+        break;
+    }
+    case RTNIL:
+        out += L"nil";
+        break;
+    case kRtT:
+        out += L"T";
+        break;
+    case kRtDotE:
+        out += L".";
+        break;
+    default:
+        out += L"<resbuf type " + std::to_wstring(node->restype) + L">";
+    }
+}
+
+} // namespace
+
+bool ReadLispCall(std::wstring_view text, LispCall& call, std::wstring& error) {
+    Reader reader(text);
+    try {
+        if (reader.ReadCall(call))
+            return true;
+        error = reader.Error();
+    } catch (const std::bad_alloc&) {
+        error = L"out of memory";
+    }
+    return false;
+}
+
+resbuf* BuildArgumentChain(const std::vector<LispValue>& args) {
+    resbuf* head = nullptr;
+    resbuf* tail = nullptr;
+    for (const LispValue& value : args) {
+        if (!AppendValue(value, head, tail)) {
+            FreeChain(head);
+            return nullptr;
+        }
+    }
+    return head;
+}
+
+std::wstring PrintLispString(std::wstring_view text) {
+    std::wstring out = L"\"";
+    for (wchar_t c : text) {
+        switch (c) {
+        case L'\\':
+            out += L"\\\\";
+            break;
+        case L'"':
+            out += L"\\\"";
+            break;
+        case L'\n':
+            out += L"\\n";
+            break;
+        case L'\r':
+            out += L"\\r";
+            break;
+        case L'\t':
+            out += L"\\t";
+            break;
+        case 27:
+            out += L"\\e";
+            break;
+        default:
+            if (static_cast<std::uint32_t>(c) < 0x20 || c == 0x7F) {
+                out += L'\\';
+                out += static_cast<wchar_t>(L'0' + ((c >> 6) & 7));
+                out += static_cast<wchar_t>(L'0' + ((c >> 3) & 7));
+                out += static_cast<wchar_t>(L'0' + (c & 7));
+            } else {
+                out += c;
+            }
+        }
+    }
+    out += L'"';
+    return out;
+}
+
+std::wstring PrintLispReal(double value) {
+    if (std::isnan(value))
+        return L"nan";
+    if (std::isinf(value))
+        return value < 0 ? L"-inf" : L"inf";
+    char buffer[64];
+    std::snprintf(buffer, sizeof buffer, "%.6g", value);
+    std::string text = buffer;
+    const std::size_t exponent = text.find('e');
+    const std::string mantissa = text.substr(0, exponent);
+    if (mantissa.find('.') == std::string::npos)
+        text.insert(mantissa.size(), ".0");
+    return Widen(text.c_str());
+}
+
+std::wstring PrintChain(const resbuf* chain) {
+    // First pass: how many values the chain holds at its top level.
+    int topLevel = 0;
+    int depth = 0;
+    for (const resbuf* node = chain; node; node = node->rbnext) {
+        if (node->restype == RTLB) {
+            if (depth == 0)
+                ++topLevel;
+            ++depth;
+        } else if (node->restype == RTLE) {
+            if (depth > 0)
+                --depth;
+        } else if (depth == 0) {
+            ++topLevel;
+        }
+    }
+    if (topLevel == 0)
+        return L"nil";
+
+    // Second pass: print, with a stack of open groups (where each began and how many items it holds).
+    struct Group {
+        std::size_t start;
+        int items;
+    };
+    std::vector<Group> groups;
+    std::wstring out;
+    if (topLevel > 1) {
+        out += L"(";
+        groups.push_back({0, 0});
+    }
+    const std::size_t outerGroups = groups.size();
+    auto separate = [&]() {
+        if (!groups.empty() && groups.back().items++ > 0)
+            out += L' ';
+    };
+    for (const resbuf* node = chain; node; node = node->rbnext) {
+        if (node->restype == RTLB) {
+            separate();
+            groups.push_back({out.size(), 0});
+            out += L'(';
+        } else if (node->restype == RTLE) {
+            if (groups.size() == outerGroups) // a stray list end
+                continue;
+            const Group group = groups.back();
+            groups.pop_back();
+            if (group.items == 0) { // () prints as nil
+                out.erase(group.start);
+                out += L"nil";
+            } else {
+                out += L')';
+            }
+        } else {
+            separate();
+            PrintAtom(node, out);
+        }
+    }
+    while (groups.size() > outerGroups) { // lists the chain left open
+        const Group group = groups.back();
+        groups.pop_back();
+        if (group.items == 0) {
+            out.erase(group.start);
+            out += L"nil";
+        } else {
+            out += L')';
+        }
+    }
+    if (topLevel > 1)
+        out += L')';
+    return out;
+}
+
+} // namespace devhost

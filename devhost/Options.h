@@ -1,0 +1,36 @@
+// devhost's command line. Portable.
+#pragma once
+
+#include <string>
+#include <vector>
+
+namespace devhost {
+
+struct LayerOption {
+    std::wstring name;
+    int colorIndex = 7;
+};
+
+struct Options {
+    enum class Order { ModuleFirst, EntryFirst };
+    enum class Post { None, Accept, Cancel };
+
+    std::wstring arx; // empty: Orvex1.arx beside devhost.exe
+    Order order = Order::ModuleFirst;
+    int drawings = 1;
+    std::vector<LayerOption> layers;
+    bool alertBox = false;
+    int afterMs = -1; // -1: nothing is posted
+    Post post = Post::None;
+    std::vector<std::wstring> evals;
+    std::wstring script;
+    bool verbose = false;
+    bool help = false;
+};
+
+// Parses the arguments after the program name. False with a one-line message for bad usage.
+bool ParseOptions(const std::vector<std::wstring>& args, Options& options, std::wstring& error);
+
+extern const wchar_t* const kUsage;
+
+} // namespace devhost

@@ -1,0 +1,117 @@
+#include "devhost/Script.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+using devhost::ScriptCommand;
+
+std::vector<ScriptCommand> Read(const std::wstring& text) {
+    std::vector<ScriptCommand> commands;
+    std::wstring error;
+    EXPECT_TRUE(devhost::ReadScript(text, commands, error)) << std::string(error.begin(), error.end());
+    return commands;
+}
+
+std::wstring Error(const std::wstring& text) {
+    std::vector<ScriptCommand> commands;
+    std::wstring error;
+    EXPECT_FALSE(devhost::ReadScript(text, commands, error));
+    return error;
+}
+
+TEST(Script, CommentsAndBlankLinesAreSkipped) {
+    const auto commands = Read(L"# a comment\n\n   \n  # another\nsleep 10\r\n");
+    ASSERT_EQ(commands.size(), 1u);
+    EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::Sleep);
+    EXPECT_EQ(commands[0].ms, 10);
+    EXPECT_EQ(commands[0].line, 5);
+}
+
+TEST(Script, WindowPaths) {
+    const auto commands =
+        Read(L"click class=#32770 text=\"Pick one\" > id=1001 at=5,-6 with=ctrl+shift timeout=200\n");
+    ASSERT_EQ(commands.size(), 1u);
+    const ScriptCommand& click = commands[0];
+    EXPECT_EQ(click.kind, ScriptCommand::Kind::Click);
+    ASSERT_EQ(click.window.size(), 2u);
+    EXPECT_EQ(click.window[0].className, L"#32770");
+    EXPECT_TRUE(click.window[0].hasText);
+    EXPECT_EQ(click.window[0].text, L"Pick one");
+    EXPECT_TRUE(click.window[1].hasId);
+    EXPECT_EQ(click.window[1].id, 1001);
+    EXPECT_TRUE(click.hasPoint);
+    EXPECT_EQ(click.x, 5);
+    EXPECT_EQ(click.y, -6);
+    EXPECT_EQ(click.modifiers, devhost::kCtrl | devhost::kShift);
+    EXPECT_EQ(click.timeoutMs, 200);
+    EXPECT_EQ(devhost::DescribeWindow(click.window), L"class=#32770 text=\"Pick one\" > id=1001");
+}
+
+TEST(Script, EveryCommand) {
+    const auto commands = Read(L"wait class=A\n"
+                               L"gone class=A timeout=10\n"
+                               L"move id=3\n"
+                               L"double-click contains=dwg nth=2\n"
+                               L"right-click class=B visible=any\n"
+                               L"key ctrl+c enter F5 shift+tab ctrl++\n"
+                               L"type \"hello \\\"you\\\"\"\n"
+                               L"screenshot class=A shot.bmp\n"
+                               L"count class=tooltips_class32\n"
+                               L"text id=1\n"
+                               L"rect id=1\n"
+                               L"enabled id=1\n"
+                               L"exists id=1\n"
+                               L"tooltip\n"
+                               L"focus\n"
+                               L"echo two words\n");
+    ASSERT_EQ(commands.size(), 16u);
+    EXPECT_EQ(commands[1].timeoutMs, 10);
+    EXPECT_EQ(commands[3].window[0].contains, L"dwg");
+    EXPECT_EQ(commands[3].window[0].nth, 2);
+    EXPECT_TRUE(commands[4].window[0].anyVisibility);
+    ASSERT_EQ(commands[5].keys.size(), 5u);
+    EXPECT_EQ(commands[5].keys[0].modifiers, devhost::kCtrl);
+    EXPECT_EQ(commands[5].keys[0].virtualKey, 'C');
+    EXPECT_EQ(commands[5].keys[1].virtualKey, 0x0D);
+    EXPECT_EQ(commands[5].keys[2].virtualKey, 0x74);
+    EXPECT_EQ(commands[5].keys[3].modifiers, devhost::kShift);
+    EXPECT_EQ(commands[5].keys[3].virtualKey, 0x09);
+    EXPECT_EQ(commands[5].keys[4].virtualKey, 0xBB);
+    EXPECT_EQ(commands[6].text, L"hello \"you\"");
+    EXPECT_EQ(commands[7].file, L"shot.bmp");
+    EXPECT_EQ(commands[13].kind, ScriptCommand::Kind::Tooltip);
+    EXPECT_EQ(commands[15].text, L"two words");
+}
+
+TEST(Script, Errors) {
+    EXPECT_EQ(Error(L"sleep 1\nfly away\n"), L"line 2: unknown command fly");
+    EXPECT_EQ(Error(L"click\n"), L"line 1: click needs a window, such as class=NAME or id=N");
+    EXPECT_EQ(Error(L"click id=x\n"), L"line 1: id= takes a number: id=x");
+    EXPECT_EQ(Error(L"click id=1 >\n"), L"line 1: > needs a window step on each side");
+    EXPECT_EQ(Error(L"click > id=1\n"), L"line 1: > needs a window step on each side");
+    EXPECT_EQ(Error(L"click id=1 at=3\n"), L"line 1: at= takes X,Y: at=3");
+    EXPECT_EQ(Error(L"click id=1 with=meta\n"),
+              L"line 1: with= takes ctrl, shift and alt joined by +: with=meta");
+    EXPECT_EQ(Error(L"sleep\n"), L"line 1: sleep takes milliseconds");
+    EXPECT_EQ(Error(L"key\n"), L"line 1: key needs at least one key, such as enter or ctrl+c");
+    EXPECT_EQ(Error(L"key hyper+q\n"), L"line 1: unknown key hyper+q");
+    EXPECT_EQ(Error(L"type a b\n"), L"line 1: type takes one text (quote it when it has blanks)");
+    EXPECT_EQ(Error(L"type \"open\n"), L"line 1: unterminated quoted text");
+    EXPECT_EQ(Error(L"screenshot id=1\n"), L"line 1: screenshot takes a window and one file name");
+    EXPECT_EQ(Error(L"count id=1 extra\n"), L"line 1: unexpected extra");
+    EXPECT_EQ(Error(L"wait id=1 timeout=soon\n"), L"line 1: timeout= takes milliseconds: timeout=soon");
+    EXPECT_EQ(Error(L"wait id=1 visible=no\n"), L"line 1: visible= takes yes or any: visible=no");
+}
+
+TEST(Script, KeyNames) {
+    EXPECT_EQ(devhost::VirtualKeyOf(L"A"), 'A');
+    EXPECT_EQ(devhost::VirtualKeyOf(L"z"), 'Z');
+    EXPECT_EQ(devhost::VirtualKeyOf(L"7"), '7');
+    EXPECT_EQ(devhost::VirtualKeyOf(L"Escape"), 0x1B);
+    EXPECT_EQ(devhost::VirtualKeyOf(L"f12"), 0x7B);
+    EXPECT_EQ(devhost::VirtualKeyOf(L"f25"), 0);
+    EXPECT_EQ(devhost::VirtualKeyOf(L"nothing"), 0);
+}
+
+} // namespace
