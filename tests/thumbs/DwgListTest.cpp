@@ -1,0 +1,315 @@
+#include "thumbs/DwgList.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+namespace {
+
+DwgFindEntry File(const std::string& name, std::int64_t time = 0, std::uint32_t size = 0) {
+    DwgFindEntry e;
+    e.name = name;
+    e.timeWrite = time;
+    e.size = size;
+    return e;
+}
+
+DwgFindEntry Folder(const std::string& name) {
+    DwgFindEntry e = File(name);
+    e.isDirectory = true;
+    return e;
+}
+
+std::vector<std::string> Names() {
+    std::vector<std::string> names;
+    for (int i = 0; i < DwgList.GetSize(); ++i)
+        names.push_back(DwgList[i].m_strName);
+    return names;
+}
+
+int Scan(const std::vector<DwgFindEntry>& entries) {
+    return ScanEntries(entries.data(), static_cast<int>(entries.size()), ".dwg");
+}
+
+class DwgListTest : public ::testing::Test {
+protected:
+    void SetUp() override { BeginScan(); }
+    void TearDown() override { BeginScan(); }
+};
+
+TEST(DwgData, EmptyRecordIsNotSelected) {
+    DwgData d;
+    EXPECT_FALSE(d.IsSelected());
+    EXPECT_EQ(d.m_bSelected, 0);
+    EXPECT_TRUE(d.m_strName.empty());
+}
+
+TEST(DwgData, BuiltFromSearchEntry) {
+    DwgData d(File("plan.dwg", 1614953229, 1234));
+    EXPECT_EQ(d.m_strName, "plan.dwg");
+    EXPECT_EQ(d.m_timeWrite, 1614953229);
+    EXPECT_EQ(d.m_nSize, 1234u);
+    EXPECT_EQ(d.m_bSelected, 0);
+}
+
+TEST(DwgData, CopyAndAssignmentCopyAllFields) {
+    DwgData a(File("a.dwg", -5, 7));
+    a.Select();
+    DwgData b(a);
+    EXPECT_EQ(b.m_bSelected, 1);
+    EXPECT_EQ(b.m_strName, "a.dwg");
+    EXPECT_EQ(b.m_timeWrite, -5);
+    EXPECT_EQ(b.m_nSize, 7u);
+    DwgData c;
+    c = a;
+    EXPECT_TRUE(c.IsSelected());
+    EXPECT_EQ(c.m_strName, "a.dwg");
+    EXPECT_EQ(c.m_timeWrite, -5);
+    EXPECT_EQ(c.m_nSize, 7u);
+}
+
+TEST(DwgData, SelectAndDeselect) {
+    DwgData d;
+    d.Select();
+    EXPECT_TRUE(d.IsSelected());
+    EXPECT_EQ(d.m_bSelected, 1);
+    d.Deselect();
+    EXPECT_FALSE(d.IsSelected());
+}
+
+TEST(AcceptScanEntry, LowerCasesAndTestsSubstring) {
+    DwgFindEntry e = File("A.DWG");
+    EXPECT_TRUE(AcceptScanEntry(e, ".dwg"));
+    EXPECT_EQ(e.name, "a.dwg");
+    DwgFindEntry old = File("c.Dwg.old");
+    EXPECT_TRUE(AcceptScanEntry(old, ".dwg"));
+    EXPECT_EQ(old.name, "c.dwg.old");
+    DwgFindEntry x = File("a.dwgx");
+    EXPECT_TRUE(AcceptScanEntry(x, ".dwg"));
+    DwgFindEntry txt = File("Readme.TXT");
+    EXPECT_FALSE(AcceptScanEntry(txt, ".dwg"));
+    EXPECT_EQ(txt.name, "readme.txt");
+    DwgFindEntry nodot = File("dwg");
+    EXPECT_FALSE(AcceptScanEntry(nodot, ".dwg"));
+}
+
+TEST(AcceptScanEntry, DirectoriesOnlyWhenNameBeginsWithDot) {
+    DwgFindEntry sub = Folder("x.dwg");
+    EXPECT_FALSE(AcceptScanEntry(sub, ".dwg"));
+    DwgFindEntry hidden = Folder(".X.dwg");
+    EXPECT_TRUE(AcceptScanEntry(hidden, ".dwg"));
+    EXPECT_EQ(hidden.name, ".x.dwg");
+    DwgFindEntry dot = Folder(".");
+    EXPECT_FALSE(AcceptScanEntry(dot, ".dwg"));
+    DwgFindEntry dotdot = Folder("..");
+    EXPECT_FALSE(AcceptScanEntry(dotdot, ".dwg"));
+}
+
+TEST_F(DwgListTest, ScanKeepsMatchingFilesLowerCased) {
+    EXPECT_EQ(Scan({Folder("."), Folder(".."), File("A.DWG"), File("b.dwg"), File("notes.txt"),
+                    File("c.Dwg.old"), Folder("x.dwg"), Folder(".x.dwg")}),
+              1);
+    EXPECT_EQ(Names(), (std::vector<std::string>{"a.dwg", "b.dwg", "c.dwg.old", ".x.dwg"}));
+}
+
+TEST_F(DwgListTest, ScanStoresTimeAndSize) {
+    Scan({File("a.dwg", 100, 2000)});
+    ASSERT_EQ(DwgList.GetSize(), 1);
+    EXPECT_EQ(DwgList[0].m_timeWrite, 100);
+    EXPECT_EQ(DwgList[0].m_nSize, 2000u);
+    EXPECT_FALSE(DwgList[0].IsSelected());
+}
+
+TEST_F(DwgListTest, ScanOfEmptyFolderGivesZeroAndEmptiesList) {
+    Scan({File("a.dwg")});
+    EXPECT_EQ(Scan({}), 0);
+    EXPECT_EQ(DwgList.GetSize(), 0);
+}
+
+TEST_F(DwgListTest, ScanStartsFromEmptyWithGrowStepAndShrinksAtEnd) {
+    Scan({File("old1.dwg"), File("old2.dwg")});
+    std::vector<DwgFindEntry> many;
+    for (int i = 0; i < 150; ++i)
+        many.push_back(File("f" + std::to_string(i) + ".dwg"));
+    BeginScan();
+    EXPECT_EQ(DwgList.GetSize(), 0);
+    EXPECT_EQ(DwgList.GetGrowBy(), kDwgListGrowBy);
+    EXPECT_EQ(DwgList.GetAllocated(), 0u);
+    AppendScanEntry(many[0]);
+    EXPECT_EQ(DwgList.GetAllocated(), 100u); // grows by whole steps
+    for (int i = 1; i < 150; ++i)
+        AppendScanEntry(many[static_cast<std::size_t>(i)]);
+    EXPECT_EQ(DwgList.GetAllocated(), 200u);
+    EndScan();
+    EXPECT_EQ(DwgList.GetAllocated(), 150u);
+    EXPECT_EQ(DwgList[0].m_strName, "f0.dwg");
+}
+
+TEST_F(DwgListTest, IndexOutsideListThrows) {
+    Scan({File("a.dwg")});
+    EXPECT_THROW(DwgList[1], CInvalidArgException);
+    EXPECT_THROW(DwgList[-1], CInvalidArgException);
+}
+
+TEST(CompareNoCaseAscii, FoldsAsciiLettersOnly) {
+    EXPECT_EQ(CompareNoCaseAscii("Plan.DWG", "plan.dwg"), 0);
+    EXPECT_LT(CompareNoCaseAscii("a", "B"), 0);
+    EXPECT_GT(CompareNoCaseAscii("b", "A"), 0);
+    EXPECT_LT(CompareNoCaseAscii("ab", "abc"), 0);
+    EXPECT_GT(CompareNoCaseAscii("abc", "AB"), 0);
+    EXPECT_LT(CompareNoCaseAscii("_", "A"), 0); // letters compare as lower case
+    EXPECT_NE(CompareNoCaseAscii("\xC9", "\xE9"), 0);
+    EXPECT_LT(CompareNoCaseAscii("z", "\xE9"), 0); // bytes compare unsigned
+    EXPECT_EQ(CompareNoCaseAscii("", ""), 0);
+}
+
+TEST_F(DwgListTest, SortByNameKeepsLastRecordLast) {
+    Scan({File("c.dwg"), File("a.dwg"), File("b.dwg")});
+    SortDwgList(DwgSortByName);
+    EXPECT_EQ(Names(), (std::vector<std::string>{"a.dwg", "c.dwg", "b.dwg"}));
+}
+
+TEST_F(DwgListTest, SortByNameIgnoresCase) {
+    AppendScanEntry(File("Beta.dwg"));
+    AppendScanEntry(File("alpha.dwg"));
+    AppendScanEntry(File("CHARLIE.dwg"));
+    AppendScanEntry(File("last.dwg"));
+    SortDwgList(DwgSortByName);
+    EXPECT_EQ(Names(), (std::vector<std::string>{"alpha.dwg", "Beta.dwg", "CHARLIE.dwg", "last.dwg"}));
+}
+
+TEST_F(DwgListTest, SortByDateOldestFirst) {
+    Scan({File("n.dwg", 300), File("o.dwg", -10), File("m.dwg", 200), File("z.dwg", 0)});
+    SortDwgList(DwgSortByDate);
+    EXPECT_EQ(Names(), (std::vector<std::string>{"o.dwg", "m.dwg", "n.dwg", "z.dwg"}));
+}
+
+TEST_F(DwgListTest, SortBySizeSmallestFirst) {
+    Scan({File("big.dwg", 0, 4000000000u), File("small.dwg", 0, 10), File("mid.dwg", 0, 500),
+          File("z.dwg", 0, 1)});
+    SortDwgList(DwgSortBySize);
+    EXPECT_EQ(Names(), (std::vector<std::string>{"small.dwg", "mid.dwg", "big.dwg", "z.dwg"}));
+}
+
+TEST_F(DwgListTest, EqualSizesComeOutInEitherOrder) {
+    Scan({File("b.dwg", 0, 5), File("a.dwg", 0, 5), File("c.dwg", 0, 1), File("z.dwg", 0, 0)});
+    SortDwgList(DwgSortBySize);
+    const auto names = Names();
+    EXPECT_EQ(names[0], "c.dwg");
+    EXPECT_TRUE((names[1] == "a.dwg" && names[2] == "b.dwg") || (names[1] == "b.dwg" && names[2] == "a.dwg"));
+    EXPECT_EQ(names[3], "z.dwg");
+}
+
+TEST_F(DwgListTest, SortOfOneOrNoRecordChangesNothing) {
+    SortDwgList(DwgSortByName);
+    EXPECT_EQ(DwgList.GetSize(), 0);
+    Scan({File("only.dwg")});
+    SortDwgList(DwgSortByName);
+    EXPECT_EQ(Names(), (std::vector<std::string>{"only.dwg"}));
+}
+
+TEST_F(DwgListTest, UnknownModeLeavesOrder) {
+    Scan({File("c.dwg", 3, 3), File("a.dwg", 1, 1), File("b.dwg", 2, 2)});
+    SortDwgList(3);
+    SortDwgList(-1);
+    EXPECT_EQ(Names(), (std::vector<std::string>{"c.dwg", "a.dwg", "b.dwg"}));
+}
+
+TEST_F(DwgListTest, LargeSortOrdersAllButLast) {
+    std::vector<DwgFindEntry> entries;
+    for (int i = 0; i < 1000; ++i)
+        entries.push_back(
+            File("f" + std::to_string((i * 7919) % 1000) + ".dwg", (i * 31) % 997, (i * 13) % 1009));
+    Scan(entries);
+    const std::string last = DwgList[999].m_strName;
+    for (int mode = 0; mode < 3; ++mode) {
+        SortDwgList(mode);
+        EXPECT_EQ(DwgList[999].m_strName, last);
+        for (int i = 1; i < 999; ++i) {
+            const DwgData& a = DwgList[i - 1];
+            const DwgData& b = DwgList[i];
+            if (mode == 0)
+                ASSERT_LE(CompareNoCaseAscii(a.m_strName, b.m_strName), 0);
+            else if (mode == 1)
+                ASSERT_LE(a.m_timeWrite, b.m_timeWrite);
+            else
+                ASSERT_LE(a.m_nSize, b.m_nSize);
+        }
+    }
+}
+
+TEST_F(DwgListTest, SelectionFlags) {
+    EXPECT_FALSE(AnySelected());
+    Scan({File("a.dwg"), File("b.dwg"), File("c.dwg")});
+    EXPECT_FALSE(AnySelected());
+    DwgList[1].Select();
+    DwgList[2].Select();
+    EXPECT_TRUE(AnySelected());
+    DeselectAllFlags();
+    EXPECT_FALSE(AnySelected());
+    EXPECT_FALSE(DwgList[1].IsSelected());
+}
+
+void Append(const std::vector<std::string>& names) {
+    for (const std::string& n : names)
+        AppendScanEntry(File(n));
+}
+
+TEST_F(DwgListTest, FindByPrefixFindsLongerNameIgnoringCase) {
+    Append({"a.dwg", "plan", "plan1.dwg", "plan2.dwg"});
+    EXPECT_EQ(FindByPrefixIndex("plan"), 2);
+    EXPECT_EQ(FindByPrefixIndex("PLAN"), 2);
+    EXPECT_EQ(FindByPrefixIndex("Plan2"), 3);
+}
+
+TEST_F(DwgListTest, FindByPrefixNeverMatchesNameOfSameLength) {
+    Append({"plan", "other.dwg"});
+    EXPECT_EQ(FindByPrefixIndex("plan"), -1);
+    EXPECT_EQ(FindByPrefixIndex("other.dwg"), -1);
+    EXPECT_EQ(FindByPrefixIndex("other.dw"), 1);
+}
+
+TEST_F(DwgListTest, FindByPrefixClearsFlagsAndMarksMatch) {
+    Scan({File("a.dwg"), File("b.dwg"), File("plan1.dwg"), File("c.dwg")});
+    for (int i = 0; i < 4; ++i)
+        DwgList[i].Select();
+    const DwgPrefixSearch found = FindByPrefix("pl");
+    EXPECT_TRUE(found.ran);
+    EXPECT_EQ(found.match, 2);
+    EXPECT_EQ(found.nameIndex, 2);
+    EXPECT_FALSE(DwgList[0].IsSelected());
+    EXPECT_FALSE(DwgList[1].IsSelected());
+    EXPECT_TRUE(DwgList[2].IsSelected());
+    EXPECT_FALSE(DwgList[3].IsSelected());
+}
+
+TEST_F(DwgListTest, FindByPrefixWithoutMatchClearsFlagsAndNamesFirstRecord) {
+    Scan({File("a.dwg"), File("b.dwg")});
+    DwgList[0].Select();
+    DwgList[1].Select();
+    const DwgPrefixSearch found = FindByPrefix("zz");
+    EXPECT_TRUE(found.ran);
+    EXPECT_EQ(found.match, -1);
+    EXPECT_EQ(found.nameIndex, 0);
+    EXPECT_FALSE(AnySelected());
+}
+
+TEST_F(DwgListTest, FindByPrefixMatchOnFirstRecordKeepsItSelected) {
+    Scan({File("plan1.dwg"), File("b.dwg")});
+    EXPECT_EQ(FindByPrefixIndex("plan"), 0);
+    EXPECT_TRUE(DwgList[0].IsSelected());
+}
+
+TEST_F(DwgListTest, EmptyTextOrEmptyListTouchesNothing) {
+    const DwgPrefixSearch none = FindByPrefix("plan");
+    EXPECT_FALSE(none.ran);
+    EXPECT_EQ(none.match, -1);
+    Scan({File("plan1.dwg"), File("b.dwg")});
+    DwgList[1].Select();
+    const DwgPrefixSearch empty = FindByPrefix("");
+    EXPECT_FALSE(empty.ran);
+    EXPECT_TRUE(DwgList[1].IsSelected());
+}
+
+} // namespace

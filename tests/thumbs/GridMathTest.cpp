@@ -1,0 +1,325 @@
+#include "thumbs/GridMath.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+using namespace grid;
+
+Geometry DefaultGeometry(int labelHeight = 20) {
+    Geometry g;
+    g.labelHeight = labelHeight;
+    return g;
+}
+
+TEST(GridMath, LabelHeight) {
+    EXPECT_EQ(LabelHeight(16, 2), 20);
+}
+
+TEST(GridMath, ColumnsFromClientWidth) {
+    EXPECT_EQ(ColumnsForWidth(700, 173, 5), 3); // 705 / 178
+    EXPECT_EQ(ColumnsForWidth(706, 173, 5), 3);
+    EXPECT_EQ(ColumnsForWidth(707, 173, 5), 4); // 712 / 178 = 4: the last column needs no gap
+    EXPECT_EQ(ColumnsForWidth(10, 173, 5), 1);  // at least one
+    EXPECT_EQ(ColumnsForWidth(0, 173, 5), 1);
+}
+
+TEST(GridMath, RowsRoundUp) {
+    EXPECT_EQ(RowsForCount(10, 3), 4);
+    EXPECT_EQ(RowsForCount(9, 3), 3);
+    EXPECT_EQ(RowsForCount(1, 60), 1);
+    EXPECT_EQ(RowsForCount(0, 3), 0);
+}
+
+TEST(GridMath, TenDrawingsInThreeColumnsLeaveOneInLastRow) {
+    const Geometry g = DefaultGeometry();
+    const LayoutNumbers n = ComputeLayout(g, 10, 3, 1000);
+    EXPECT_EQ(n.rows, 4);
+    // The last row holds index 9 only.
+    int inLastRow = 0;
+    for (int c = 0; c < 3; ++c)
+        if (CellOf(g, 3, n.poolSize, 3, c, 0).index < 10)
+            ++inLastRow;
+    EXPECT_EQ(inLastRow, 1);
+}
+
+TEST(GridMath, LayoutScrollSizesAndPool) {
+    const Geometry g = DefaultGeometry(); // row pitch 163, column pitch 178
+    const LayoutNumbers n = ComputeLayout(g, 30, 3, 500);
+    EXPECT_EQ(n.rows, 10);
+    EXPECT_EQ(n.visibleRows, 3);
+    EXPECT_EQ(n.remainder, 500 - 3 * 163);
+    EXPECT_EQ(n.totalWidth, 3 * 178 - 5);
+    EXPECT_EQ(n.totalHeight, 163 * 10 + 11);
+    EXPECT_EQ(n.lineX, 178);
+    EXPECT_EQ(n.lineY, 163);
+    EXPECT_EQ(n.poolRows, 5);
+    EXPECT_EQ(n.poolSize, 15);
+}
+
+TEST(GridMath, VisibleRowsNeverExceedRows) {
+    const LayoutNumbers n = ComputeLayout(DefaultGeometry(), 4, 3, 1000);
+    EXPECT_EQ(n.rows, 2);
+    EXPECT_EQ(n.visibleRows, 2);
+    EXPECT_EQ(n.poolRows, 4);
+}
+
+TEST(GridMath, EmptyListHasNoRowsAndNoPool) {
+    const LayoutNumbers n = ComputeLayout(DefaultGeometry(), 0, 3, 500);
+    EXPECT_EQ(n.rows, 0);
+    EXPECT_EQ(n.visibleRows, 0);
+    EXPECT_EQ(n.poolRows, 0);
+    EXPECT_EQ(n.poolSize, 0);
+    EXPECT_EQ(n.totalHeight, 500 % 163);
+}
+
+TEST(GridMath, TotalHeightIsCapped) {
+    EXPECT_EQ(CapTotalHeight(32768, 163), 32768);
+    EXPECT_EQ(CapTotalHeight(32769, 163), 32768 - 32768 % 163);
+    EXPECT_EQ(CapTotalHeight(1000000, 163), 32763);
+    const LayoutNumbers n = ComputeLayout(DefaultGeometry(), 3000, 3, 500);
+    EXPECT_EQ(n.rows, 1000);
+    EXPECT_EQ(n.totalHeight, 32763);
+    EXPECT_EQ(n.totalHeight % 163, 0);
+}
+
+TEST(GridMath, PoolSlotIsIndexModPoolSize) {
+    EXPECT_EQ(PoolSlot(0, 15), 0);
+    EXPECT_EQ(PoolSlot(14, 15), 14);
+    EXPECT_EQ(PoolSlot(15, 15), 0);
+    EXPECT_EQ(PoolSlot(47, 15), 2);
+}
+
+TEST(GridMath, CellRectangles) {
+    Geometry g = DefaultGeometry();
+    g.originX = 2;
+    const Cell c = CellOf(g, 3, 15, 4, 2, 163);
+    EXPECT_EQ(c.index, 14);
+    EXPECT_EQ(c.slot, 14);
+    EXPECT_EQ(c.left, 2 + 2 * 178);
+    EXPECT_EQ(c.right, c.left + 173);
+    EXPECT_EQ(c.top, 163);
+    EXPECT_EQ(c.bottom, 163 + 143);
+}
+
+TEST(GridMath, IncreaseRoundsHalfUp) {
+    int h = 143, w = 173;
+    EXPECT_TRUE(IncreaseCell(h, w, 1000));
+    EXPECT_EQ(h, 179);
+    EXPECT_EQ(w, 216);
+}
+
+TEST(GridMath, IncreaseRefusedUnlessNewHeightBelowClient) {
+    int h = 143, w = 173;
+    EXPECT_FALSE(IncreaseCell(h, w, 179)); // 179 is not less than 179
+    EXPECT_EQ(h, 143);
+    EXPECT_EQ(w, 173);
+    EXPECT_TRUE(IncreaseCell(h, w, 180));
+    EXPECT_EQ(h, 179);
+}
+
+TEST(GridMath, DecreaseStopsBelowMinimum) {
+    int h = 20, w = 20;
+    EXPECT_TRUE(DecreaseCell(h, w));
+    EXPECT_EQ(h, 16);
+    EXPECT_EQ(w, 16);
+    EXPECT_FALSE(DecreaseCell(h, w));
+    EXPECT_EQ(h, 16);
+    EXPECT_EQ(w, 16);
+}
+
+TEST(GridMath, DecreaseRoundsHalfUpAndChecksBothSides) {
+    int h = 179, w = 216;
+    EXPECT_TRUE(DecreaseCell(h, w));
+    EXPECT_EQ(h, 143); // 143.2
+    EXPECT_EQ(w, 173); // 172.8
+    int h2 = 30, w2 = 19;
+    EXPECT_FALSE(DecreaseCell(h2, w2));
+    int h3 = 22, w3 = 23; // 17.6 -> 18, 18.4 -> 18
+    EXPECT_TRUE(DecreaseCell(h3, w3));
+    EXPECT_EQ(h3, 18);
+    EXPECT_EQ(w3, 18);
+}
+
+TEST(GridMath, RefitToWholeColumnsAndRows) {
+    const Geometry g = DefaultGeometry(); // row pitch 163
+    const RefitNumbers r = ComputeRefit(g, 700, 500, 1000, 800);
+    EXPECT_EQ(r.columns, 3);
+    EXPECT_EQ(r.neededWidth, 3 * 178 - 5);
+    EXPECT_EQ(r.remainder, 500 % 163);
+    EXPECT_EQ(r.frameWidth, 1000 + (529 - 700));
+    EXPECT_EQ(r.frameHeight, 800 - 11);
+}
+
+TEST(GridMath, RefitKeepsHeightWhenNoWholeRowFits) {
+    const RefitNumbers r = ComputeRefit(DefaultGeometry(), 100, 100, 400, 300);
+    EXPECT_EQ(r.columns, 1);
+    EXPECT_EQ(r.remainder, 100);
+    EXPECT_EQ(r.frameHeight, 300);
+    EXPECT_EQ(r.frameWidth, 400 + 173 - 100);
+}
+
+TEST(GridMath, RelayoutKeepsFirstDrawingInView) {
+    EXPECT_EQ(RelayoutFirstRow(3, 10, 5, 100), 6); // drawing 30 is in row 6 of 5 columns
+    EXPECT_EQ(RelayoutFirstRow(5, 6, 3, 100), 10);
+    EXPECT_EQ(RelayoutFirstRow(60, 100, 1, 50), 50); // never beyond the count
+}
+
+TEST(GridMath, RelayoutScrollPositionWraps) {
+    const Geometry g = DefaultGeometry();
+    EXPECT_EQ(RelayoutScrollY(g, 10, 32763), 1630);
+    EXPECT_EQ(RelayoutScrollY(g, 201, 32763), 32763); // equal is not larger
+    EXPECT_EQ(RelayoutScrollY(g, 202, 32763), 202 * 163 - 32763);
+    EXPECT_EQ(RelayoutScrollY(g, 500, 32763), 500 * 163 - 2 * 32763);
+}
+
+TEST(GridMath, PageUpJumpsToTopWithinOnePage) {
+    EXPECT_EQ(PageUpFirstRow(15, 10), 0);
+    EXPECT_EQ(PageUpFirstRow(20, 10), 10);
+    EXPECT_EQ(PageUpFirstRow(25, 10), 15);
+    EXPECT_EQ(PageUpFirstRow(3, 10), 0);
+}
+
+TEST(GridMath, PageDownStopsAtLastPage) {
+    EXPECT_EQ(PageDownFirstRow(0, 10, 100), 10);
+    EXPECT_EQ(PageDownFirstRow(85, 10, 100), 90);
+    EXPECT_EQ(PageDownFirstRow(90, 10, 100), 90);
+    EXPECT_EQ(PageDownFirstRow(0, 4, 4), 0);
+}
+
+TEST(GridMath, EndShowsLastPage) {
+    EXPECT_EQ(EndFirstRow(100, 10), 90);
+    EXPECT_EQ(EndFirstRow(4, 4), 0);
+}
+
+TEST(GridMath, ThumbTrackMovesOneRowAtATime) {
+    EXPECT_EQ(ThumbTrackStep(163 * 5 + 20, 163 * 4, 163), 1);
+    EXPECT_EQ(ThumbTrackStep(163 * 9, 163 * 4, 163), 1); // far away still one row
+    EXPECT_EQ(ThumbTrackStep(163 * 3, 163 * 4, 163), -1);
+    EXPECT_EQ(ThumbTrackStep(163 * 4 + 100, 163 * 4, 163), 0); // within the same row
+    EXPECT_EQ(ThumbTrackStep(0, 0, 163), 0);
+}
+
+ScrollState StateFor(const Geometry& g, int count, int columns, int clientHeight) {
+    const LayoutNumbers n = ComputeLayout(g, count, columns, clientHeight);
+    ScrollState s;
+    s.rows = n.rows;
+    s.visibleRows = n.visibleRows;
+    s.totalHeight = n.totalHeight;
+    s.clientHeight = clientHeight;
+    return s;
+}
+
+TEST(GridMath, LineDownCreatesNextRowAndStopsAtLastRow) {
+    const Geometry g = DefaultGeometry();
+    ScrollState s = StateFor(g, 30, 3, 500); // 10 rows, 3 visible
+    LineStep step = LineDown(s, g);
+    EXPECT_TRUE(step.moved);
+    EXPECT_EQ(s.firstRow, 1);
+    EXPECT_EQ(step.createRow, 4);
+    EXPECT_EQ(step.createRowTop, 163 * 4);
+    EXPECT_EQ(s.y, 163);
+    for (int i = 0; i < 20; ++i)
+        LineDown(s, g);
+    EXPECT_EQ(s.firstRow, 7);
+    step = LineDown(s, g);
+    EXPECT_FALSE(step.moved);
+    EXPECT_EQ(s.firstRow, 7);
+}
+
+TEST(GridMath, LineUpAtTopDoesNothingAndResetsNothing) {
+    const Geometry g = DefaultGeometry();
+    ScrollState s = StateFor(g, 30, 3, 500);
+    s.x = 40;
+    const LineStep step = LineUp(s, g);
+    EXPECT_FALSE(step.moved);
+    EXPECT_FALSE(step.wrapped);
+    EXPECT_FALSE(step.resetX); // y is 0
+    EXPECT_EQ(s.x, 40);
+}
+
+TEST(GridMath, LineStepsResetHorizontalPosition) {
+    const Geometry g = DefaultGeometry();
+    ScrollState s = StateFor(g, 30, 3, 500);
+    s.x = 40;
+    EXPECT_TRUE(LineDown(s, g).resetX);
+    EXPECT_EQ(s.x, 0);
+    s.x = 40;
+    const LineStep up = LineUp(s, g);
+    EXPECT_TRUE(up.resetX);
+    EXPECT_TRUE(up.moved);
+    EXPECT_EQ(up.createRow, 0);
+    EXPECT_EQ(up.createRowTop, -163);
+    EXPECT_EQ(s.firstRow, 0);
+    EXPECT_EQ(s.y, 0);
+}
+
+TEST(GridMath, HugeFolderReachesLastRowThroughCappedRange) {
+    const Geometry g = DefaultGeometry();      // row pitch 163
+    ScrollState s = StateFor(g, 3000, 3, 500); // 1000 rows, 163000 pixels > 32768
+    ASSERT_EQ(s.totalHeight, 32763);
+    const int limit = s.totalHeight - s.clientHeight;
+    int wraps = 0;
+    int steps = 0;
+    while (true) {
+        const int before = s.firstRow;
+        const LineStep step = LineDown(s, g);
+        if (!step.moved)
+            break;
+        ++steps;
+        ASSERT_EQ(s.firstRow, before + 1);
+        ASSERT_GE(s.y, 0);
+        ASSERT_LE(s.y, limit);
+        if (step.wrapped)
+            ++wraps;
+        // Each created row exists and lies just below the visible band.
+        if (step.createRow >= 0) {
+            ASSERT_LT(step.createRow, s.rows);
+            ASSERT_EQ(step.createRowTop, 163 * (s.visibleRows + 1));
+        }
+        ASSERT_LT(steps, 2000);
+    }
+    EXPECT_EQ(s.firstRow + s.visibleRows, s.rows);
+    EXPECT_EQ(s.firstRow, 997);
+    EXPECT_GT(wraps, 0);
+
+    // And back up to the first row, wrapping at the top of the range.
+    int upWraps = 0;
+    while (s.firstRow > 0) {
+        const LineStep step = LineUp(s, g);
+        ASSERT_TRUE(step.moved);
+        ASSERT_GE(s.y, 0);
+        ASSERT_LE(s.y, limit);
+        if (step.wrapped)
+            ++upWraps;
+    }
+    EXPECT_EQ(s.firstRow, 0);
+    EXPECT_GT(upWraps, 0);
+    EXPECT_FALSE(LineUp(s, g).moved);
+}
+
+TEST(GridMath, WrapDownHappensAtBottomOfCappedRange) {
+    const Geometry g = DefaultGeometry();
+    ScrollState s = StateFor(g, 3000, 3, 500);
+    s.firstRow = 100;
+    s.y = s.totalHeight - 163 * (s.visibleRows + 1);
+    const LineStep step = LineDown(s, g);
+    EXPECT_TRUE(step.wrapped);
+    EXPECT_EQ(step.wrapY, 0);
+    EXPECT_EQ(s.y, 163);
+    EXPECT_EQ(s.firstRow, 101);
+}
+
+TEST(GridMath, WrapUpHappensAtTopWhenRowsAbove) {
+    const Geometry g = DefaultGeometry();
+    ScrollState s = StateFor(g, 3000, 3, 500);
+    s.firstRow = 300;
+    s.y = 0;
+    const LineStep step = LineUp(s, g);
+    EXPECT_TRUE(step.wrapped);
+    EXPECT_EQ(step.wrapY, 32763 - 163 * 4);
+    EXPECT_EQ(s.y, 32763 - 163 * 5);
+    EXPECT_EQ(s.firstRow, 299);
+}
+
+} // namespace

@@ -1,0 +1,209 @@
+#include "thumbs/GridMath.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstdlib>
+
+namespace grid {
+
+int LabelHeight(int tmHeight, int cyEdge) {
+    return tmHeight + 2 + cyEdge;
+}
+
+int ColumnsForWidth(int clientWidth, int cellWidth, int gap) {
+    const int pitch = cellWidth + gap;
+    if (pitch <= 0)
+        return 1;
+    return std::max(1, (clientWidth + gap) / pitch);
+}
+
+int RowsForCount(int count, int columns) {
+    if (count <= 0 || columns <= 0)
+        return 0;
+    return static_cast<int>(std::ceil(static_cast<double>(count) / static_cast<double>(columns)));
+}
+
+int CapTotalHeight(int totalHeight, int rowPitch) {
+    if (totalHeight <= kScrollCap || rowPitch <= 0)
+        return totalHeight;
+    return kScrollCap - kScrollCap % rowPitch;
+}
+
+LayoutNumbers ComputeLayout(const Geometry& g, int count, int columns, int clientHeight) {
+    LayoutNumbers n;
+    const int rowPitch = g.RowPitch();
+    const int columnPitch = g.ColumnPitch();
+    n.lineX = columnPitch;
+    n.lineY = rowPitch;
+    n.rows = count > 0 ? RowsForCount(count, columns) : 0;
+    n.visibleRows = rowPitch > 0 ? clientHeight / rowPitch : 0;
+    n.remainder = rowPitch > 0 ? clientHeight % rowPitch : clientHeight;
+    n.totalWidth = columns * columnPitch + g.originX - g.gap;
+    n.totalHeight = CapTotalHeight(g.originY + rowPitch * n.rows + n.remainder, rowPitch);
+    if (count <= 0) {
+        n.visibleRows = 0;
+        n.poolRows = 0;
+        n.poolSize = 0;
+        return n;
+    }
+    if (n.visibleRows > n.rows)
+        n.visibleRows = n.rows;
+    n.poolRows = n.visibleRows + 2;
+    n.poolSize = columns * n.poolRows;
+    return n;
+}
+
+int PoolSlot(int index, int poolSize) {
+    return poolSize > 0 ? index % poolSize : 0;
+}
+
+Cell CellOf(const Geometry& g, int columns, int poolSize, int row, int column, int rowTop) {
+    Cell c;
+    c.index = columns * row + column;
+    c.slot = PoolSlot(c.index, poolSize);
+    c.left = g.originX + column * g.ColumnPitch();
+    c.top = rowTop;
+    c.right = c.left + g.cellWidth;
+    c.bottom = c.top + g.cellHeight;
+    return c;
+}
+
+namespace {
+// Rounds a non-negative value half up.
+int RoundHalfUp(double v) {
+    return static_cast<int>(std::floor(v + 0.5));
+}
+} // namespace
+
+bool IncreaseCell(int& cellHeight, int& cellWidth, int clientHeight) {
+    const int height = RoundHalfUp(cellHeight * 1.25);
+    const int width = RoundHalfUp(cellWidth * 1.25);
+    if (height >= clientHeight)
+        return false;
+    cellHeight = height;
+    cellWidth = width;
+    return true;
+}
+
+bool DecreaseCell(int& cellHeight, int& cellWidth) {
+    if (cellHeight < kMinCellSize || cellWidth < kMinCellSize)
+        return false;
+    cellHeight = RoundHalfUp(cellHeight / 1.25);
+    cellWidth = RoundHalfUp(cellWidth / 1.25);
+    return true;
+}
+
+RefitNumbers ComputeRefit(const Geometry& g, int clientRight, int clientBottom, int frameWidth,
+                          int frameHeight) {
+    RefitNumbers r;
+    const int rowPitch = g.RowPitch();
+    const int columnPitch = g.ColumnPitch();
+    r.remainder = rowPitch > 0 ? (clientBottom - g.originY) % rowPitch : 0;
+    r.columns = columnPitch > 0 ? std::max(1, (g.gap - g.originX + clientRight) / columnPitch) : 1;
+    r.neededWidth = columnPitch * r.columns - g.gap + g.originX;
+    r.frameWidth = frameWidth + (r.neededWidth - clientRight);
+    // A client too low for one whole row keeps its height.
+    r.frameHeight = r.remainder != clientBottom - g.originY ? frameHeight - r.remainder : frameHeight;
+    return r;
+}
+
+int RelayoutFirstRow(int oldColumns, int firstRow, int newColumns, int count) {
+    if (newColumns <= 0)
+        return 0;
+    const long long row = static_cast<long long>(oldColumns) * firstRow / newColumns;
+    return static_cast<int>(std::min<long long>(row, count));
+}
+
+int RelayoutScrollY(const Geometry& g, int firstRow, int totalHeight) {
+    long long y = static_cast<long long>(g.RowPitch()) * firstRow + g.originY;
+    if (totalHeight > 0) {
+        while (y > totalHeight)
+            y -= totalHeight;
+    }
+    return static_cast<int>(y);
+}
+
+int PageUpFirstRow(int firstRow, int visibleRows) {
+    const int row = firstRow - visibleRows;
+    // Less than one page from the top: go to the top.
+    return row < visibleRows ? 0 : row;
+}
+
+int PageDownFirstRow(int firstRow, int visibleRows, int rows) {
+    int row = firstRow + visibleRows;
+    if (row + visibleRows > rows)
+        row = rows - visibleRows;
+    return std::max(0, row);
+}
+
+int EndFirstRow(int rows, int visibleRows) {
+    return std::max(0, rows - visibleRows);
+}
+
+int ThumbTrackStep(int trackPos, int scrollY, int rowPitch) {
+    if (rowPitch <= 0)
+        return 0;
+    const int d = trackPos - trackPos % rowPitch - scrollY;
+    if (std::abs(d) < rowPitch)
+        return 0;
+    return d < 1 ? -1 : 1;
+}
+
+namespace {
+// The base scroll view's line step: the position moves by delta within 0..total - client.
+void BaseScroll(ScrollState& s, int delta) {
+    const int limit = std::max(0, s.totalHeight - s.clientHeight);
+    s.y = std::clamp(s.y + delta, 0, limit);
+}
+} // namespace
+
+LineStep LineUp(ScrollState& s, const Geometry& g) {
+    LineStep step;
+    const int rowPitch = g.RowPitch();
+    if (s.x > 0 && s.y >= 1) {
+        s.x = 0;
+        step.resetX = true;
+    }
+    if (s.y == 0 && s.firstRow > 0) {
+        // The top of the capped range wraps round to its bottom.
+        s.y = s.totalHeight - rowPitch * (s.visibleRows + 1);
+        step.wrapped = true;
+        step.wrapY = s.y;
+    }
+    if (s.firstRow == 0)
+        return step;
+    s.firstRow -= 1;
+    step.moved = true;
+    step.createRow = s.firstRow;
+    step.createRowTop = g.originY - rowPitch;
+    BaseScroll(s, -rowPitch);
+    return step;
+}
+
+LineStep LineDown(ScrollState& s, const Geometry& g) {
+    LineStep step;
+    const int rowPitch = g.RowPitch();
+    if (s.firstRow + s.visibleRows >= s.rows)
+        return step;
+    if (s.x > 0) {
+        s.x = 0;
+        step.resetX = true;
+    }
+    if (s.firstRow + 1 + s.visibleRows < s.rows && rowPitch * (s.visibleRows + 1) + s.y == s.totalHeight) {
+        // The bottom of the capped range wraps round to its top.
+        s.y = 0;
+        step.wrapped = true;
+        step.wrapY = 0;
+    }
+    const int row = s.firstRow + 1 + s.visibleRows;
+    if (row < s.rows) {
+        step.createRow = row;
+        step.createRowTop = rowPitch * (s.visibleRows + 1) + g.originY;
+    }
+    s.firstRow += 1;
+    step.moved = true;
+    BaseScroll(s, rowPitch);
+    return step;
+}
+
+} // namespace grid

@@ -1,0 +1,123 @@
+// The arithmetic of the thumbnail grid: columns, rows, scroll sizes under the 32768-pixel cap, the
+// ring of controls, cell size steps, refitting, and the row-by-row scrolling rules. Portable: no
+// <windows.h>. The grid view feeds it client sizes and scroll positions and acts on the answers.
+#pragma once
+
+namespace grid {
+
+// Scroll ranges are kept below this many pixels.
+constexpr int kScrollCap = 32768;
+// Cell sizes below this cannot be made smaller.
+constexpr int kMinCellSize = 20;
+// Default geometry of the view.
+constexpr int kDefaultCellHeight = 143;
+constexpr int kDefaultCellWidth = 173;
+constexpr int kDefaultGap = 5;
+constexpr int kDefaultPoolRows = 11;
+
+// Height of the label under a picture: the font's text height, 2 pixels, and one edge.
+int LabelHeight(int tmHeight, int cyEdge);
+
+// Cell geometry of the grid.
+struct Geometry {
+    int originX = 0;
+    int originY = 0;
+    int cellWidth = kDefaultCellWidth;
+    int cellHeight = kDefaultCellHeight;
+    int gap = kDefaultGap; // between columns only
+    int labelHeight = 0;
+
+    int ColumnPitch() const { return cellWidth + gap; }
+    int RowPitch() const { return cellHeight + labelHeight; }
+};
+
+// Whole columns that fit the client width, at least 1.
+int ColumnsForWidth(int clientWidth, int cellWidth, int gap);
+// Rows needed for count drawings, the last one possibly partly filled.
+int RowsForCount(int count, int columns);
+// A total height above the cap becomes the largest multiple of the row pitch within it.
+int CapTotalHeight(int totalHeight, int rowPitch);
+
+// Everything a layout computes before it creates controls.
+struct LayoutNumbers {
+    int rows = 0;
+    int visibleRows = 0; // whole rows in the client height, at most rows
+    int remainder = 0;   // client height left below the whole rows
+    int totalWidth = 0;  // scroll sizes
+    int totalHeight = 0; // already capped
+    int lineX = 0;       // line and page steps
+    int lineY = 0;
+    int poolRows = 0; // visible rows + 2, 0 for an empty list
+    int poolSize = 0; // controls in the ring
+};
+
+LayoutNumbers ComputeLayout(const Geometry& g, int count, int columns, int clientHeight);
+
+// Ring slot of list index i.
+int PoolSlot(int index, int poolSize);
+
+// One cell of a row being created: the list index, its ring slot and its rectangle.
+struct Cell {
+    int index = 0;
+    int slot = 0;
+    int left = 0, top = 0, right = 0, bottom = 0;
+};
+// Cell of column c in list row r whose top edge is at rowTop.
+Cell CellOf(const Geometry& g, int columns, int poolSize, int row, int column, int rowTop);
+
+// Cell size steps. Both change height and width together and return false when refused.
+// Increase: x1.25 rounded half up, only when the new height stays below the client height.
+bool IncreaseCell(int& cellHeight, int& cellWidth, int clientHeight);
+// Decrease: /1.25 rounded half up, refused when either is already below the minimum.
+bool DecreaseCell(int& cellHeight, int& cellWidth);
+
+// Numbers of a refit to the client rectangle.
+struct RefitNumbers {
+    int remainder = 0;   // client height below the last whole row
+    int columns = 1;     // whole columns in the client width
+    int neededWidth = 0; // client width that holds exactly those columns
+    int frameWidth = 0;  // frame size that makes the client hold whole columns and rows
+    int frameHeight = 0;
+};
+RefitNumbers ComputeRefit(const Geometry& g, int clientRight, int clientBottom, int frameWidth,
+                          int frameHeight);
+
+// First row after a change of columns, keeping the first drawing shown in view.
+int RelayoutFirstRow(int oldColumns, int firstRow, int newColumns, int count);
+// Vertical position of a first row, wrapped into the capped range.
+int RelayoutScrollY(const Geometry& g, int firstRow, int totalHeight);
+
+// Keyboard jumps.
+int PageUpFirstRow(int firstRow, int visibleRows);
+int PageDownFirstRow(int firstRow, int visibleRows, int rows);
+int EndFirstRow(int rows, int visibleRows);
+
+// Thumb tracking moves by single rows: -1 up, +1 down, 0 none.
+int ThumbTrackStep(int trackPos, int scrollY, int rowPitch);
+
+// The row-by-row scrolling state of the view.
+struct ScrollState {
+    int firstRow = 0;
+    int visibleRows = 0;
+    int rows = 0;
+    int x = 0; // scroll position
+    int y = 0;
+    int totalHeight = 0;  // capped
+    int clientHeight = 0; // for the base scroll's limit
+};
+
+// What one line step asks the view to do.
+struct LineStep {
+    bool moved = false;   // first row changed (a row was created and the contents scrolled)
+    bool resetX = false;  // horizontal position set back to 0
+    bool wrapped = false; // vertical position jumped to wrapY before the step
+    int wrapY = 0;
+    int createRow = -1;   // list row to create, -1 when it does not exist
+    int createRowTop = 0; // its top in client coordinates
+};
+
+// One row up / one row down, updating the state as the view and the base scroll would.
+LineStep LineUp(ScrollState& s, const Geometry& g);
+LineStep LineDown(ScrollState& s, const Geometry& g);
+
+} // namespace grid
