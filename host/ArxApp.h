@@ -6,7 +6,7 @@
 // The library's instance handle, found by its file name when the application object starts.
 extern HINSTANCE g_hOrvexModule;
 
-constexpr UINT IDR_MAINFRAME = 128;
+#include "res/resource.h"
 
 class CTesselArxApp : public CMdiMixin {
 public:

@@ -4,7 +4,8 @@
 
 #include "framework/afxwin.h"
 
-constexpr UINT IDD_DIALOG_RUN = 200;
+#include "res/resource.h"
+
 constexpr UINT WM_ORVEX_RESULT = WM_APP; // wParam: 1 accept, 2 cancel
 
 class CDialogRun : public CDialog {
