@@ -1,0 +1,37 @@
+// Shared helpers of the framework tests that run in real windows under Wine.
+#pragma once
+
+#include "afxwin.h"
+
+#include <string>
+#include <vector>
+
+// Dispatches everything queued for this thread, without waiting.
+inline void PumpPending() {
+    MSG msg;
+    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
+        ::TranslateMessage(&msg);
+        ::DispatchMessageA(&msg);
+    }
+}
+
+// Collects what the error reporter was given while it is alive, then puts the previous reporter back.
+class ReportCapture {
+public:
+    ReportCapture() { m_previous = AfxSetErrorReporter(&ReportCapture::Record); }
+    ~ReportCapture() { AfxSetErrorReporter(m_previous); }
+    ReportCapture(const ReportCapture&) = delete;
+    ReportCapture& operator=(const ReportCapture&) = delete;
+    static std::vector<std::string>& Reports() {
+        static std::vector<std::string> reports;
+        return reports;
+    }
+
+private:
+    static void Record(const char* text) { Reports().emplace_back(text); }
+    AFX_ERROR_REPORTER m_previous;
+};
+
+inline CRect SomeRect() {
+    return CRect(10, 10, 310, 210);
+}
