@@ -12,6 +12,7 @@
 char g_szAcceptCaption[kCaptionChars] = "OK";
 char g_szCancelCaption[kCaptionChars] = "CANCEL";
 char g_szStartShellPath[kPathChars] = "";
+char g_szStartPath[kPathChars] = "";
 HWND g_hHostMainWnd = nullptr;
 
 namespace {
@@ -132,6 +133,7 @@ int OrvexWith(PickerPlatform& platform) {
     }
 
     g_szStartShellPath[0] = 0;
+    CopyBounded(g_szStartPath, narrowPath.size() < kPathChars ? narrowPath : std::string());
     if (!narrowPath.empty()) {
         g_hHostMainWnd = acedGetAcadWinApp();
         const std::string shellPath = platform.StartShellPath(narrowPath);
