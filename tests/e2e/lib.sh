@@ -1,0 +1,56 @@
+# Helpers for the end-to-end tests: run devhost.exe with Orvex1.arx under Wine and check its command line.
+# Each test gets its own folder with its own copy of the library, so the settings file beside it
+# (Orvex1.ini) belongs to that test alone.
+set -uo pipefail
+
+: "${DEVHOST:?path of devhost.exe}"
+: "${ORVEX_ARX:?path of Orvex1.arx}"
+ROOT=$(cd "$(dirname "${BASH_SOURCE[0]}")/../.." && pwd)
+WINE_RUN="$ROOT/tools/wine-run"
+
+failures=0
+checks=0
+
+WORK=$(mktemp -d "${TMPDIR:-/tmp}/orvex-e2e.XXXXXX")
+trap 'rm -rf "$WORK"' EXIT
+mkdir -p "$WORK/lib"
+cp "$ORVEX_ARX" "$WORK/lib/Orvex1.arx"
+ARX="$WORK/lib/Orvex1.arx"
+
+# The Windows form of a path of this machine (Wine maps / to drive Z:).
+winpath() { printf 'Z:%s' "$1" | tr '/' '\\'; }
+# The same, escaped as LISP prints it.
+lisppath() { winpath "$1" | sed 's/\\/\\\\/g'; }
+
+# devhost ARGS... -> its standard output without carriage returns, in $OUT; exit code in $RC.
+devhost() {
+  OUT=$("$WINE_RUN" "$DEVHOST" --arx "$(winpath "$ARX")" "$@" 2>"$WORK/stderr" | tr -d '\r')
+  RC=${PIPESTATUS[0]}
+}
+
+pass() { checks=$((checks + 1)); echo "ok: $1"; }
+fail() { checks=$((checks + 1)); failures=$((failures + 1)); echo "FAILED: $1"; }
+
+# expect_output NAME EXPECTED: the whole output must be EXPECTED.
+expect_output() {
+  if [ "$OUT" == "$2" ]; then pass "$1"; else
+    fail "$1"; echo "--- expected"; printf '%s\n' "$2"; echo "--- got (exit $RC)"; printf '%s\n' "$OUT"
+    echo "--- stderr"; tail -20 "$WORK/stderr"; fi
+}
+
+# expect_line NAME LINE: one line of the output must be LINE exactly.
+expect_line() {
+  if printf '%s\n' "$OUT" | grep -qxF -- "$2"; then pass "$1"; else
+    fail "$1"; echo "--- expected a line: $2"; echo "--- got (exit $RC)"; printf '%s\n' "$OUT"
+    echo "--- stderr"; tail -20 "$WORK/stderr"; fi
+}
+
+expect_true() { # NAME COMMAND...
+  local name=$1; shift
+  if "$@"; then pass "$name"; else fail "$name"; fi
+}
+
+finish() {
+  echo "$((checks - failures)) passed, $failures failed"
+  [ "$failures" -eq 0 ]
+}
