@@ -32,6 +32,7 @@
 #define ID_INDICATOR_NUM 59138
 #define ID_INDICATOR_SCRL 59139
 #define ID_SEPARATOR 0
+#define IDS_IDLE_MESSAGE 57345 // status-bar text when no prompt is shown
 
 // Explorer commands
 #define ID_VIEW_BEGIN 32771
