@@ -22,16 +22,19 @@
 #define ID_EDIT_PASTE 57637
 #define ID_EDIT_UNDO 57643
 #define ID_APP_ABOUT 57664
-#define ID_APP_EXIT 57665
 #define ID_HELP_INDEX 57670
 #define ID_NEXT_PANE 57680
 #define ID_PREV_PANE 57681
+// The framework defines these ids itself (afxbars.h) as constants; the resource compiler gets them here.
+#ifdef RC_INVOKED
+#define ID_APP_EXIT 57665
 #define ID_VIEW_TOOLBAR 59392
 #define ID_VIEW_STATUS_BAR 59393
 #define ID_INDICATOR_CAPS 59137
 #define ID_INDICATOR_NUM 59138
 #define ID_INDICATOR_SCRL 59139
 #define ID_SEPARATOR 0
+#endif
 #define IDS_IDLE_MESSAGE 57345 // status-bar text when no prompt is shown
 
 // Explorer commands
