@@ -4,6 +4,9 @@
 //
 // What the rest of the explorer may call is the public part below; the grid view, the thumbnails and
 // the search edit reach the frame through g_pMainFrame (null when there is none).
+//
+// Ownership. The frame is created with new and deletes itself when its window is destroyed; its bars,
+// labels, search edit and splitter are members, their windows children of the frame.
 #pragma once
 
 #include "framework/afxframe.h"
@@ -24,6 +27,11 @@ protected:
 // A toolbar edit without behaviour of its own.
 class CEditEx : public CEdit {};
 
+// Message the explorer posts to the application's main window (the run dialog): wParam 1 accept, 2 cancel.
+constexpr UINT WM_EXPLORER_RESULT = 0x8000;
+constexpr int kExplorerAccept = 1;
+constexpr int kExplorerCancel = 2;
+
 class CMainFrame : public CFrameWnd {
 public:
     CMainFrame();
@@ -34,6 +42,7 @@ public:
 
     // Enables or disables the pick: the bottom toolbar's accept button and its label.
     void EnablePick(bool enable);
+    bool IsPickEnabled() const { return m_bPickEnabled; }
 
     // Sets the window text (the grid shows the current folder or the chosen drawing there).
     void SetTitleText(const std::string& text);
@@ -47,16 +56,39 @@ public:
     CTessel3View* GetGridView() const;
     CEditSearch& GetSearchEdit() { return m_wndSearch; }
 
+    // The frame's parts, for the hosting code and its tests.
+    CToolBar& GetMainToolBar() { return m_wndToolBar; }
+    CToolBar& GetPickToolBar() { return m_wndToolBar2; }
+    CStatusBar& GetStatusBar() { return m_wndStatusBar; }
+    CSplitterWnd& GetSplitter() { return m_wndSplitter; }
+    CStatic& GetSearchLabel() { return m_wndSearchLabel; }
+    CStatic& GetLayerLabel() { return m_wndLayerLabel; }
+    CStatic& GetAcceptLabel() { return m_wndAcceptLabel; }
+    CStatic& GetCancelLabel() { return m_wndCancelLabel; }
+
+    // The label font and the text size measured with it (what the toolbar labels are sized by).
+    static HFONT LabelFont();
+    CSize MeasureLabelText(const std::string& text);
+
 protected:
     int OnCreate(LPCREATESTRUCTA cs) override;
     void OnDestroy() override;
     bool OnCreateClient(LPCREATESTRUCTA cs, CCreateContext* context) override;
     bool OnCmdMsg(UINT id, int code) override;
     bool OnUpdateCmdUI(CCmdUI* pCmdUI) override;
-    bool PreTranslateMessage(MSG* pMsg) override;
     void OnUpdateFrameTitle(bool addToTitle) override;
 
 private:
+    bool CreateMainToolBar();
+    bool CreatePickToolBar();
+    bool CreateToolBarLabel(CToolBar& bar, UINT placeholder, const std::string& text, int extraWidth,
+                            CStatic& label);
+    bool CreateSearchEdit();
+    bool CreateCaptionLabel(CToolBar& bar, UINT button, const char* caption, CStatic& label);
+    bool ForwardToGrid(UINT id);
+    void SetSortMode(int mode);
+    void ShowHelp();
+
     CSplitterWnd m_wndSplitter;
     CEditSearch m_wndSearch;
     CStatic m_wndSearchLabel;
@@ -67,6 +99,20 @@ private:
     CToolBar m_wndToolBar;
     CToolBar m_wndToolBar2;
     int m_nSort = 0;
+    bool m_bPickEnabled = true;
 };
 
 extern CMainFrame* g_pMainFrame;
+
+// Id of the bottom toolbar's window (the top one has the standard toolbar id).
+constexpr UINT kPickToolBarId = AFX_IDW_TOOLBAR + 4;
+
+// The product name that replaces "Untitled" in the window title.
+extern const char* const kExplorerTitle;
+
+// The window title with "Untitled" replaced by the product name.
+std::string ExplorerTitle(const std::string& windowText);
+// The help file: the module's own path with the extension "hlp".
+std::string HelpFilePath();
+// The layer label of a folder: " Layer name: " and the folder's datains.ini layer, or "Current".
+std::string LayerLabelText(const std::string& folder);

@@ -4,6 +4,8 @@
 
 #include "framework/afxwin.h"
 
+#include <string>
+
 class CMdiMixin : public CWinApp {
 public:
     CMdiMixin() = default;
@@ -12,7 +14,8 @@ public:
     bool SetUp(UINT frameResourceId);
 
     // Creates the explorer document and the frame for `dialog`, the run dialog whose modal loop hosts
-    // them. Returns true when the explorer stands.
+    // them. Returns true when the explorer stands. The host's main frame stays disabled until the
+    // dialog's modal run ends (the run enables its owner again).
     bool CreateAndShow(CDialog* dialog);
 
     UINT FrameResourceId() const { return m_nIDFrameResource; }
@@ -20,3 +23,18 @@ public:
 private:
     UINT m_nIDFrameResource = 0;
 };
+
+// Where the frame is put for the run dialog's screen rectangle and the stored frame size.
+struct FramePlacement {
+    bool maximised = false;
+    bool move = false; // move to x, y with the stored size
+    int x = 0;
+    int y = 0;
+};
+FramePlacement PlaceFrame(const RECT& dialog, int width, int height);
+
+// The folder the grid shows first: the folder part of the start path, else the saved current folder.
+std::string StartFolder(const std::string& startPath, const std::string& savedPath);
+
+// The file-name part of a drawing name (no folder, no extension): what the search edit starts with.
+std::string SearchTextOf(const std::string& drawingName);

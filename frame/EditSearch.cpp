@@ -1,0 +1,36 @@
+// The search edit of the top toolbar.
+#include "frame/MainFrame.h"
+
+#include "frame/GridLink.h"
+
+bool CEditSearch::OnCommandReflect(UINT code) {
+    if (code != EN_CHANGE)
+        return false;
+    // Search as you type: the grid selects and shows the first drawing whose name starts with the text.
+    SearchDrawings(GetWindowText());
+    return true;
+}
+
+LRESULT CEditSearch::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+    switch (message) {
+    case WM_KEYDOWN:
+        if (wParam == VK_ESCAPE) {
+            CMainFrame::PostResult(kExplorerCancel);
+            return 0;
+        }
+        break;
+    case WM_CHAR:
+        // The edit would beep at the escape character; the key has already cancelled.
+        if (wParam == VK_ESCAPE)
+            return 0;
+        break;
+    case WM_LBUTTONDOWN:
+        // A click starts a new search: the edit becomes writable and empty, then takes the click.
+        SendMessage(EM_SETREADONLY, FALSE);
+        SetWindowText("");
+        break;
+    default:
+        break;
+    }
+    return CEdit::WindowProc(message, wParam, lParam);
+}
