@@ -1,0 +1,561 @@
+#include "devhost/ScriptRunner.h"
+
+#include "devhost/Bitmap.h"
+#include "devhost/Output.h"
+#include "devhost/Text.h"
+
+#include <wincodec.h>
+
+#include <algorithm>
+#include <cstdio>
+#include <cstring>
+#include <string>
+
+namespace devhost {
+namespace {
+
+constexpr int kPollMs = 50;
+constexpr DWORD kSettleMs = 150; // after input, time for the user-interface thread to act on it
+
+struct ScriptError {
+    std::wstring message;
+};
+
+std::wstring ClassOf(HWND hwnd) {
+    wchar_t name[256] = {};
+    GetClassNameW(hwnd, name, 256);
+    return name;
+}
+
+// The text through WM_GETTEXT, which controls answer themselves; never waits long on a busy window.
+std::wstring TextOf(HWND hwnd) {
+    DWORD_PTR length = 0;
+    if (!SendMessageTimeoutW(hwnd, WM_GETTEXTLENGTH, 0, 0, SMTO_ABORTIFHUNG, 2000, &length))
+        return std::wstring();
+    std::wstring text(static_cast<std::size_t>(length) + 1, L'\0');
+    DWORD_PTR copied = 0;
+    if (!SendMessageTimeoutW(hwnd, WM_GETTEXT, text.size(), reinterpret_cast<LPARAM>(text.data()),
+                             SMTO_ABORTIFHUNG, 2000, &copied))
+        return std::wstring();
+    text.resize(static_cast<std::size_t>(copied) < text.size() ? static_cast<std::size_t>(copied) : length);
+    return text;
+}
+
+bool Matches(HWND hwnd, const WindowStep& step) {
+    if (!step.anyVisibility && !IsWindowVisible(hwnd))
+        return false;
+    if (!step.className.empty() &&
+        CompareStringOrdinal(ClassOf(hwnd).c_str(), -1, step.className.c_str(), -1, TRUE) != CSTR_EQUAL)
+        return false;
+    if (step.hasId && GetDlgCtrlID(hwnd) != step.id)
+        return false;
+    if (step.hasText || !step.contains.empty()) {
+        const std::wstring text = TextOf(hwnd);
+        if (step.hasText && text != step.text)
+            return false;
+        if (!step.contains.empty() && text.find(step.contains) == std::wstring::npos)
+            return false;
+    }
+    return true;
+}
+
+BOOL CALLBACK CollectChild(HWND hwnd, LPARAM list) {
+    reinterpret_cast<std::vector<HWND>*>(list)->push_back(hwnd);
+    return TRUE;
+}
+
+BOOL CALLBACK CollectTopLevel(HWND hwnd, LPARAM list) {
+    DWORD process = 0;
+    GetWindowThreadProcessId(hwnd, &process);
+    if (process == GetCurrentProcessId()) {
+        auto* windows = reinterpret_cast<std::vector<HWND>*>(list);
+        windows->push_back(hwnd);
+        EnumChildWindows(hwnd, &CollectChild, list);
+    }
+    return TRUE;
+}
+
+// Every window of the process: each top-level window followed by its descendants.
+std::vector<HWND> ProcessWindows() {
+    std::vector<HWND> windows;
+    EnumWindows(&CollectTopLevel, reinterpret_cast<LPARAM>(&windows));
+    return windows;
+}
+
+std::vector<HWND> Select(const std::vector<HWND>& candidates, const WindowStep& step) {
+    std::vector<HWND> matches;
+    for (HWND hwnd : candidates)
+        if (Matches(hwnd, step))
+            matches.push_back(hwnd);
+    if (step.nth >= 0) {
+        if (static_cast<std::size_t>(step.nth) >= matches.size())
+            return {};
+        return {matches[static_cast<std::size_t>(step.nth)]};
+    }
+    return matches;
+}
+
+std::vector<HWND> FindWindows(const std::vector<WindowStep>& path) {
+    std::vector<HWND> found;
+    for (std::size_t i = 0; i < path.size(); ++i) {
+        std::vector<HWND> candidates;
+        if (i == 0) {
+            candidates = ProcessWindows();
+        } else {
+            for (HWND parent : found) {
+                std::vector<HWND> children;
+                EnumChildWindows(parent, &CollectChild, reinterpret_cast<LPARAM>(&children));
+                for (HWND child : children)
+                    if (std::find(candidates.begin(), candidates.end(), child) == candidates.end())
+                        candidates.push_back(child);
+            }
+        }
+        found = Select(candidates, path[i]);
+        if (found.empty())
+            break;
+    }
+    return found;
+}
+
+HWND WaitForWindow(const ScriptCommand& command) {
+    const ULONGLONG deadline = GetTickCount64() + static_cast<ULONGLONG>(command.timeoutMs);
+    for (;;) {
+        const std::vector<HWND> found = FindWindows(command.window);
+        if (!found.empty())
+            return found.front();
+        if (GetTickCount64() >= deadline)
+            throw ScriptError{L"no window " + DescribeWindow(command.window) + L" within " +
+                              std::to_wstring(command.timeoutMs) + L" ms"};
+        Sleep(kPollMs);
+    }
+}
+
+void WaitGone(const ScriptCommand& command) {
+    const ULONGLONG deadline = GetTickCount64() + static_cast<ULONGLONG>(command.timeoutMs);
+    while (!FindWindows(command.window).empty()) {
+        if (GetTickCount64() >= deadline)
+            throw ScriptError{L"window " + DescribeWindow(command.window) + L" still there after " +
+                              std::to_wstring(command.timeoutMs) + L" ms"};
+        Sleep(kPollMs);
+    }
+}
+
+void Send(std::vector<INPUT>& inputs) {
+    if (inputs.empty())
+        return;
+    const UINT sent = SendInput(static_cast<UINT>(inputs.size()), inputs.data(), sizeof(INPUT));
+    if (sent != inputs.size())
+        throw ScriptError{L"SendInput refused the input (error " + std::to_wstring(GetLastError()) + L")"};
+    inputs.clear();
+}
+
+bool IsExtendedKey(WORD key) {
+    switch (key) {
+    case VK_INSERT:
+    case VK_DELETE:
+    case VK_HOME:
+    case VK_END:
+    case VK_PRIOR:
+    case VK_NEXT:
+    case VK_LEFT:
+    case VK_RIGHT:
+    case VK_UP:
+    case VK_DOWN:
+    case VK_APPS:
+        return true;
+    default:
+        return false;
+    }
+}
+
+void AddKey(std::vector<INPUT>& inputs, WORD key, bool up) {
+    INPUT input{};
+    input.type = INPUT_KEYBOARD;
+    input.ki.wVk = key;
+    input.ki.wScan = static_cast<WORD>(MapVirtualKeyW(key, MAPVK_VK_TO_VSC));
+    input.ki.dwFlags = (up ? KEYEVENTF_KEYUP : 0) | (IsExtendedKey(key) ? KEYEVENTF_EXTENDEDKEY : 0);
+    inputs.push_back(input);
+}
+
+void AddModifiers(std::vector<INPUT>& inputs, unsigned modifiers, bool up) {
+    const WORD keys[] = {VK_CONTROL, VK_SHIFT, VK_MENU};
+    const unsigned flags[] = {kCtrl, kShift, kAlt};
+    for (int i = 0; i < 3; ++i) {
+        const int k = up ? 2 - i : i;
+        if (modifiers & flags[k])
+            AddKey(inputs, keys[k], up);
+    }
+}
+
+void AddMouse(std::vector<INPUT>& inputs, DWORD flags) {
+    INPUT input{};
+    input.type = INPUT_MOUSE;
+    input.mi.dwFlags = flags;
+    inputs.push_back(input);
+}
+
+// The screen point of the command: at=X,Y in the window's client area, or the client area's centre.
+POINT TargetPoint(HWND hwnd, const ScriptCommand& command) {
+    POINT point{command.x, command.y};
+    if (!command.hasPoint) {
+        RECT client{};
+        GetClientRect(hwnd, &client);
+        point = {client.right / 2, client.bottom / 2};
+    }
+    ClientToScreen(hwnd, &point);
+    return point;
+}
+
+void MovePointer(POINT point) {
+    const int width = GetSystemMetrics(SM_CXSCREEN);
+    const int height = GetSystemMetrics(SM_CYSCREEN);
+    INPUT input{};
+    input.type = INPUT_MOUSE;
+    input.mi.dx = MulDiv(point.x, 65535, width > 1 ? width - 1 : 1);
+    input.mi.dy = MulDiv(point.y, 65535, height > 1 ? height - 1 : 1);
+    input.mi.dwFlags = MOUSEEVENTF_MOVE | MOUSEEVENTF_ABSOLUTE;
+    std::vector<INPUT> inputs{input};
+    Send(inputs);
+    POINT now{};
+    // The normalised coordinates can land a pixel off; put the pointer exactly where it was meant to go.
+    if (GetCursorPos(&now) && (now.x != point.x || now.y != point.y))
+        SetCursorPos(point.x, point.y);
+}
+
+void Click(HWND hwnd, const ScriptCommand& command) {
+    MovePointer(TargetPoint(hwnd, command));
+    Sleep(30);
+    std::vector<INPUT> inputs;
+    AddModifiers(inputs, command.modifiers, false);
+    const bool right = command.kind == ScriptCommand::Kind::RightClick;
+    const int clicks = command.kind == ScriptCommand::Kind::DoubleClick ? 2 : 1;
+    for (int i = 0; i < clicks; ++i) {
+        AddMouse(inputs, right ? MOUSEEVENTF_RIGHTDOWN : MOUSEEVENTF_LEFTDOWN);
+        AddMouse(inputs, right ? MOUSEEVENTF_RIGHTUP : MOUSEEVENTF_LEFTUP);
+    }
+    AddModifiers(inputs, command.modifiers, true);
+    Send(inputs);
+}
+
+void PressKeys(const ScriptCommand& command) {
+    for (const KeyChord& chord : command.keys) {
+        std::vector<INPUT> inputs;
+        AddModifiers(inputs, chord.modifiers, false);
+        AddKey(inputs, chord.virtualKey, false);
+        AddKey(inputs, chord.virtualKey, true);
+        AddModifiers(inputs, chord.modifiers, true);
+        Send(inputs);
+        Sleep(30);
+    }
+}
+
+void TypeText(const std::wstring& text) {
+    for (wchar_t c : text) {
+        std::vector<INPUT> inputs;
+        for (bool up : {false, true}) {
+            INPUT input{};
+            input.type = INPUT_KEYBOARD;
+            input.ki.wScan = static_cast<WORD>(c);
+            input.ki.dwFlags = KEYEVENTF_UNICODE | (up ? KEYEVENTF_KEYUP : 0);
+            inputs.push_back(input);
+        }
+        Send(inputs);
+        Sleep(10);
+    }
+}
+
+// What the screen shows of the window (its on-screen rectangle, with whatever overlaps it).
+Image CaptureWindow(HWND hwnd) {
+    RECT rect{};
+    GetWindowRect(hwnd, &rect);
+    Image image;
+    image.width = rect.right - rect.left;
+    image.height = rect.bottom - rect.top;
+    if (image.width <= 0 || image.height <= 0)
+        throw ScriptError{L"the window has no size to capture"};
+    HDC screen = GetDC(nullptr);
+    HDC memory = CreateCompatibleDC(screen);
+    BITMAPINFO info{};
+    info.bmiHeader.biSize = sizeof info.bmiHeader;
+    info.bmiHeader.biWidth = image.width;
+    info.bmiHeader.biHeight = -image.height; // top-down
+    info.bmiHeader.biPlanes = 1;
+    info.bmiHeader.biBitCount = 24;
+    info.bmiHeader.biCompression = BI_RGB;
+    void* bits = nullptr;
+    HBITMAP bitmap = CreateDIBSection(screen, &info, DIB_RGB_COLORS, &bits, nullptr, 0);
+    bool copied = false;
+    if (bitmap && memory) {
+        HGDIOBJ old = SelectObject(memory, bitmap);
+        copied = BitBlt(memory, 0, 0, image.width, image.height, screen, rect.left, rect.top,
+                        SRCCOPY | CAPTUREBLT);
+        GdiFlush();
+        if (copied) {
+            const std::size_t stride =
+                (static_cast<std::size_t>(image.width) * 3 + 3) & ~static_cast<std::size_t>(3);
+            const std::size_t row = static_cast<std::size_t>(image.width) * 3;
+            image.bgr.resize(row * static_cast<std::size_t>(image.height));
+            for (int y = 0; y < image.height; ++y)
+                std::memcpy(image.bgr.data() + static_cast<std::size_t>(y) * row,
+                            static_cast<const std::uint8_t*>(bits) + static_cast<std::size_t>(y) * stride,
+                            row);
+        }
+        SelectObject(memory, old);
+    }
+    if (bitmap)
+        DeleteObject(bitmap);
+    if (memory)
+        DeleteDC(memory);
+    ReleaseDC(nullptr, screen);
+    if (!copied)
+        throw ScriptError{L"could not capture the screen"};
+    return image;
+}
+
+template <class T> struct ComPtr {
+    T* p = nullptr;
+    ComPtr() = default;
+    ComPtr(const ComPtr&) = delete;
+    ComPtr& operator=(const ComPtr&) = delete;
+    ~ComPtr() {
+        if (p)
+            p->Release();
+    }
+};
+
+bool EndsWithIgnoreCase(const std::wstring& text, const wchar_t* suffix) {
+    const std::size_t n = wcslen(suffix);
+    return text.size() >= n &&
+           CompareStringOrdinal(text.c_str() + text.size() - n, -1, suffix, -1, TRUE) == CSTR_EQUAL;
+}
+
+void SavePng(const Image& image, const std::wstring& file) {
+    const HRESULT init = CoInitializeEx(nullptr, COINIT_MULTITHREADED);
+    HRESULT hr = S_OK;
+    {
+        ComPtr<IWICImagingFactory> factory;
+        ComPtr<IWICStream> stream;
+        ComPtr<IWICBitmapEncoder> encoder;
+        ComPtr<IWICBitmapFrameEncode> frame;
+        const UINT stride = static_cast<UINT>(image.width) * 3;
+        WICPixelFormatGUID format = GUID_WICPixelFormat24bppBGR;
+        hr = CoCreateInstance(CLSID_WICImagingFactory, nullptr, CLSCTX_INPROC_SERVER, IID_IWICImagingFactory,
+                              reinterpret_cast<void**>(&factory.p));
+        if (SUCCEEDED(hr))
+            hr = factory.p->CreateStream(&stream.p);
+        if (SUCCEEDED(hr))
+            hr = stream.p->InitializeFromFilename(file.c_str(), GENERIC_WRITE);
+        if (SUCCEEDED(hr))
+            hr = factory.p->CreateEncoder(GUID_ContainerFormatPng, nullptr, &encoder.p);
+        if (SUCCEEDED(hr))
+            hr = encoder.p->Initialize(stream.p, WICBitmapEncoderNoCache);
+        if (SUCCEEDED(hr))
+            hr = encoder.p->CreateNewFrame(&frame.p, nullptr);
+        if (SUCCEEDED(hr))
+            hr = frame.p->Initialize(nullptr);
+        if (SUCCEEDED(hr))
+            hr = frame.p->SetSize(static_cast<UINT>(image.width), static_cast<UINT>(image.height));
+        if (SUCCEEDED(hr))
+            hr = frame.p->SetPixelFormat(&format);
+        if (SUCCEEDED(hr) && format != GUID_WICPixelFormat24bppBGR)
+            hr = E_FAIL;
+        if (SUCCEEDED(hr))
+            hr = frame.p->WritePixels(static_cast<UINT>(image.height), stride,
+                                      static_cast<UINT>(image.bgr.size()),
+                                      const_cast<BYTE*>(image.bgr.data()));
+        if (SUCCEEDED(hr))
+            hr = frame.p->Commit();
+        if (SUCCEEDED(hr))
+            hr = encoder.p->Commit();
+    }
+    if (SUCCEEDED(init))
+        CoUninitialize();
+    if (FAILED(hr)) {
+        wchar_t code[16];
+        swprintf(code, 16, L"%08lX", static_cast<unsigned long>(hr));
+        throw ScriptError{L"could not write the PNG file " + file + L" (HRESULT " + code + L")"};
+    }
+}
+
+void SaveBmp(const Image& image, const std::wstring& file) {
+    const std::vector<std::uint8_t> bytes = EncodeBmp24(image);
+    HANDLE handle =
+        CreateFileW(file.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
+    DWORD written = 0;
+    const bool ok = handle != INVALID_HANDLE_VALUE &&
+                    WriteFile(handle, bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) &&
+                    written == bytes.size();
+    if (handle != INVALID_HANDLE_VALUE)
+        CloseHandle(handle);
+    if (!ok)
+        throw ScriptError{L"could not write the file " + file};
+}
+
+std::wstring YesNo(bool value) {
+    return value ? L"yes" : L"no";
+}
+
+void Fact(const std::wstring& text) {
+    WriteLine(L"[script] " + text);
+}
+
+struct RunDialogSearch {
+    HWND found = nullptr;
+    bool foundEmpty = false;
+};
+
+BOOL CALLBACK VisitThreadWindow(HWND hwnd, LPARAM param) {
+    auto* search = reinterpret_cast<RunDialogSearch*>(param);
+    if (ClassOf(hwnd) != L"#32770" || !IsWindowEnabled(hwnd))
+        return TRUE;
+    RECT rect{};
+    GetWindowRect(hwnd, &rect);
+    const bool empty = rect.right - rect.left <= 0 || rect.bottom - rect.top <= 0;
+    if (!search->found || (empty && !search->foundEmpty)) {
+        search->found = hwnd;
+        search->foundEmpty = empty;
+    }
+    return TRUE;
+}
+
+} // namespace
+
+HWND FindRunDialog(DWORD threadId) {
+    RunDialogSearch search;
+    EnumThreadWindows(threadId, &VisitThreadWindow, reinterpret_cast<LPARAM>(&search));
+    return search.found;
+}
+
+ScriptRunner::ScriptRunner(std::vector<ScriptCommand> commands, DWORD uiThreadId)
+    : m_commands(std::move(commands)), m_uiThreadId(uiThreadId) {}
+
+ScriptRunner::~ScriptRunner() {
+    if (m_thread) {
+        WaitForSingleObject(m_thread, INFINITE);
+        CloseHandle(m_thread);
+    }
+}
+
+bool ScriptRunner::Start() {
+    if (m_thread)
+        return true;
+    m_thread = CreateThread(nullptr, 0, &ScriptRunner::ThreadProc, this, 0, nullptr);
+    return m_thread != nullptr;
+}
+
+DWORD WINAPI ScriptRunner::ThreadProc(void* self) {
+    auto* runner = static_cast<ScriptRunner*>(self);
+    try {
+        runner->Run();
+    } catch (...) {
+        runner->m_failed = true;
+        WriteLine(L"[script] error: the script stopped on an unexpected failure");
+    }
+    return 0;
+}
+
+void ScriptRunner::Run() {
+    for (const ScriptCommand& command : m_commands) {
+        try {
+            Execute(command);
+        } catch (const ScriptError& error) {
+            m_failed = true;
+            WriteLine(L"[script] error: line " + std::to_wstring(command.line) + L": " +
+                      EscapeControls(error.message));
+            // Do not leave the LISP call waiting for input that will not come.
+            if (HWND dialog = FindRunDialog(m_uiThreadId))
+                PostMessageW(dialog, WM_APP, 2, 0);
+            return;
+        }
+    }
+}
+
+bool ScriptRunner::Execute(const ScriptCommand& command) {
+    using Kind = ScriptCommand::Kind;
+    switch (command.kind) {
+    case Kind::Wait:
+        WaitForWindow(command);
+        break;
+    case Kind::Gone:
+        WaitGone(command);
+        break;
+    case Kind::Sleep:
+        Sleep(static_cast<DWORD>(command.ms));
+        break;
+    case Kind::Move:
+        MovePointer(TargetPoint(WaitForWindow(command), command));
+        Sleep(kSettleMs);
+        break;
+    case Kind::Click:
+    case Kind::DoubleClick:
+    case Kind::RightClick:
+        Click(WaitForWindow(command), command);
+        Sleep(kSettleMs);
+        break;
+    case Kind::Key:
+        PressKeys(command);
+        Sleep(kSettleMs);
+        break;
+    case Kind::Type:
+        TypeText(command.text);
+        Sleep(kSettleMs);
+        break;
+    case Kind::Screenshot: {
+        const Image image = CaptureWindow(WaitForWindow(command));
+        if (EndsWithIgnoreCase(command.file, L".png"))
+            SavePng(image, command.file);
+        else
+            SaveBmp(image, command.file);
+        Fact(L"screenshot " + command.file + L" " + std::to_wstring(image.width) + L"x" +
+             std::to_wstring(image.height));
+        break;
+    }
+    case Kind::Count:
+        Fact(L"count " + std::to_wstring(FindWindows(command.window).size()));
+        break;
+    case Kind::Text:
+        Fact(L"text " + EscapeControls(TextOf(WaitForWindow(command))));
+        break;
+    case Kind::Rect: {
+        RECT rect{};
+        GetWindowRect(WaitForWindow(command), &rect);
+        Fact(L"rect " + std::to_wstring(rect.left) + L" " + std::to_wstring(rect.top) + L" " +
+             std::to_wstring(rect.right - rect.left) + L" " + std::to_wstring(rect.bottom - rect.top));
+        break;
+    }
+    case Kind::Enabled:
+        Fact(L"enabled " + YesNo(IsWindowEnabled(WaitForWindow(command))));
+        break;
+    case Kind::Exists:
+        Fact(L"exists " + YesNo(!FindWindows(command.window).empty()));
+        break;
+    case Kind::Tooltip: {
+        std::wstring text;
+        for (HWND hwnd : ProcessWindows()) {
+            if (IsWindowVisible(hwnd) && ClassOf(hwnd) == L"tooltips_class32") {
+                text = TextOf(hwnd);
+                if (!text.empty())
+                    break;
+            }
+        }
+        Fact(L"tooltip " + (text.empty() ? std::wstring(L"(none)") : EscapeControls(text)));
+        break;
+    }
+    case Kind::Focus: {
+        GUITHREADINFO info{};
+        info.cbSize = sizeof info;
+        if (GetGUIThreadInfo(m_uiThreadId, &info) && info.hwndFocus)
+            Fact(L"focus " + ClassOf(info.hwndFocus) + L" id=" +
+                 std::to_wstring(GetDlgCtrlID(info.hwndFocus)));
+        else
+            Fact(L"focus (none)");
+        break;
+    }
+    case Kind::Echo:
+        Fact(command.text);
+        break;
+    }
+    return true;
+}
+
+} // namespace devhost

@@ -1,0 +1,368 @@
+#include "devhost/Session.h"
+
+#include "devhost/HostObjects.h"
+#include "devhost/HostWindows.h"
+#include "devhost/Lisp.h"
+#include "devhost/Output.h"
+#include "devhost/ResultBuffers.h"
+#include "devhost/Script.h"
+#include "devhost/ScriptRunner.h"
+#include "devhost/Text.h"
+
+#include <windows.h>
+
+#include <memory>
+
+namespace devhost {
+namespace {
+
+// The application id given to the entry point: an address of the host's, unique per loaded library.
+int g_applicationIdentity;
+
+constexpr UINT_PTR kPostRetryMs = 50;
+
+std::wstring SystemMessage(DWORD code) {
+    wchar_t* buffer = nullptr;
+    const DWORD length = FormatMessageW(FORMAT_MESSAGE_ALLOCATE_BUFFER | FORMAT_MESSAGE_FROM_SYSTEM |
+                                            FORMAT_MESSAGE_IGNORE_INSERTS,
+                                        nullptr, code, 0, reinterpret_cast<wchar_t*>(&buffer), 0, nullptr);
+    std::wstring text = length ? std::wstring(buffer, length) : std::wstring();
+    if (buffer)
+        LocalFree(buffer);
+    while (!text.empty() &&
+           (text.back() == L'\n' || text.back() == L'\r' || text.back() == L' ' || text.back() == L'.'))
+        text.pop_back();
+    return L"error " + std::to_wstring(code) + (text.empty() ? L"" : L", " + text);
+}
+
+std::wstring ExeDirectory() {
+    std::wstring path(MAX_PATH, L'\0');
+    for (;;) {
+        const DWORD length = GetModuleFileNameW(nullptr, path.data(), static_cast<DWORD>(path.size()));
+        if (length < path.size()) {
+            path.resize(length);
+            break;
+        }
+        path.resize(path.size() * 2);
+    }
+    const std::size_t slash = path.find_last_of(L"\\/");
+    return slash == std::wstring::npos ? std::wstring() : path.substr(0, slash + 1);
+}
+
+void PumpMessages() {
+    MSG message;
+    while (PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE)) {
+        TranslateMessage(&message);
+        DispatchMessageW(&message);
+    }
+}
+
+// Waits for a thread while the user-interface thread keeps answering its windows.
+void WaitPumping(HANDLE thread) {
+    for (;;) {
+        const DWORD result = MsgWaitForMultipleObjects(1, &thread, FALSE, INFINITE, QS_ALLINPUT);
+        if (result != WAIT_OBJECT_0 + 1)
+            return;
+        PumpMessages();
+    }
+}
+
+// --after-ms: a thread timer (it fires inside the library's modal loop) that posts the accept or cancel
+// message to the run dialog once it is there.
+WPARAM g_postValue = 0;
+bool g_posted = false;
+
+void CALLBACK PostTimer(HWND, UINT, UINT_PTR timer, DWORD) {
+    if (g_posted)
+        return;
+    if (HWND dialog = FindRunDialog(GetCurrentThreadId())) {
+        PostMessageW(dialog, WM_APP, g_postValue, 0);
+        g_posted = true;
+        KillTimer(nullptr, timer);
+        if (Host().options.verbose)
+            WriteLine(g_postValue == 1 ? L"[host] posted accept" : L"[host] posted cancel");
+        return;
+    }
+    SetTimer(nullptr, timer, kPostRetryMs, &PostTimer); // not there yet: look again shortly
+}
+
+class Session {
+public:
+    explicit Session(const Options& options) : m_options(options) {}
+    ~Session() {
+        if (m_library)
+            FreeLibrary(m_library);
+        m_frame.Destroy();
+    }
+
+    int Run();
+
+private:
+    bool LoadScript();
+    bool CreateWindows();
+    bool LoadLibraryAndEntryPoints();
+    void CreateModule();
+    void OpenDocuments();
+    void CloseDocuments();
+    void Activate(AcApDocument* document);
+    void Evaluate(const std::wstring& expression);
+    void StartScript();
+    void Send(AcRx::AppMsgCode message);
+
+    const Options& m_options;
+    FrameWindow m_frame;
+    std::wstring m_libraryPath;
+    HMODULE m_library = nullptr;
+    AcrxEntryPointFn m_entryPoint = nullptr;
+    OdrxCreateModuleObjectFn m_createModule = nullptr;
+    OdRxModule* m_module = nullptr;
+    std::unique_ptr<ScriptRunner> m_script;
+    int m_exitCode = kExitOk;
+};
+
+bool Session::LoadScript() {
+    if (m_options.script.empty())
+        return true;
+    HANDLE file = CreateFileW(m_options.script.c_str(), GENERIC_READ, FILE_SHARE_READ, nullptr, OPEN_EXISTING,
+                              FILE_ATTRIBUTE_NORMAL, nullptr);
+    if (file == INVALID_HANDLE_VALUE) {
+        WriteError(L"cannot read the script " + m_options.script + L": " + SystemMessage(GetLastError()));
+        return false;
+    }
+    std::string bytes;
+    char buffer[4096];
+    DWORD read = 0;
+    while (ReadFile(file, buffer, sizeof buffer, &read, nullptr) && read > 0 && bytes.size() < (1u << 24))
+        bytes.append(buffer, read);
+    CloseHandle(file);
+    std::vector<ScriptCommand> commands;
+    std::wstring error;
+    if (!ReadScript(FromUtf8(bytes), commands, error)) {
+        WriteError(L"script " + m_options.script + L", " + error);
+        return false;
+    }
+    m_script = std::make_unique<ScriptRunner>(std::move(commands), GetCurrentThreadId());
+    return true;
+}
+
+bool Session::CreateWindows() {
+    if (!RegisterHostClasses() || !m_frame.Create()) {
+        WriteError(L"cannot create the host's windows: " + SystemMessage(GetLastError()));
+        return false;
+    }
+    Host().frame = m_frame.Handle();
+    PumpMessages();
+    return true;
+}
+
+bool Session::LoadLibraryAndEntryPoints() {
+    m_libraryPath = m_options.arx.empty() ? ExeDirectory() + L"Orvex1.arx" : m_options.arx;
+    if (GetFileAttributesW(m_libraryPath.c_str()) == INVALID_FILE_ATTRIBUTES) {
+        WriteError(L"cannot load " + m_libraryPath + L": no such file");
+        return false;
+    }
+    m_library = LoadLibraryW(m_libraryPath.c_str());
+    if (!m_library) {
+        WriteError(L"cannot load " + m_libraryPath + L": " + SystemMessage(GetLastError()));
+        return false;
+    }
+    m_entryPoint = reinterpret_cast<AcrxEntryPointFn>(
+        reinterpret_cast<void*>(GetProcAddress(m_library, "acrxEntryPoint")));
+    m_createModule = reinterpret_cast<OdrxCreateModuleObjectFn>(
+        reinterpret_cast<void*>(GetProcAddress(m_library, "odrxCreateModuleObject")));
+    if (!m_entryPoint || !m_createModule) {
+        WriteError(m_libraryPath + L" does not export " +
+                   (m_entryPoint ? L"odrxCreateModuleObject" : L"acrxEntryPoint"));
+        return false;
+    }
+    if (m_options.verbose)
+        WriteLine(L"[host] loaded " + m_libraryPath);
+    return true;
+}
+
+void Session::Send(AcRx::AppMsgCode message) {
+    if (m_options.verbose)
+        WriteLine(L"[host] message " + std::to_wstring(static_cast<int>(message)));
+    m_entryPoint(message, Host().appId);
+}
+
+void Session::CreateModule() {
+    m_module = m_createModule();
+    if (!m_module) {
+        WriteLine(L"[host] odrxCreateModuleObject returned no module object");
+        return;
+    }
+    m_module->initApp();
+}
+
+void Session::Activate(AcApDocument* document) {
+    HostState& host = Host();
+    const bool changed = host.docManager.curDocument() != document;
+    host.docManager.SetCurrent(document);
+    ShowOnlyView(host.frame, document ? document->View() : nullptr);
+    if (document && document->View())
+        SetFocus(document->View());
+    if (changed && document)
+        host.docManager.NotifyActivated(document);
+}
+
+// Drawings open after the library is initialised and close before it is unloaded, each one current
+// while it is loaded or unloaded.
+void Session::OpenDocuments() {
+    HostState& host = Host();
+    for (int i = 0; i < m_options.drawings; ++i) {
+        auto document = std::make_unique<AcApDocument>(L"Drawing" + std::to_wstring(i + 1) + L".dwg");
+        document->SetView(CreateDrawingView(host.frame, document->Name(), i));
+        AcApDocument* opened = document.get();
+        host.documents.push_back(std::move(document));
+        host.docManager.NotifyCreated(opened);
+        Activate(opened);
+        Send(AcRx::kLoadDwgMsg);
+    }
+    Activate(host.documents.front().get());
+    PumpMessages();
+}
+
+void Session::CloseDocuments() {
+    HostState& host = Host();
+    while (!host.documents.empty()) {
+        AcApDocument* document = host.documents.front().get();
+        Activate(document);
+        Send(AcRx::kUnloadDwgMsg);
+        host.docManager.NotifyToBeDestroyed(document);
+        host.docManager.SetCurrent(nullptr);
+        if (document->View())
+            DestroyWindow(document->View());
+        host.documents.erase(host.documents.begin());
+    }
+    PumpMessages();
+}
+
+void Session::StartScript() {
+    if (m_script && !m_script->Started() && !m_script->Start()) {
+        WriteLine(L"[script] error: cannot start the script thread");
+        m_exitCode = kExitScript;
+    }
+}
+
+void Session::Evaluate(const std::wstring& expression) {
+    HostState& host = Host();
+    LispCall call;
+    std::wstring error;
+    if (!ReadLispCall(expression, call, error)) {
+        WriteLine(L"; error: " + error);
+        m_exitCode = m_exitCode == kExitOk ? kExitLispError : m_exitCode;
+        return;
+    }
+    AcApDocument* document = host.docManager.curDocument();
+    const auto& functions = document->Functions();
+    const auto found = functions.find(LowerCase(call.function));
+    if (found == functions.end()) {
+        WriteLine(L"; error: no function definition: " + EscapeControls(call.function));
+        m_exitCode = m_exitCode == kExitOk ? kExitLispError : m_exitCode;
+        return;
+    }
+    host.args = BuildArgumentChain(call.args);
+    if (!call.args.empty() && !host.args) {
+        WriteLine(L"; error: out of memory");
+        m_exitCode = m_exitCode == kExitOk ? kExitLispError : m_exitCode;
+        return;
+    }
+    host.liveArgNodes.clear();
+    for (const resbuf* node = host.args; node; node = node->rbnext)
+        host.liveArgNodes.insert(node);
+    host.functionCode = found->second;
+    host.result = CallResult::Void;
+    host.inCall = true;
+
+    UINT_PTR timer = 0;
+    if (m_options.afterMs >= 0) {
+        g_postValue = m_options.post == Options::Post::Accept ? 1 : 2;
+        g_posted = false;
+        timer = SetTimer(nullptr, 0, static_cast<UINT>(m_options.afterMs), &PostTimer);
+    }
+    StartScript();
+
+    m_entryPoint(AcRx::kInvkSubrMsg, host.appId);
+
+    if (timer)
+        KillTimer(nullptr, timer);
+    host.inCall = false;
+    host.functionCode = RTERROR;
+    switch (host.result) {
+    case CallResult::Void:
+        WriteLine(L"=> (no value)");
+        break;
+    case CallResult::Nil:
+        WriteLine(L"=> nil");
+        break;
+    case CallResult::List:
+        WriteLine(L"=> " + PrintChain(host.resultList));
+        break;
+    }
+    // The argument nodes the library did not release are still the host's.
+    for (const resbuf* node : host.liveArgNodes) {
+        resbuf* own = const_cast<resbuf*>(node);
+        own->rbnext = nullptr;
+        FreeChain(own);
+    }
+    host.liveArgNodes.clear();
+    host.args = nullptr;
+    FreeChain(host.resultList);
+    host.resultList = nullptr;
+    host.result = CallResult::Void;
+    PumpMessages();
+}
+
+int Session::Run() {
+    HostState& host = Host();
+    host.options = m_options;
+    host.appId = &g_applicationIdentity;
+    host.layers[L"0"] = 7; // every drawing has layer 0
+    for (const LayerOption& layer : m_options.layers)
+        host.layers[UpperCase(layer.name)] = layer.colorIndex;
+
+    if (!LoadScript())
+        return kExitUsage;
+    if (!CreateWindows())
+        return kExitHost;
+    if (!LoadLibraryAndEntryPoints())
+        return kExitLoad;
+
+    if (m_options.order == Options::Order::ModuleFirst) {
+        CreateModule();
+        Send(AcRx::kInitAppMsg);
+    } else {
+        Send(AcRx::kInitAppMsg);
+        CreateModule();
+    }
+    OpenDocuments();
+
+    for (const std::wstring& expression : m_options.evals)
+        Evaluate(expression);
+    StartScript(); // a script runs even without a LISP call, on the host's own windows
+    if (m_script && m_script->Started()) {
+        WaitPumping(m_script->Thread());
+        if (m_script->Failed())
+            m_exitCode = kExitScript;
+    }
+
+    CloseDocuments();
+    Send(AcRx::kUnloadAppMsg);
+    if (m_module)
+        m_module->uninitApp();
+    if (m_options.verbose)
+        WriteLine(L"[host] unloading " + m_libraryPath);
+    FreeLibrary(m_library);
+    m_library = nullptr;
+    return m_exitCode;
+}
+
+} // namespace
+
+int RunSession(const Options& options) {
+    Session session(options);
+    return session.Run();
+}
+
+} // namespace devhost

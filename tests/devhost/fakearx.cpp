@@ -1,0 +1,298 @@
+// A small extension library for devhost's tests. It exports the four entry functions the way the
+// product does, binds the host's operations by name from the process, and defines LISP functions that
+// show what the host does with each kind of result, print and alert, and a picker dialog.
+#include "host/arxhost.h"
+
+#include <windows.h>
+
+#include <cstdint>
+#include <new>
+#include <string>
+#include <vector>
+
+extern "C" IMAGE_DOS_HEADER __ImageBase;
+
+namespace {
+
+struct HostOperations {
+#define FAKE_MEMBER(ret, name, params) ret(*name) params = nullptr;
+    ORVEX_HOST_OPERATIONS(FAKE_MEMBER)
+#undef FAKE_MEMBER
+};
+
+HostOperations& Host() {
+    static HostOperations ops = [] {
+        HostOperations bound;
+        HMODULE exe = GetModuleHandleW(nullptr);
+#define FAKE_BIND(ret, name, params)                                                                         \
+    bound.name = reinterpret_cast<ret(*) params>(reinterpret_cast<void*>(GetProcAddress(exe, #name)));
+        ORVEX_HOST_OPERATIONS(FAKE_BIND)
+#undef FAKE_BIND
+        return bound;
+    }();
+    return ops;
+}
+
+// Documents are named by the order in which they were created: #1, #2, ...
+std::vector<AcApDocument*> g_documents;
+
+int DocumentNumber(AcApDocument* document) {
+    for (std::size_t i = 0; i < g_documents.size(); ++i)
+        if (g_documents[i] == document)
+            return static_cast<int>(i) + 1;
+    return 0;
+}
+
+class Reactor final : public AcApDocManagerReactor {
+public:
+    void documentCreated(AcApDocument* document) override {
+        g_documents.push_back(document);
+        Host().acutPrintf(L"fake: created #%d\n", DocumentNumber(document));
+    }
+    void documentToBeDestroyed(AcApDocument* document) override {
+        Host().acutPrintf(L"fake: to be destroyed #%d\n", DocumentNumber(document));
+    }
+    void documentActivated(AcApDocument* document) override {
+        Host().acutPrintf(L"fake: activated #%d\n", DocumentNumber(document));
+    }
+};
+
+// Registered while the library is loaded, as the product's per-document data manager is.
+struct ReactorRegistration {
+    Reactor reactor;
+    ReactorRegistration() {
+        if (Host().acDocManagerPtr)
+            Host().acDocManagerPtr()->addReactor(&reactor);
+    }
+    ~ReactorRegistration() {
+        if (Host().acDocManagerPtr)
+            Host().acDocManagerPtr()->removeReactor(&reactor);
+    }
+} g_registration;
+
+// ---- LISP functions ----
+
+void Echo() {
+    resbuf* args = Host().acedGetArgs();
+    Host().acedRetList(args);
+    Host().acutRelRb(args); // the host must not free these again
+}
+
+void Keep() { // leaves the arguments to the host
+    resbuf* args = Host().acedGetArgs();
+    Host().acedRetList(args);
+}
+
+void Nothing() {
+    Host().acedRetNil();
+}
+
+void Void() {}
+
+void Talk() {
+    Host().acutPrintf(L"\nhello %s %d %.2f %hs", L"wide", 42, 1.5, "narrow");
+    Host().acedAlert(L"\nline1\nline2\t\\end");
+    Host().acdbFail(L"oops\n");
+}
+
+void Build() {
+    const double point[3] = {1, 2, 3};
+    resbuf* list =
+        Host().acutBuildList(RTSTR, L"a", RTLB, RTSHORT, 1, RTLONG, static_cast<std::int32_t>(100000), RTREAL,
+                             2.5, RTPOINT, point, RTLE, RTNIL, 0);
+    Host().acedRetList(list);
+    Host().acutRelRb(list);
+}
+
+void Layer() {
+    resbuf* args = Host().acedGetArgs();
+    int color = -1;
+    if (args && args->restype == RTSTR && Host().acdbGetLayerColor(args->resval.rstring, &color)) {
+        resbuf* list = Host().acutBuildList(RTSTR, args->resval.rstring, RTSHORT, color, RTLONG,
+                                            static_cast<std::int32_t>(Host().acedGetRGB(color)), 0);
+        Host().acedRetList(list);
+        Host().acutRelRb(list);
+    } else {
+        Host().acedRetNil();
+    }
+    Host().acutRelRb(args);
+}
+
+std::wstring ClassOf(HWND hwnd) {
+    wchar_t name[128] = L"(none)";
+    if (hwnd)
+        GetClassNameW(hwnd, name, 128);
+    return name;
+}
+
+void Windows() {
+    const std::wstring frame = ClassOf(Host().acedGetAcadFrame());
+    const std::wstring app = ClassOf(Host().acedGetAcadWinApp());
+    const std::wstring view = ClassOf(Host().acedGetAcadDwgView());
+    const bool visible = IsWindowVisible(Host().acedGetAcadDwgView());
+    const bool child = GetParent(Host().acedGetAcadDwgView()) == Host().acedGetAcadFrame();
+    resbuf* list = Host().acutBuildList(RTSTR, frame.c_str(), RTSTR, app.c_str(), RTSTR, view.c_str(),
+                                        RTSHORT, visible ? 1 : 0, RTSHORT, child ? 1 : 0, 0);
+    Host().acedRetList(list);
+    Host().acutRelRb(list);
+}
+
+void Misc() {
+    int color = 3;
+    const bool chosen = Host().acedSetColorDialog(&color, false, 7);
+    const bool drawn =
+        Host().acdbDisplayPreviewFromDwg(L"no-such-file.dwg", Host().acedGetAcadDwgView(), nullptr);
+    resbuf* list = Host().acutBuildList(RTSHORT, chosen ? 1 : 0, RTSHORT, color, RTSHORT, drawn ? 1 : 0,
+                                        RTSHORT, Host().acedGetFunCode(), 0);
+    Host().acedRetList(list);
+    Host().acutRelRb(list);
+}
+
+wchar_t g_pickedText[256];
+
+INT_PTR CALLBACK PickerProc(HWND dialog, UINT message, WPARAM wParam, LPARAM) {
+    switch (message) {
+    case WM_INITDIALOG:
+        return TRUE;
+    case WM_COMMAND:
+        if (LOWORD(wParam) == 1001) {
+            GetDlgItemTextW(dialog, 1002, g_pickedText, 256);
+            EndDialog(dialog, 7);
+            return TRUE;
+        }
+        if (LOWORD(wParam) == IDCANCEL) {
+            EndDialog(dialog, 2);
+            return TRUE;
+        }
+        return FALSE;
+    case WM_APP: // accept (1) or cancel (2), as the explorer posts it
+        EndDialog(dialog, static_cast<INT_PTR>(wParam));
+        return TRUE;
+    default:
+        return FALSE;
+    }
+}
+
+void Picker() {
+    g_pickedText[0] = 0;
+    const INT_PTR result = DialogBoxParamW(reinterpret_cast<HINSTANCE>(&__ImageBase), MAKEINTRESOURCEW(100),
+                                           Host().acedGetAcadFrame(), &PickerProc, 0);
+    resbuf* list =
+        Host().acutBuildList(RTSTR, L"picker", RTSHORT, static_cast<int>(result), RTSTR, g_pickedText, 0);
+    Host().acedRetList(list);
+    Host().acutRelRb(list);
+    SetFocus(Host().acedGetAcadDwgView());
+}
+
+struct Function {
+    const wchar_t* name;
+    void (*body)();
+};
+
+const Function kFunctions[] = {
+    {L"echo", &Echo},   {L"keep", &Keep},   {L"nothing", &Nothing}, {L"void", &Void}, {L"talk", &Talk},
+    {L"build", &Build}, {L"layer", &Layer}, {L"windows", &Windows}, {L"misc", &Misc}, {L"picker", &Picker},
+};
+constexpr int kFunctionCount = sizeof kFunctions / sizeof kFunctions[0];
+
+// ---- module object ----
+
+class FakeModule final : public OdRxModule {
+public:
+    void addRef() override { ++m_refs; }
+    void release() override { --m_refs; }
+    long numRefs() const override { return m_refs; }
+    void* sysData() override { return &__ImageBase; }
+    void deleteModule() override;
+    OdString moduleName() const override {
+        wchar_t name[OdString::kCapacity] = {};
+        GetModuleFileNameW(reinterpret_cast<HMODULE>(&__ImageBase), name, OdString::kCapacity);
+        return OdString(name);
+    }
+    void initApp() override {
+        Host().acutPrintf(L"fake: initApp\n");
+        Host().onLoadArxApp(moduleName().c_str());
+    }
+    void uninitApp() override {
+        Host().acutPrintf(L"fake: uninitApp\n");
+        Host().onUnloadArxApp(moduleName().c_str());
+    }
+
+private:
+    long m_refs = 0;
+};
+
+FakeModule* g_module = nullptr;
+
+void FakeModule::deleteModule() {
+    g_module = nullptr;
+    this->~FakeModule();
+    Host().odrxFree(this);
+}
+
+} // namespace
+
+extern "C" __declspec(dllexport) AcRx::AppRetCode acrxEntryPoint(AcRx::AppMsgCode message, void* appId) {
+    HostOperations& host = Host();
+    switch (message) {
+    case AcRx::kInitAppMsg: {
+        AcRxObject* object = host.acrxSysRegistry()->at(L"DynamicLinker");
+        const bool linker = object && object->isKindOf(host.acrxDynamicLinkerDesc());
+        const bool unlocked = linker && static_cast<AcRxDynamicLinker*>(object)->unlockApplication(appId);
+        const bool mdi = linker && static_cast<AcRxDynamicLinker*>(object)->registerAppMDIAware(appId);
+        const bool wrongId =
+            linker && static_cast<AcRxDynamicLinker*>(object)->unlockApplication(&g_documents);
+        host.acutPrintf(L"fake: message 1 linker %d unlock %d mdi %d other id %d\n", linker, unlocked, mdi,
+                        wrongId);
+        break;
+    }
+    case AcRx::kUnloadAppMsg:
+        host.acutPrintf(L"fake: message 2\n");
+        break;
+    case AcRx::kLoadDwgMsg: {
+        int defined = 0;
+        for (int i = 0; i < kFunctionCount; ++i)
+            defined += host.acedDefun(kFunctions[i].name, i) == RTNORM;
+        host.acutPrintf(L"fake: message 3 in #%d defined %d\n",
+                        DocumentNumber(host.acDocManagerPtr()->curDocument()), defined);
+        break;
+    }
+    case AcRx::kUnloadDwgMsg: {
+        int undefined = 0;
+        for (int i = 0; i < kFunctionCount; ++i)
+            undefined += host.acedUndef(kFunctions[i].name, i) == RTNORM;
+        host.acutPrintf(L"fake: message 4 in #%d undefined %d\n",
+                        DocumentNumber(host.acDocManagerPtr()->curDocument()), undefined);
+        break;
+    }
+    case AcRx::kInvkSubrMsg: {
+        host.acedRetVoid();
+        const int code = host.acedGetFunCode();
+        if (code >= 0 && code < kFunctionCount)
+            kFunctions[code].body();
+        break;
+    }
+    default:
+        break;
+    }
+    return AcRx::kRetOK;
+}
+
+extern "C" __declspec(dllexport) int acrxGetApiVersion(std::uint32_t* major, std::uint32_t* minor,
+                                                       std::uint32_t* build, std::uint32_t* patch) {
+    *major = 19;
+    *minor = 5;
+    *build = 0;
+    *patch = 0;
+    return 0;
+}
+
+extern "C" __declspec(dllexport) OdRxModule* odrxCreateModuleObject() {
+    if (!g_module) {
+        void* memory = Host().odrxAlloc(sizeof(FakeModule));
+        if (!memory)
+            return nullptr;
+        g_module = new (memory) FakeModule();
+    }
+    return g_module;
+}
