@@ -233,6 +233,20 @@ private:
                 case L'e':
                     c = 27;
                     break;
+                case L'0':
+                case L'1':
+                case L'2':
+                case L'3':
+                case L'4':
+                case L'5':
+                case L'6':
+                case L'7': { // \nnn: up to three octal digits
+                    unsigned code = static_cast<unsigned>(e - L'0');
+                    for (int digits = 1; digits < 3 && !AtEnd() && Peek() >= L'0' && Peek() <= L'7'; ++digits)
+                        code = code * 8 + static_cast<unsigned>(m_text[m_pos++] - L'0');
+                    c = static_cast<wchar_t>(code);
+                    break;
+                }
                 default:
                     return Fail(L"unknown escape \\" + Excerpt(std::wstring_view(&e, 1)) +
                                 L" in a string (write a backslash as \\\\)");

@@ -29,7 +29,7 @@ struct LispCall {
 // Reads one call such as (Orvex 1 2 "C:\\dwg\\" "Insert" "Close").
 //  - integers in -32768..32767 are short values, other 32-bit integers are long values, larger ones are
 //    an error;
-//  - reals (1.5, -.5, 2., 1e3) are real values; strings take the escapes \\ \" \n \r \t \e;
+//  - reals (1.5, -.5, 2., 1e3) are real values; strings take the escapes \\ \" \n \r \t \e and \nnn (octal);
 //  - nil as an argument passes no argument; T passes the true value; '(...) passes a quoted list, in which
 //    nil is the nil value.
 // Returns false with a one-line message in `error` for anything else; never throws for bad text.

@@ -86,11 +86,14 @@ TEST(LispReader, RealsInTheirForms) {
 }
 
 TEST(LispReader, StringEscapes) {
-    const LispCall call = Read(LR"((f "a\\b" "q\"q" "n\nr\rt\te\e" ""))");
+    const LispCall call = Read(LR"((f "a\\b" "q\"q" "n\nr\rt\te\e" "" "\101\0\1777"))");
     EXPECT_EQ(call.args[0].text, L"a\\b");
     EXPECT_EQ(call.args[1].text, L"q\"q");
     EXPECT_EQ(call.args[2].text, L"n\nr\rt\te\x1b");
     EXPECT_EQ(call.args[3].text, L"");
+    EXPECT_EQ(call.args[4].text, std::wstring(L"A\0\x7f"
+                                              L"7",
+                                              4));
 }
 
 TEST(LispReader, QuotedListsAndTrue) {
@@ -221,7 +224,7 @@ TEST(LispPrinter, StringsAreEscapedBack) {
     EXPECT_EQ(devhost::PrintLispString(L"C:\\a \"b\"\n\t\r\x1b\x01"),
               L"\"C:\\\\a \\\"b\\\"\\n\\t\\r\\e\\001\"");
     // What is printed reads back as the same string.
-    const std::wstring original = L"x\\y\"z\n";
+    const std::wstring original = std::wstring(L"x\\y\"z\n\0\x01\x1f", 9);
     const LispCall call = Read(L"(f " + devhost::PrintLispString(original) + L")");
     EXPECT_EQ(call.args[0].text, original);
 }
