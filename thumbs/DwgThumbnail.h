@@ -2,10 +2,13 @@
 // one-line label under it (the file name, also the in-place rename field) and a tooltip with the name,
 // size and date. The grid re-creates these as rows scroll into view, so a control is bound to a list
 // index only between its creation and its destruction; the selection lives in the record.
+//
+// Ownership: the grid's pool owns the controls; a control owns its label (a sibling window, child of the
+// grid view), its tooltip and the never-created static, and DestroyWindow takes all of them down.
 #pragma once
 
 #include "framework/afxwin.h"
-#include "framework/afxtooltip.h"
+#include "framework/afxbars.h" // CToolTipCtrl
 
 #include <string>
 
@@ -23,15 +26,26 @@ protected:
 class CThumbLabel : public CEdit {
 public:
     bool IsRenaming() const { return m_bRenaming; }
+    // Makes the label writable with the whole name selected; Enter commits, Escape or leaving restores.
     void BeginRename();
+    // The rectangle of the sunken edge shown while renaming, in the grid view's client coordinates.
+    CRect EdgeRect() const;
+
+    bool PreTranslateMessage(MSG* pMsg) override;
 
 protected:
     LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
 
 private:
     friend class exCDwgThumbnail;
+    void OnReturn();
+    void OnEscape();
+    void OnLeave();
+    void Commit();
+    void RedrawEdge();
+
     bool m_bRenaming = false;
-    std::string m_strSaved;
+    std::string m_strSaved; // the name before the rename began
     class exCDwgThumbnail* m_pOwner = nullptr;
 };
 
@@ -47,17 +61,32 @@ public:
                 CWnd* parentView, UINT id);
     bool DestroyWindow() override;
     bool PreTranslateMessage(MSG* pMsg) override;
+    // Drops the label's highlight and the record's selection.
     void Unselect();
     int ListIndex() const { return m_nListIndex; }
+    const std::string& Name() const { return m_strName; }
     CThumbLabel& Label() { return m_wndLabel; }
+    CToolTipCtrl& ToolTip() { return m_wndToolTip; }
+    // The tooltip's text as it was built at creation.
+    const std::string& ToolTipText() const { return m_strToolTip; }
+    bool NoFrameColour() const { return m_bNoFrameColour != 0; }
 
 protected:
     LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
+    void OnPaint() override;
 
 private:
+    friend class CThumbLabel;
     bool CreateLabel(const std::string& name, CWnd* parentView, const RECT& cell);
+    // Marks this drawing selected and current; clearOthers first drops every other selection.
     void SelectThis(bool clearOthers);
+    void ToggleSelection();
+    void Pick();
     void ShowContextMenu(POINT screenPoint);
+    void OnContextCommand(int command);
+    void ShowProperties();
+    void HighlightLabel();
+    void DropLabelHighlight();
 
     unsigned char m_bNoFrameColour = 0;
     CThumbLabel m_wndLabel;
@@ -65,4 +94,13 @@ private:
     int m_nListIndex = -1;
     COLORREF m_savedColour = 0;
     CToolTipCtrl m_wndToolTip;
+    std::string m_strToolTip;
 };
+
+// The current directory with a "\" at its end.
+std::string CurrentFolderWithSlash();
+
+// Loads the thumbnail's context menu into menu and returns its popup (not owned), prepared: "&Paste"
+// greyed when the clipboard holds no file list, the frame's sort mode checked. Empty when the menu
+// resource is missing.
+CMenu BuildThumbnailMenu(CMenu& menu);

@@ -1,0 +1,417 @@
+#include "thumbs/DwgThumbnail.h"
+
+#include "host/HostApi.h"
+#include "host/TextConv.h"
+#include "res/resource.h"
+#include "settings/Tessel3Doc.h"
+#include "thumbs/DwgList.h"
+#include "thumbs/Tessel3View.h"
+#include "thumbs/ThumbsGlue.h"
+#include "thumbs/TooltipText.h"
+
+#include <shellapi.h>
+
+namespace {
+
+// Every redraw of the control and its label repaints at once, background included.
+constexpr UINT kRedrawNow = RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW;
+// Frame colour given to the hooks while a control is plain.
+constexpr COLORREF kGrey = 0x808080;
+
+std::string CurrentDirectory() {
+    char buffer[MAX_PATH + 1] = {};
+    DWORD n = ::GetCurrentDirectoryA(sizeof buffer, buffer);
+    return n > 0 && n < sizeof buffer ? std::string(buffer, n) : std::string();
+}
+
+std::string WithSlash(std::string folder) {
+    if (folder.empty() || folder.back() != '\\')
+        folder += '\\';
+    return folder;
+}
+
+DwgData& RecordAt(int index) {
+    return DwgList[index]; // outside the list: invalid-argument error, caught at the window procedure
+}
+
+// Makes the drawing the current one: the document's name, the title, the pick.
+void MakeCurrent(const std::string& name) {
+    if (g_pTessel3Doc)
+        g_pTessel3Doc->m_strName = name;
+    FrameSetTitle(CurrentDirectory() + "\\" + name);
+    FrameEnablePick(true);
+}
+
+} // namespace
+
+std::string CurrentFolderWithSlash() {
+    return WithSlash(CurrentDirectory());
+}
+
+// ---- the label --------------------------------------------------------------------------------------
+
+void CThumbLabel::BeginRename() {
+    if (!m_hWnd)
+        return;
+    SetFocus();
+    SetReadOnly(false);
+    m_strSaved = GetWindowText();
+    m_bRenaming = true;
+    SetSel(0, -1);
+    RedrawWindow(nullptr, nullptr, kRedrawNow);
+    RedrawEdge();
+}
+
+CRect CThumbLabel::EdgeRect() const {
+    CRect rc = GetClientRect();
+    ::MapWindowPoints(m_hWnd, ::GetParent(m_hWnd), reinterpret_cast<POINT*>(&rc), 2);
+    rc.InflateRect(2, 2);
+    return rc;
+}
+
+void CThumbLabel::RedrawEdge() {
+    // The edge lies outside the label, on the grid view, which draws it while the label renames.
+    HWND parent = ::GetParent(m_hWnd);
+    if (!parent)
+        return;
+    CRect rc = EdgeRect();
+    rc.InflateRect(1, 1);
+    ::RedrawWindow(parent, &rc, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
+}
+
+bool CThumbLabel::PreTranslateMessage(MSG* pMsg) {
+    // While renaming, keys are the edit's own: the grid's navigation and the frame's accelerators (Delete,
+    // Ctrl+C...) must not take them.
+    if (m_bRenaming && pMsg->hwnd == m_hWnd && pMsg->message >= WM_KEYFIRST && pMsg->message <= WM_KEYLAST) {
+        ::TranslateMessage(pMsg);
+        ::DispatchMessageA(pMsg);
+        return true;
+    }
+    return false;
+}
+
+void CThumbLabel::OnReturn() {
+    if (m_bRenaming)
+        Commit();
+    m_strSaved = GetWindowText();
+    SetReadOnly(true);
+}
+
+void CThumbLabel::OnEscape() {
+    m_bRenaming = false;
+    SetWindowText(m_strSaved);
+    SetReadOnly(true);
+    RedrawWindow(nullptr, nullptr, kRedrawNow);
+    RedrawEdge();
+}
+
+void CThumbLabel::OnLeave() {
+    m_bRenaming = false;
+    if (!m_strSaved.empty())
+        SetWindowText(m_strSaved);
+    SetReadOnly(true);
+    // Setting the text drops the highlight; a selected drawing keeps it.
+    if (m_pOwner && m_pOwner->m_nListIndex >= 0 && m_pOwner->m_nListIndex < DwgList.GetSize() &&
+        DwgList[m_pOwner->m_nListIndex].IsSelected())
+        SetSel(0, -1);
+    RedrawWindow(nullptr, nullptr, kRedrawNow);
+    HWND view = ::GetParent(m_hWnd);
+    if (view && ::IsWindowVisible(view))
+        ::RedrawWindow(view, nullptr, nullptr, kRedrawNow | RDW_ALLCHILDREN);
+}
+
+void CThumbLabel::Commit() {
+    m_bRenaming = false;
+    std::string folder = g_pTessel3Doc ? g_pTessel3Doc->m_strPath : std::string();
+    if (folder.empty())
+        folder = CurrentDirectory();
+    folder = WithSlash(folder);
+    const std::string oldName = folder + m_strSaved;
+    const std::string newName = folder + GetWindowText();
+    if (!::MoveFileA(oldName.c_str(), newName.c_str())) {
+        SetWindowText(m_strSaved);
+        RedrawEdge();
+        return;
+    }
+    // The rescan rebuilds the grid, which destroys this label: it runs once this message is done.
+    if (g_pTessel3View)
+        g_pTessel3View->PostRefresh();
+    RedrawEdge();
+}
+
+LRESULT CThumbLabel::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+    switch (message) {
+    case WM_LBUTTONDBLCLK:
+        BeginRename();
+        return 0;
+    case WM_KEYDOWN:
+        if (wParam == VK_RETURN) {
+            OnReturn();
+            return 0;
+        }
+        if (wParam == VK_ESCAPE) {
+            OnEscape();
+            return 0;
+        }
+        return Default();
+    case WM_CHAR:
+        if (wParam == '\r' || wParam == 0x1B) // handled on key down; no beep
+            return 0;
+        return Default();
+    case WM_KILLFOCUS: {
+        LRESULT result = Default();
+        OnLeave();
+        return result;
+    }
+    default:
+        return CEdit::WindowProc(message, wParam, lParam);
+    }
+}
+
+// ---- the thumbnail ----------------------------------------------------------------------------------
+
+exCDwgThumbnail::~exCDwgThumbnail() {
+    DestroyWindow();
+}
+
+bool exCDwgThumbnail::Create(const std::string& name, int listIndex, const char* windowName, DWORD style,
+                             const RECT& cell, CWnd* parentView, UINT id) {
+    const bool created =
+        CWnd::CreateEx(0, nullptr, windowName, style | WS_VISIBLE | WS_BORDER, cell, parentView, id);
+    if (!created)
+        return false;
+
+    EnableToolTips(true);
+    m_nListIndex = listIndex;
+    SetFrameColour(1);
+    m_savedColour = GetFrameColour();
+    ShowWindow(SW_SHOW);
+    m_strName = name;
+
+    m_wndToolTip.Create(this, 0);
+    const DwgData& record = RecordAt(listIndex);
+    ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
+    m_strToolTip = tip.text;
+    if (m_wndToolTip.m_hWnd) {
+        // A width of so few pixels makes the tooltip break its text at the blanks: name, size, date.
+        m_wndToolTip.SetMaxTipWidth(tip.width);
+        m_wndToolTip.AddTool(this, tip.text);
+        m_wndToolTip.Activate(false);
+    }
+    CreateLabel(name, parentView, cell);
+    return true;
+}
+
+bool exCDwgThumbnail::CreateLabel(const std::string& name, CWnd* parentView, const RECT& cell) {
+    const int cxEdge = ::GetSystemMetrics(SM_CXEDGE);
+    const int cyEdge = ::GetSystemMetrics(SM_CYEDGE);
+    const CRect rc(cell.left + cxEdge, cell.bottom + cyEdge, cell.right - cxEdge,
+                   cell.bottom + CTessel3View::LabelHeight() - cyEdge);
+    m_wndLabel.m_pOwner = this;
+    if (!m_wndLabel.CreateEx(0, "EDIT", "", WS_CHILD | ES_READONLY | ES_NOHIDESEL | ES_AUTOHSCROLL, rc,
+                             parentView, 0))
+        return false;
+    m_wndLabel.SetWindowText(name);
+    if (RecordAt(m_nListIndex).IsSelected())
+        HighlightLabel();
+    SetFrameColour(m_savedColour);
+    SetFrameColour(kGrey);
+    m_wndLabel.ShowWindow(SW_SHOW);
+    m_wndLabel.RedrawWindow(nullptr, nullptr, kRedrawNow);
+    return true;
+}
+
+bool exCDwgThumbnail::DestroyWindow() {
+    m_wndUnused.DestroyWindow();
+    m_wndLabel.m_bRenaming = false;
+    m_wndLabel.DestroyWindow();
+    m_wndLabel.m_pOwner = nullptr;
+    m_wndToolTip.DestroyWindow();
+    return CWnd::DestroyWindow();
+}
+
+void exCDwgThumbnail::OnPaint() {
+    CPaintDC dc(m_hWnd);
+    // The bare name: the host resolves it against the current directory, which the scan set.
+    const std::wstring wide = WidenAnsi(m_strName);
+    const std::uint32_t background = 0;
+    acdbDisplayPreviewFromDwg(wide.c_str(), m_hWnd, &background);
+}
+
+LRESULT exCDwgThumbnail::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+    switch (message) {
+    case WM_PAINT:
+        OnPaint();
+        return 0;
+    default:
+        return CDwgThumbnail::WindowProc(message, wParam, lParam);
+    }
+}
+
+void exCDwgThumbnail::HighlightLabel() {
+    if (m_wndLabel.m_hWnd)
+        m_wndLabel.SetSel(0, -1);
+}
+
+void exCDwgThumbnail::DropLabelHighlight() {
+    if (!m_wndLabel.m_hWnd)
+        return;
+    m_wndLabel.Clear();
+    // Setting the text again drops the selection.
+    m_wndLabel.SetWindowText(m_wndLabel.GetWindowText());
+}
+
+void exCDwgThumbnail::Unselect() {
+    DropLabelHighlight();
+    RecordAt(m_nListIndex).Deselect();
+    if (!m_bNoFrameColour)
+        SetFrameColour(m_savedColour);
+}
+
+void exCDwgThumbnail::SelectThis(bool clearOthers) {
+    if (clearOthers) {
+        if (g_pTessel3View)
+            g_pTessel3View->DeselectAll();
+        else
+            DeselectAllFlags();
+    }
+    DwgData& record = RecordAt(m_nListIndex);
+    HighlightLabel();
+    record.Select();
+    MakeCurrent(record.m_strName);
+}
+
+void exCDwgThumbnail::ToggleSelection() {
+    SetFocus();
+    DwgData& record = RecordAt(m_nListIndex);
+    if (record.IsSelected()) {
+        DropLabelHighlight();
+        record.Deselect();
+        FrameEnablePick(false);
+        if (g_pTessel3Doc)
+            g_pTessel3Doc->m_strName.clear();
+        FrameSetTitle(CurrentDirectory());
+    } else {
+        HighlightLabel();
+        record.Select();
+        MakeCurrent(record.m_strName);
+    }
+}
+
+void exCDwgThumbnail::Pick() {
+    const DwgData& record = RecordAt(m_nListIndex);
+    if (g_pTessel3Doc) {
+        g_pTessel3Doc->m_strName = record.m_strName;
+        g_pTessel3Doc->m_strPath = CurrentFolderWithSlash();
+    }
+    if (CWnd* main = AfxGetMainWnd(); main && main->m_hWnd)
+        main->PostMessage(WM_APP, 1, 0);
+}
+
+bool exCDwgThumbnail::PreTranslateMessage(MSG* pMsg) {
+    if (!m_hWnd)
+        return false;
+    switch (pMsg->message) {
+    case WM_MOUSEMOVE:
+    case WM_LBUTTONUP:
+        if (m_wndToolTip.m_hWnd)
+            m_wndToolTip.RelayEvent(pMsg);
+        return false;
+    case WM_LBUTTONDOWN:
+        if (m_wndToolTip.m_hWnd)
+            m_wndToolTip.RelayEvent(pMsg);
+        if (pMsg->wParam == MK_LBUTTON) {
+            SelectThis(true);
+            RedrawWindow(nullptr, nullptr, kRedrawNow);
+        } else if (pMsg->wParam == (MK_LBUTTON | MK_CONTROL)) {
+            ToggleSelection();
+        }
+        return false;
+    case WM_LBUTTONDBLCLK:
+        Pick();
+        return true;
+    case WM_RBUTTONDOWN: {
+        SelectThis(false);
+        CPoint pt(pMsg->lParam);
+        ClientToScreen(&pt);
+        ShowContextMenu(pt);
+        return true;
+    }
+    case WM_KEYDOWN:
+        // Keyboard navigation belongs to the grid.
+        if (HWND view = GetParentHwnd()) {
+            ::SetFocus(view);
+            ::PostMessageA(view, WM_KEYDOWN, pMsg->wParam, pMsg->lParam);
+        }
+        return true;
+    default:
+        return false;
+    }
+}
+
+CMenu BuildThumbnailMenu(CMenu& menu) {
+    CMenu popup;
+    if (!menu.LoadMenu(IDR_THUMB_MENU))
+        return popup;
+    popup = menu.GetSubMenu(0);
+    if (!popup.m_hMenu)
+        return popup;
+    // Only file lists can be pasted.
+    if (!::IsClipboardFormatAvailable(CF_HDROP))
+        popup.EnableMenuItem(ID_THUMB_PASTE, MF_BYCOMMAND | MF_GRAYED);
+    static const UINT kSortIds[] = {ID_SORT_NAME, ID_SORT_DATE, ID_SORT_SIZE};
+    const int mode = FrameSortMode();
+    if (mode >= 0 && mode < 3)
+        popup.CheckMenuItem(kSortIds[mode], MF_BYCOMMAND | MF_CHECKED);
+    return popup;
+}
+
+void exCDwgThumbnail::ShowContextMenu(POINT screenPoint) {
+    CMenu menu;
+    CMenu popup = BuildThumbnailMenu(menu);
+    if (!popup.m_hMenu)
+        return;
+    HWND self = m_hWnd;
+    const int command = popup.TrackPopupMenu(TPM_RETURNCMD | TPM_RIGHTBUTTON | TPM_NONOTIFY, screenPoint.x,
+                                             screenPoint.y, self);
+    // The menu's own loop may have let the grid re-create its controls: act only if this one still stands.
+    if (!::IsWindow(self) || CWnd::FromHandle(self) != this)
+        return;
+    OnContextCommand(command);
+}
+
+void exCDwgThumbnail::OnContextCommand(int command) {
+    switch (command) {
+    case ID_SORT_NAME:
+    case ID_SORT_DATE:
+    case ID_SORT_SIZE:
+        if (HWND frame = FrameWindow())
+            ::PostMessageA(frame, WM_COMMAND, static_cast<WPARAM>(command), 0);
+        break;
+    case ID_THUMB_COPY:
+    case ID_THUMB_DELETE:
+    case ID_THUMB_PASTE:
+        // Carried out by the file commands.
+        break;
+    case ID_THUMB_RENAME:
+        m_wndLabel.BeginRename();
+        break;
+    case ID_THUMB_PROPERTY:
+        ShowProperties();
+        break;
+    default:
+        break;
+    }
+}
+
+void exCDwgThumbnail::ShowProperties() {
+    const std::string file = RecordAt(m_nListIndex).m_strName;
+    SHELLEXECUTEINFOA info{};
+    info.cbSize = sizeof info;
+    info.fMask = SEE_MASK_INVOKEIDLIST;
+    info.hwnd = m_hWnd;
+    info.lpVerb = "properties";
+    info.lpFile = file.c_str();
+    info.nShow = SW_SHOW;
+    ::ShellExecuteExA(&info);
+}

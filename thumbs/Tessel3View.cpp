@@ -1,0 +1,474 @@
+#include "thumbs/Tessel3View.h"
+
+#include "res/resource.h"
+#include "settings/Tessel3Doc.h"
+#include "thumbs/DwgList.h"
+#include "thumbs/ThumbsGlue.h"
+
+#include <algorithm>
+
+CTessel3View* g_pTessel3View = nullptr;
+
+namespace {
+
+// Sets a flag for the lifetime of the guard, whatever way the scope is left.
+class FlagGuard {
+public:
+    explicit FlagGuard(bool& flag) : m_flag(flag), m_old(flag) { m_flag = true; }
+    ~FlagGuard() { m_flag = m_old; }
+    FlagGuard(const FlagGuard&) = delete;
+    FlagGuard& operator=(const FlagGuard&) = delete;
+
+private:
+    bool& m_flag;
+    bool m_old;
+};
+
+void PostCancel() {
+    if (CWnd* main = AfxGetMainWnd(); main && main->m_hWnd)
+        main->PostMessage(WM_APP, 2, 0);
+}
+
+} // namespace
+
+CTessel3View::CTessel3View() {
+    g_pTessel3View = this;
+    if (g_pTessel3Doc && g_pTessel3Doc->m_nPictureHeight != 0 && g_pTessel3Doc->m_nPictureWidth != 0) {
+        m_nCellHeight = g_pTessel3Doc->m_nPictureHeight;
+        m_nCellWidth = g_pTessel3Doc->m_nPictureWidth;
+    }
+    LabelHeight(); // measured once, before the first layout needs it
+}
+
+CTessel3View::~CTessel3View() {
+    if (g_pTessel3View == this)
+        g_pTessel3View = nullptr;
+    try {
+        DestroyPool();
+        m_pool.RemoveAll();
+        DwgList.RemoveAll();
+    } catch (...) {
+        // Destruction goes on; nothing left to report to.
+    }
+}
+
+int CTessel3View::LabelHeight() {
+    static const int height = [] {
+        CClientDC dc(nullptr);
+        TEXTMETRICA tm{};
+        dc.GetTextMetrics(&tm);
+        return grid::LabelHeight(tm.tmHeight, ::GetSystemMetrics(SM_CYEDGE));
+    }();
+    return height;
+}
+
+grid::Geometry CTessel3View::Geometry() const {
+    grid::Geometry g;
+    g.originX = m_ptOrigin.x;
+    g.originY = m_ptOrigin.y;
+    g.cellWidth = m_nCellWidth;
+    g.cellHeight = m_nCellHeight;
+    g.gap = m_nGap;
+    g.labelHeight = LabelHeight();
+    return g;
+}
+
+bool CTessel3View::PreCreateWindow(CREATESTRUCTA& cs) {
+    // The view's class again, with a light-grey background; children are not painted over.
+    cs.lpszClass = AfxRegisterWndClass(CS_DBLCLKS, ::LoadCursorA(nullptr, IDC_ARROW),
+                                       static_cast<HBRUSH>(::GetStockObject(LTGRAY_BRUSH)));
+    cs.style |= WS_CLIPCHILDREN;
+    return CScrollView::PreCreateWindow(cs);
+}
+
+void CTessel3View::OnInitialUpdate() {
+    CScrollView::OnInitialUpdate();
+    SetScrollSizes(MM_TEXT, CSize(0, 0));
+}
+
+// ---- operations -------------------------------------------------------------------------------------
+
+void CTessel3View::Rebuild() {
+    FrameSetTitle(g_pTessel3Doc ? g_pTessel3Doc->m_strPath : std::string());
+    FrameUpdateStatus();
+    m_nPoolRows = grid::kDefaultPoolRows;
+    ScrollToBegin(true);
+}
+
+void CTessel3View::ScrollToBegin(bool sort) {
+    m_nColumns = grid::ColumnsForWidth(GetClientRect().Width(), m_nCellWidth, m_nGap);
+    m_nOldColumns = m_nColumns; // a later relayout keeps the first drawing where it is
+    if (sort)
+        SortDwgList(FrameSortMode());
+    m_nFirstRow = 0;
+    // The controls are re-created below, so the contents need not be moved.
+    ::SetScrollPos(m_hWnd, SB_HORZ, 0, TRUE);
+    ::SetScrollPos(m_hWnd, SB_VERT, 0, TRUE);
+    Layout();
+}
+
+void CTessel3View::ShowIndex(int index) {
+    ScrollToBegin(false);
+    m_nFirstRow = index / std::max(1, m_nColumns);
+    Relayout();
+}
+
+void CTessel3View::DeselectAll() {
+    DeselectAllFlags();
+    for (int slot = 0; slot < m_pool.GetSize(); ++slot) {
+        if (m_pool[slot].m_hWnd)
+            m_pool[slot].Unselect();
+    }
+}
+
+void CTessel3View::SelectAll() {
+    for (int i = 0; i < DwgList.GetSize(); ++i)
+        DwgList[i].Select();
+    for (int slot = 0; slot < m_pool.GetSize(); ++slot) {
+        exCDwgThumbnail& control = m_pool[slot];
+        if (control.m_hWnd && !control.NoFrameColour())
+            control.SetFrameColour(0x808080);
+    }
+}
+
+void CTessel3View::Increase() {
+    if (grid::IncreaseCell(m_nCellHeight, m_nCellWidth, GetClientRect().Height()))
+        Refit(false);
+}
+
+void CTessel3View::Decrease() {
+    if (grid::DecreaseCell(m_nCellHeight, m_nCellWidth))
+        Refit(false);
+}
+
+void CTessel3View::Align() {
+    Refit(true);
+}
+
+void CTessel3View::PostRefresh() {
+    if (m_hWnd)
+        PostMessage(WM_THUMBS_REFRESH);
+}
+
+void CTessel3View::Refresh() {
+    std::string folder = g_pTessel3Doc ? g_pTessel3Doc->m_strPath : std::string();
+    if (folder.empty()) {
+        char buffer[MAX_PATH + 1] = {};
+        DWORD n = ::GetCurrentDirectoryA(sizeof buffer, buffer);
+        folder.assign(buffer, n < sizeof buffer ? n : 0);
+    }
+    if (folder.size() > 3 && folder.back() == '\\') // "C:\" keeps its separator
+        folder.pop_back();
+    ScanFolderPath(folder.c_str(), ".dwg");
+    Rebuild();
+}
+
+exCDwgThumbnail* CTessel3View::ControlOf(int index) {
+    const int size = m_pool.GetSize();
+    if (index < 0 || size == 0)
+        return nullptr;
+    exCDwgThumbnail& control = m_pool[grid::PoolSlot(index, size)];
+    return control.m_hWnd && control.ListIndex() == index ? &control : nullptr;
+}
+
+// ---- layout -----------------------------------------------------------------------------------------
+
+void CTessel3View::DestroyPool() {
+    for (int slot = 0; slot < m_pool.GetSize(); ++slot) {
+        if (m_pool[slot].m_hWnd)
+            m_pool[slot].DestroyWindow();
+    }
+}
+
+void CTessel3View::Layout() {
+    DestroyPool();
+    m_pool.RemoveAll();
+    m_nCount = DwgList.GetSize();
+    const grid::Geometry g = Geometry();
+
+    // Showing or hiding a scroll bar changes the client height: settle the bars first.
+    grid::LayoutNumbers n;
+    int clientHeight = GetClientRect().Height();
+    for (int pass = 0; pass < 3; ++pass) {
+        n = grid::ComputeLayout(g, m_nCount, m_nColumns, clientHeight);
+        {
+            FlagGuard guard(m_bAligning); // the size messages of the bars do not re-enter the layout
+            SetScrollSizes(MM_TEXT, CSize(n.totalWidth, n.totalHeight), CSize(n.lineX, n.lineY),
+                           CSize(n.lineX, n.lineY));
+        }
+        const int now = GetClientRect().Height();
+        if (now == clientHeight)
+            break;
+        clientHeight = now;
+    }
+    m_nRows = n.rows;
+    m_nVisibleRows = n.visibleRows;
+    m_nPoolRows = n.poolRows;
+    m_nTotalHeight = n.totalHeight;
+    if (m_nCount == 0)
+        return;
+
+    m_pool.SetSize(n.poolSize);
+    int top = m_ptOrigin.y;
+    for (int row = m_nFirstRow; row < m_nFirstRow + m_nPoolRows; ++row) {
+        CreateRow(row, top);
+        top += g.RowPitch();
+    }
+    ScrollToPosition(GetScrollPosition());
+}
+
+void CTessel3View::CreateRow(int row, int rowTop) {
+    const int poolSize = m_pool.GetSize();
+    if (row < 0 || poolSize == 0)
+        return;
+    const grid::Geometry g = Geometry();
+    for (int column = 0; column < m_nColumns; ++column) {
+        const grid::Cell cell = grid::CellOf(g, m_nColumns, poolSize, row, column, rowTop);
+        exCDwgThumbnail& control = m_pool[cell.slot];
+        if (control.m_hWnd)
+            control.DestroyWindow();
+        if (cell.index < m_nCount)
+            control.Create(DwgList[cell.index].m_strName, cell.index, nullptr, WS_CHILD,
+                           CRect(cell.left, cell.top, cell.right, cell.bottom), this, 0);
+    }
+    SetFocus();
+}
+
+void CTessel3View::Refit(bool resizeFrame) {
+    if (m_nRows <= 0)
+        return;
+    FlagGuard guard(m_bAligning);
+    HWND frame = FrameWindow();
+    if (!frame)
+        frame = ::GetAncestor(m_hWnd, GA_ROOT);
+    CRect frameRect;
+    ::GetWindowRect(frame, &frameRect);
+    const CRect client = GetClientRect();
+    const grid::RefitNumbers n =
+        grid::ComputeRefit(Geometry(), client.right, client.bottom, frameRect.Width(), frameRect.Height());
+    m_nColumns = n.columns;
+    if (resizeFrame) {
+        // A frame that is a child window is placed in its parent's coordinates.
+        if (HWND parent = ::GetParent(frame); parent && (::GetWindowLongPtrA(frame, GWL_STYLE) & WS_CHILD))
+            ::MapWindowPoints(nullptr, parent, reinterpret_cast<POINT*>(&frameRect), 2);
+        ::MoveWindow(frame, frameRect.left, frameRect.top, n.frameWidth, n.frameHeight, TRUE);
+    }
+    Relayout();
+}
+
+void CTessel3View::Relayout() {
+    ShowWindow(SW_HIDE);
+    DestroyPool();
+    m_pool.RemoveAll();
+    const int firstRow = grid::RelayoutFirstRow(m_nOldColumns, m_nFirstRow, m_nColumns, m_nCount);
+    m_nOldColumns = m_nColumns;
+    const int y = grid::RelayoutScrollY(Geometry(), firstRow, m_nTotalHeight);
+    ::SetScrollPos(m_hWnd, SB_HORZ, m_ptOrigin.x, TRUE);
+    ::SetScrollPos(m_hWnd, SB_VERT, y, TRUE);
+    m_nFirstRow = firstRow;
+    Layout();
+    ShowWindow(SW_SHOW);
+    SetFocus();
+}
+
+// ---- scrolling --------------------------------------------------------------------------------------
+
+grid::ScrollState CTessel3View::CurrentScrollState() const {
+    grid::ScrollState s;
+    s.firstRow = m_nFirstRow;
+    s.visibleRows = m_nVisibleRows;
+    s.rows = m_nRows;
+    const CPoint pos = GetScrollPosition();
+    s.x = pos.x;
+    s.y = pos.y;
+    s.totalHeight = m_nTotalHeight;
+    s.clientHeight = GetClientRect().Height();
+    return s;
+}
+
+void CTessel3View::ApplyLineStep(const grid::LineStep& step, const grid::ScrollState& before,
+                                 const grid::ScrollState& after, int direction) {
+    if (step.resetX) {
+        ::SetScrollPos(m_hWnd, SB_HORZ, 0, TRUE);
+        ScrollWindow(before.x, 0);
+    }
+    if (step.wrapped)
+        ::SetScrollPos(m_hWnd, SB_VERT, step.wrapY, TRUE);
+    if (step.createRow >= 0)
+        CreateRow(step.createRow, step.createRowTop);
+    if (!step.moved)
+        return;
+    m_nFirstRow = after.firstRow;
+    // The contents always move by exactly one row, whatever the capped scroll bar could show.
+    ::SetScrollPos(m_hWnd, SB_VERT, after.y, TRUE);
+    ScrollWindow(0, -direction * Geometry().RowPitch());
+    UpdateWindow();
+}
+
+void CTessel3View::LineUp() {
+    grid::ScrollState s = CurrentScrollState();
+    const grid::ScrollState before = s;
+    const grid::LineStep step = grid::LineUp(s, Geometry());
+    ApplyLineStep(step, before, s, -1);
+}
+
+void CTessel3View::LineDown() {
+    grid::ScrollState s = CurrentScrollState();
+    const grid::ScrollState before = s;
+    const grid::LineStep step = grid::LineDown(s, Geometry());
+    ApplyLineStep(step, before, s, +1);
+}
+
+bool CTessel3View::OnScroll(UINT scrollCode, UINT pos, bool doScroll) {
+    const UINT vertical = HIBYTE(scrollCode);
+    if (vertical == 0xFF) // horizontal only: the base scrolls the grid sideways
+        return CScrollView::OnScroll(scrollCode, pos, doScroll);
+    switch (vertical) {
+    case SB_THUMBTRACK: {
+        const int step =
+            grid::ThumbTrackStep(TrackPos(SB_VERT), GetScrollPosition().y, Geometry().RowPitch());
+        if (step < 0)
+            LineUp();
+        else if (step > 0)
+            LineDown();
+        return step != 0;
+    }
+    case SB_LINEUP:
+    case SB_PAGEUP:
+        LineUp();
+        return true;
+    case SB_LINEDOWN:
+    case SB_PAGEDOWN:
+        LineDown();
+        return true;
+    case SB_THUMBPOSITION:
+    case SB_ENDSCROLL:
+        return false;
+    case SB_TOP:
+        // Moving the contents to the top of the capped range would lose the rows: start over instead.
+        ScrollToBegin(false);
+        return true;
+    case SB_BOTTOM:
+        m_nFirstRow = grid::EndFirstRow(m_nRows, m_nVisibleRows);
+        Relayout();
+        return true;
+    default:
+        return CScrollView::OnScroll(scrollCode, pos, doScroll);
+    }
+}
+
+// ---- keyboard, commands, messages -------------------------------------------------------------------
+
+bool CTessel3View::HandleKey(UINT key) {
+    switch (key) {
+    case VK_TAB:
+        FrameFocusFolderTree();
+        return true;
+    case VK_PRIOR:
+        m_nFirstRow = grid::PageUpFirstRow(m_nFirstRow, m_nVisibleRows);
+        Relayout();
+        return true;
+    case VK_NEXT:
+        m_nFirstRow = grid::PageDownFirstRow(m_nFirstRow, m_nVisibleRows, m_nRows);
+        Relayout();
+        return true;
+    case VK_END:
+        m_nFirstRow = grid::EndFirstRow(m_nRows, m_nVisibleRows);
+        Relayout();
+        return true;
+    case VK_HOME:
+        ScrollToBegin(false);
+        return true;
+    case VK_UP:
+        LineUp();
+        return true;
+    case VK_DOWN:
+        LineDown();
+        return true;
+    case VK_ESCAPE:
+        PostCancel();
+        return true;
+    default:
+        return false;
+    }
+}
+
+bool CTessel3View::PreTranslateMessage(MSG* pMsg) {
+    if (pMsg->message != WM_KEYDOWN || !m_hWnd)
+        return false;
+    try {
+        return HandleKey(static_cast<UINT>(pMsg->wParam));
+    } catch (...) {
+        AfxReportCurrentException();
+        return true;
+    }
+}
+
+void CTessel3View::OnKeyDown(UINT nChar, UINT repeat, UINT flags) {
+    if (nChar == VK_ESCAPE)
+        PostCancel();
+    else
+        Default();
+}
+
+bool CTessel3View::OnCmdMsg(UINT id, int code) {
+    switch (id) {
+    case ID_VIEW_BEGIN:
+        ScrollToBegin(true);
+        return true;
+    case ID_VIEW_INCREASE:
+        Increase();
+        return true;
+    case ID_VIEW_DECREASE:
+        Decrease();
+        return true;
+    case ID_VIEW_ALIGNE:
+        Align();
+        return true;
+    case ID_SELECT_ALL:
+        SelectAll();
+        return true;
+    default:
+        return CScrollView::OnCmdMsg(id, code);
+    }
+}
+
+void CTessel3View::OnSize(UINT type, int cx, int cy) {
+    CScrollView::OnSize(type, cx, cy);
+    if (!m_bAligning)
+        Refit(false);
+    RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
+}
+
+bool CTessel3View::OnEraseBkgnd(CDC*) {
+    return true; // OnDraw fills the whole client area
+}
+
+void CTessel3View::OnDraw(CDC* pDC) {
+    const int saved = pDC->SaveDC();
+    pDC->SetViewportOrg(0, 0);
+    const CRect client = GetClientRect();
+    pDC->IntersectClipRect(client);
+    pDC->FillSolidRect(client, ::GetSysColor(COLOR_SCROLLBAR));
+    for (int slot = 0; slot < m_pool.GetSize(); ++slot) {
+        CThumbLabel& label = m_pool[slot].Label();
+        if (label.m_hWnd && label.IsRenaming())
+            pDC->DrawEdge(label.EdgeRect(), EDGE_SUNKEN, BF_RECT);
+    }
+    pDC->RestoreDC(saved);
+}
+
+void CTessel3View::OnDestroy() {
+    DestroyPool();
+    CScrollView::OnDestroy();
+}
+
+LRESULT CTessel3View::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+    switch (message) {
+    case WM_THUMBS_REFRESH:
+        Refresh();
+        return 0;
+    default:
+        return CScrollView::WindowProc(message, wParam, lParam);
+    }
+}
