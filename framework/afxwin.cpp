@@ -128,6 +128,14 @@ void AfxReportCurrentException() {
 
 const char* const AFX_WND_CLASS = "Orvex1Wnd";
 
+void AfxInitCommonControls() {
+    static bool done = false;
+    if (done)
+        return;
+    INITCOMMONCONTROLSEX icc{sizeof icc, ICC_WIN95_CLASSES | ICC_BAR_CLASSES | ICC_TREEVIEW_CLASSES};
+    done = ::InitCommonControlsEx(&icc) != FALSE;
+}
+
 const char* AfxRegisterWndClass(UINT classStyle, HCURSOR cursor, HBRUSH background, HICON icon) {
     static thread_local char name[96];
     if (classStyle == (CS_DBLCLKS | CS_HREDRAW | CS_VREDRAW) && !cursor && !background && !icon) {
@@ -269,6 +277,8 @@ bool CWnd::CreateEx(DWORD exStyle, const char* className, const char* windowName
         return false;
 
     const bool own = IsFrameworkClass(cs.lpszClass);
+    if (!own)
+        AfxInitCommonControls();
     HWND hwnd =
         ::CreateWindowExA(cs.dwExStyle, cs.lpszClass, cs.lpszName, static_cast<DWORD>(cs.style), cs.x, cs.y,
                           cs.cx, cs.cy, cs.hwndParent, cs.hMenu, cs.hInstance, own ? this : nullptr);

@@ -65,6 +65,9 @@ extern const char* const AFX_WND_CLASS;
 const char* AfxRegisterWndClass(UINT classStyle, HCURSOR cursor = nullptr, HBRUSH background = nullptr,
                                 HICON icon = nullptr);
 
+// Registers the common controls (toolbar, status bar, tree, tooltips) once; creating one calls it.
+void AfxInitCommonControls();
+
 // Offers a message to PreTranslateMessage: from its window up through the parents to the top-level
 // window, then to the application's main window and to pModal when the walk did not reach them.
 bool AfxPreTranslateMessage(MSG* pMsg, CWnd* pModal = nullptr);
