@@ -2,6 +2,11 @@
 
 #include "host/ArxApp.h"
 
+CDialogRun::~CDialogRun() {
+    if (theApp.m_pMainWnd == this)
+        theApp.m_pMainWnd = nullptr;
+}
+
 bool CDialogRun::OnInitDialog() {
     CDialog::OnInitDialog();
     // The explorer is placed from this dialog's rectangle, so it is created before the dialog shrinks.

@@ -11,6 +11,8 @@ constexpr UINT WM_ORVEX_RESULT = WM_APP; // wParam: 1 accept, 2 cancel
 class CDialogRun : public CDialog {
 public:
     CDialogRun() : CDialog(IDD_DIALOG_RUN, nullptr) {}
+    // Stops being the application's main window: the next run must not take it for its owner.
+    ~CDialogRun() override;
 
 protected:
     bool OnInitDialog() override;

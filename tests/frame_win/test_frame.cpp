@@ -1,0 +1,486 @@
+// The explorer frame hosted by a modal dialog, as the LISP function runs it: the dialog's
+// initialisation creates and shows the explorer, the test script runs inside the modal loop, and the
+// loop ends with what the explorer posts (1 accept, 2 cancel).
+#include "frame/MainFrame.h"
+#include "frame/MdiMixin.h"
+#include "host/HostApi.h"
+#include "host/Orvex.h"
+#include "settings/SettingsPath.h"
+#include "settings/Tessel3Doc.h"
+
+#include "res/resource.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <fstream>
+#include <functional>
+#include <string>
+#include <vector>
+
+// The picker's platform belongs to the library; these tests run the dialog themselves.
+PickerPlatform& DefaultPickerPlatform() {
+    struct Unused : PickerPlatform {
+        std::string StartShellPath(const std::string&) override { return {}; }
+        int RunDialog() override { return 2; }
+        CTessel3Doc* Document() override { return nullptr; }
+        void DestroyDocument() override {}
+        void FocusHostView() override {}
+    };
+    static Unused platform;
+    return platform;
+}
+
+namespace {
+
+class TestApp : public CMdiMixin {};
+TestApp g_app;
+
+constexpr UINT WM_TEST_STEP = WM_APP + 7;
+constexpr UINT_PTR kWatchdog = 77;
+constexpr INT_PTR kTimedOut = -77;
+
+// The run dialog of the tests: like the library's, plus a script of steps and a watchdog.
+class RunDialog : public CDialog {
+public:
+    RunDialog() : CDialog(IDD_DIALOG_RUN, nullptr) {}
+    ~RunDialog() override {
+        if (g_app.m_pMainWnd == this)
+            g_app.m_pMainWnd = nullptr;
+    }
+
+    std::function<void()> beforeCreate;
+    std::vector<std::function<void(CMainFrame&)>> steps;
+    bool created = false;
+    bool hostDisabledDuringRun = false;
+    HWND hostFrame = nullptr;
+
+    bool OnInitDialog() override {
+        CDialog::OnInitDialog();
+        if (beforeCreate)
+            beforeCreate();
+        created = g_app.CreateAndShow(this);
+        ::MoveWindow(m_hWnd, 0, 0, 0, 0, TRUE);
+        SetTimer(kWatchdog, 15000);
+        PostMessage(WM_TEST_STEP, 0);
+        return true;
+    }
+
+    bool PreTranslateMessage(MSG* pMsg) override {
+        if (pMsg->message == WM_EXPLORER_RESULT && pMsg->hwnd == m_hWnd)
+            EndDialog(static_cast<INT_PTR>(pMsg->wParam));
+        if (pMsg->message == WM_TEST_STEP && pMsg->hwnd == m_hWnd) {
+            RunStep(static_cast<size_t>(pMsg->wParam));
+            return true;
+        }
+        return CDialog::PreTranslateMessage(pMsg);
+    }
+
+protected:
+    LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override {
+        if (message == WM_TIMER && wParam == kWatchdog) {
+            KillTimer(kWatchdog);
+            ADD_FAILURE() << "the explorer did not end the run";
+            EndDialog(kTimedOut);
+            return 0;
+        }
+        return CDialog::WindowProc(message, wParam, lParam);
+    }
+
+private:
+    void RunStep(size_t index) {
+        if (hostFrame && !::IsWindowEnabled(hostFrame))
+            hostDisabledDuringRun = true;
+        if (index < steps.size() && g_pMainFrame) {
+            steps[index](*g_pMainFrame);
+            PostMessage(WM_TEST_STEP, index + 1);
+        }
+    }
+};
+
+// Dispatches what is queued for this thread, so posted commands and idle updates have run.
+void Pump() {
+    MSG msg;
+    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
+        ::TranslateMessage(&msg);
+        ::DispatchMessageA(&msg);
+    }
+}
+
+std::string MenuText(HMENU menu, UINT item, UINT flags) {
+    char text[128] = "";
+    ::GetMenuStringA(menu, item, text, sizeof text, flags);
+    return text;
+}
+
+CRect ItemRect(CToolBar& bar, UINT id) {
+    CRect rc;
+    bar.GetItemRect(bar.CommandToIndex(id), &rc);
+    return rc;
+}
+
+CRect RectInParent(CWnd& child) {
+    CRect rc = child.GetWindowRect();
+    ::MapWindowPoints(nullptr, ::GetParent(child.m_hWnd), reinterpret_cast<POINT*>(&rc), 2);
+    return rc;
+}
+
+std::string TempFolder(const char* name) {
+    char temp[MAX_PATH] = "";
+    ::GetTempPathA(MAX_PATH, temp);
+    std::string folder = std::string(temp) + name;
+    ::CreateDirectoryA(folder.c_str(), nullptr);
+    return folder;
+}
+
+class ExplorerFrame : public ::testing::Test {
+protected:
+    void SetUp() override {
+        g_app.SetUp(IDR_MAINFRAME);
+        std::remove(ExplorerSettingsPath().c_str());
+        std::snprintf(g_szAcceptCaption, kCaptionChars, "%s", "OK");
+        std::snprintf(g_szCancelCaption, kCaptionChars, "%s", "CANCEL");
+        g_szStartPath[0] = '\0';
+        HostApi api;
+        SetHostApi(api);
+    }
+    void TearDown() override {
+        DestroyDocument();
+        std::remove(ExplorerSettingsPath().c_str());
+    }
+
+    // Writes the explorer's settings file that the next run's document reads.
+    static void WriteSettings(const std::string& text) {
+        std::ofstream(ExplorerSettingsPath(), std::ios::binary) << text;
+    }
+    static void DestroyDocument() {
+        delete g_pTessel3Doc;
+        g_pTessel3Doc = nullptr;
+    }
+
+    INT_PTR Run(RunDialog& dialog) {
+        const INT_PTR result = dialog.DoModal();
+        Pump();
+        EXPECT_TRUE(dialog.created);
+        EXPECT_EQ(g_pMainFrame, nullptr) << "the frame goes with the dialog";
+        return result;
+    }
+};
+
+} // namespace
+
+TEST_F(ExplorerFrame, MenuHasEveryItemWithItsCommand) {
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        HMENU menu = frame.GetMenu();
+        ASSERT_NE(menu, nullptr);
+        ASSERT_EQ(::GetMenuItemCount(menu), 4);
+        EXPECT_EQ(MenuText(menu, 0, MF_BYPOSITION), "&File");
+        EXPECT_EQ(MenuText(menu, 1, MF_BYPOSITION), "&View");
+        EXPECT_EQ(MenuText(menu, 2, MF_BYPOSITION), "&Sort");
+        EXPECT_EQ(MenuText(menu, 3, MF_BYPOSITION), "&Help");
+        const struct {
+            UINT id;
+            const char* text;
+        } items[] = {{57665, "E&xit"},     {59392, "&Toolbar"},  {59393, "&Status Bar"}, {32771, "&Begin"},
+                     {32774, "&Increase"}, {32775, "&Decrease"}, {32782, "&Aligne"},     {32799, "By &Name"},
+                     {32788, "By &Date"},  {32789, "By &Size"},  {57664, "&About"},      {57670, "&Help"}};
+        for (const auto& item : items)
+            EXPECT_EQ(MenuText(menu, item.id, MF_BYCOMMAND), item.text) << item.id;
+        EXPECT_EQ(::GetSubMenu(menu, 3) ? ::GetMenuItemID(::GetSubMenu(menu, 3), 1) : 0u, 57670u);
+        EXPECT_TRUE(::GetMenuState(menu, 57670, MF_BYCOMMAND) & MF_GRAYED);
+        EXPECT_FALSE(::GetMenuState(menu, 57664, MF_BYCOMMAND) & MF_GRAYED);
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+}
+
+TEST_F(ExplorerFrame, TitleNamesTheExplorerInsteadOfUntitled) {
+    RunDialog dialog;
+    std::string title;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        title = frame.GetWindowText();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_NE(title.find("Kelmar Dwg Thumbnail Explorer"), std::string::npos) << title;
+    EXPECT_EQ(title.find("Untitled"), std::string::npos) << title;
+}
+
+TEST_F(ExplorerFrame, PlaceholdersBecomeSeparatorsHoldingTheSearchControls) {
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        CToolBar& bar = frame.GetMainToolBar();
+        for (UINT id : {ID_SEARCH_LABEL, ID_SEARCH_EDIT, ID_LAYER_LABEL}) {
+            const int index = bar.CommandToIndex(id);
+            ASSERT_GE(index, 0) << id;
+            EXPECT_EQ(bar.GetButtonStyle(index) & TBBS_SEPARATOR, TBBS_SEPARATOR) << id;
+        }
+        const CRect searchSep = ItemRect(bar, ID_SEARCH_LABEL);
+        EXPECT_EQ(searchSep.Width(), frame.MeasureLabelText("Search:").cx + 1);
+        EXPECT_EQ(frame.GetSearchLabel().GetWindowText(), "Search:");
+        EXPECT_EQ(RectInParent(frame.GetSearchLabel()), searchSep);
+
+        const CRect editSep = ItemRect(bar, ID_SEARCH_EDIT);
+        EXPECT_EQ(editSep.Width(), 125);
+        const CRect edit = RectInParent(frame.GetSearchEdit());
+        const int border = ::GetSystemMetrics(SM_CXEDGE);
+        EXPECT_EQ(edit.left, editSep.left + border);
+        EXPECT_EQ(edit.right, editSep.right - border);
+        EXPECT_EQ(edit.Height(), frame.MeasureLabelText("Search:").cy);
+        EXPECT_LE(std::abs((edit.top - editSep.top) - (editSep.bottom - edit.bottom)), 1);
+        EXPECT_EQ(::GetParent(frame.GetSearchEdit().m_hWnd), bar.m_hWnd);
+        EXPECT_TRUE(frame.GetSearchEdit().GetStyle() & ES_AUTOHSCROLL);
+        EXPECT_FALSE(frame.GetSearchEdit().GetStyle() & WS_BORDER);
+
+        const CRect layerSep = ItemRect(bar, ID_LAYER_LABEL);
+        EXPECT_EQ(layerSep.Width(), frame.MeasureLabelText(" Layer name:").cx + 1000);
+        EXPECT_EQ(RectInParent(frame.GetLayerLabel()), layerSep);
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+}
+
+TEST_F(ExplorerFrame, BottomToolbarCarriesTheCaptionsAndStartsWithoutAPick) {
+    std::snprintf(g_szAcceptCaption, kCaptionChars, "%s", "Insert");
+    std::snprintf(g_szCancelCaption, kCaptionChars, "%s", "Leave");
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        CToolBar& bar = frame.GetPickToolBar();
+        EXPECT_EQ(frame.GetAcceptLabel().GetWindowText(), "Insert");
+        EXPECT_EQ(frame.GetCancelLabel().GetWindowText(), "Leave");
+        for (auto [id, label] : {std::pair<UINT, CStatic*>{ID_ACCEPT, &frame.GetAcceptLabel()},
+                                 std::pair<UINT, CStatic*>{ID_CANCEL_PICK, &frame.GetCancelLabel()}}) {
+            const CRect button = ItemRect(bar, id);
+            const CRect rc = RectInParent(*label);
+            const CSize text = frame.MeasureLabelText(label->GetWindowText());
+            EXPECT_EQ(rc.Width(), text.cx);
+            EXPECT_EQ(rc.Height(), text.cy);
+            EXPECT_LE(std::abs((rc.left - button.left) - (button.right - rc.right)), 1) << id;
+            EXPECT_LE(std::abs((rc.top - button.top) - (button.bottom - rc.bottom)), 1) << id;
+        }
+        // The bottom toolbar sits at the bottom of the frame, above the status bar.
+        const CRect frameClient = frame.GetClientRect();
+        const CRect status = RectInParent(frame.GetStatusBar());
+        const CRect bottomBar = RectInParent(bar);
+        EXPECT_EQ(status.bottom, frameClient.bottom);
+        EXPECT_EQ(bottomBar.bottom, status.top);
+        EXPECT_EQ(frame.GetStatusBar().GetCount(), 4);
+
+        EXPECT_FALSE(frame.IsPickEnabled());
+        EXPECT_FALSE(bar.GetToolBarCtrl().IsButtonEnabled(ID_ACCEPT));
+        EXPECT_FALSE(frame.GetAcceptLabel().IsWindowEnabled());
+        EXPECT_TRUE(bar.GetToolBarCtrl().IsButtonEnabled(ID_CANCEL_PICK));
+    });
+    dialog.steps.push_back([](CMainFrame& frame) {
+        // Still disabled after the idle updates ran.
+        EXPECT_FALSE(frame.GetPickToolBar().GetToolBarCtrl().IsButtonEnabled(ID_ACCEPT));
+        frame.EnablePick(true);
+        EXPECT_TRUE(frame.GetPickToolBar().GetToolBarCtrl().IsButtonEnabled(ID_ACCEPT));
+        EXPECT_TRUE(frame.GetAcceptLabel().IsWindowEnabled());
+        frame.GetPickToolBar().PostMessage(WM_COMMAND, MAKEWPARAM(ID_CANCEL_PICK, BN_CLICKED),
+                                           reinterpret_cast<LPARAM>(frame.GetPickToolBar().m_hWnd));
+    });
+    EXPECT_EQ(Run(dialog), 2);
+}
+
+TEST_F(ExplorerFrame, EscapeInTheSearchEditCancels) {
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        frame.GetSearchEdit().SetFocus();
+        frame.GetSearchEdit().PostMessage(WM_KEYDOWN, VK_ESCAPE, 0x00010001);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+}
+
+TEST_F(ExplorerFrame, ClickInTheSearchEditEmptiesItAndMakesItWritable) {
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        CEditSearch& edit = frame.GetSearchEdit();
+        edit.SetWindowText("abc");
+        edit.SetReadOnly(true);
+        edit.PostMessage(WM_LBUTTONDOWN, MK_LBUTTON, MAKELPARAM(3, 3));
+        edit.PostMessage(WM_LBUTTONUP, 0, MAKELPARAM(3, 3));
+    });
+    dialog.steps.push_back([](CMainFrame& frame) {
+        CEditSearch& edit = frame.GetSearchEdit();
+        EXPECT_EQ(edit.GetWindowText(), "");
+        EXPECT_FALSE(edit.GetStyle() & ES_READONLY);
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+}
+
+TEST_F(ExplorerFrame, CloseBoxCancelsAndStoresTheFrameSize) {
+    WriteSettings("[Size]\r\nSplitterSize=140\r\nWindowWidth=640\r\nWindowHeight=480\r\n");
+    RunDialog dialog;
+    CRect before;
+    int splitter = 0;
+    dialog.beforeCreate = [&] { ::MoveWindow(dialog.m_hWnd, 300, 300, 100, 60, FALSE); };
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        EXPECT_FALSE(::IsZoomed(frame.m_hWnd));
+        frame.MoveWindow(50, 60, 700, 500);
+        before = frame.GetWindowRect();
+        int minimum = 0;
+        frame.GetSplitter().GetColumnInfo(0, splitter, minimum);
+        frame.PostMessage(WM_SYSCOMMAND, SC_CLOSE, 0);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    ASSERT_NE(g_pTessel3Doc, nullptr);
+    EXPECT_EQ(g_pTessel3Doc->m_nWindowWidth, 700);
+    EXPECT_EQ(g_pTessel3Doc->m_nWindowHeight, 500);
+    EXPECT_EQ(splitter, 140);
+    EXPECT_EQ(g_pTessel3Doc->m_nSplitterSize, 140);
+}
+
+TEST_F(ExplorerFrame, StoredSizeIsPlacedByTheFormula) {
+    WriteSettings("[Size]\r\nWindowWidth=400\r\nWindowHeight=300\r\n");
+    RunDialog dialog;
+    CRect dialogRect;
+    dialog.beforeCreate = [&] {
+        ::MoveWindow(dialog.m_hWnd, 300, 200, 200, 100, FALSE);
+        dialogRect = dialog.GetWindowRect();
+    };
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        const CRect rc = frame.GetWindowRect();
+        EXPECT_FALSE(::IsZoomed(frame.m_hWnd));
+        EXPECT_TRUE(frame.IsWindowVisible());
+        EXPECT_EQ(rc.left, (dialogRect.left + dialogRect.right) / 2 - 200);
+        EXPECT_EQ(rc.top,
+                  (dialogRect.top + dialogRect.bottom) / 2 - (300 - dialogRect.top + dialogRect.bottom) / 2);
+        EXPECT_EQ(rc.Width(), 400);
+        EXPECT_EQ(rc.Height(), 300);
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+}
+
+TEST_F(ExplorerFrame, NoStoredSizeWithTheDialogAtTheTopLeftOpensMaximised) {
+    WriteSettings("[Size]\r\nWindowWidth=0\r\nWindowHeight=0\r\n");
+    RunDialog dialog;
+    dialog.beforeCreate = [&] { ::MoveWindow(dialog.m_hWnd, 0, 0, 0, 0, FALSE); };
+    dialog.steps.push_back([](CMainFrame& frame) {
+        EXPECT_TRUE(::IsZoomed(frame.m_hWnd));
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+}
+
+TEST_F(ExplorerFrame, SortCommandsSetTheModeAndCheckTheirItems) {
+    WriteSettings("[View]\r\nSort=2\r\n");
+    RunDialog dialog;
+    auto checked = [](CMainFrame& frame, UINT id) {
+        HMENU sort = ::GetSubMenu(frame.GetMenu(), 2);
+        frame.SendMessage(WM_INITMENUPOPUP, reinterpret_cast<WPARAM>(sort), 2);
+        return (::GetMenuState(sort, id, MF_BYCOMMAND) & MF_CHECKED) != 0;
+    };
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        EXPECT_EQ(frame.GetSortMode(), 2);
+        EXPECT_TRUE(checked(frame, ID_SORT_SIZE));
+        EXPECT_FALSE(checked(frame, ID_SORT_NAME));
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_SORT_DATE, 0), 0);
+        EXPECT_EQ(frame.GetSortMode(), 1);
+        EXPECT_TRUE(checked(frame, ID_SORT_DATE));
+        EXPECT_FALSE(checked(frame, ID_SORT_SIZE));
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_SORT_NAME, 0), 0);
+        EXPECT_EQ(frame.GetSortMode(), 0);
+        EXPECT_TRUE(checked(frame, ID_SORT_NAME));
+        EXPECT_FALSE(checked(frame, ID_SORT_DATE));
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_SORT_DATE, 0), 0);
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    ASSERT_NE(g_pTessel3Doc, nullptr);
+    EXPECT_EQ(g_pTessel3Doc->m_nSort, 1) << "the frame's sort mode goes back into the settings";
+}
+
+TEST_F(ExplorerFrame, LayerLabelShowsTheStartFolderLayer) {
+    const std::string folder = TempFolder("orvex-frame-layer");
+    std::ofstream(folder + "\\datains.ini", std::ios::binary)
+        << "[Default Parameters]\r\nLayer=Walls\r\nColor=3\r\nLisp command=\r\n";
+    std::snprintf(g_szStartPath, kPathChars, "%s\\plan.dwg", folder.c_str());
+    RunDialog dialog;
+    std::string label;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        label = frame.GetLayerLabel().GetWindowText();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(label, " Layer name: Walls");
+    ASSERT_NE(g_pTessel3Doc, nullptr);
+    EXPECT_EQ(g_pTessel3Doc->m_strPath, folder);
+    std::remove((folder + "\\datains.ini").c_str());
+    ::RemoveDirectoryA(folder.c_str());
+}
+
+TEST_F(ExplorerFrame, LayerLabelSaysCurrentWithoutDatainsIni) {
+    const std::string folder = TempFolder("orvex-frame-nolayer");
+    WriteSettings("[CurrentPath]\r\nPath=" + folder + "\r\n");
+    RunDialog dialog;
+    std::string label;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        label = frame.GetLayerLabel().GetWindowText();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(label, " Layer name: Current");
+    ::RemoveDirectoryA(folder.c_str());
+}
+
+TEST_F(ExplorerFrame, AcceptNeedsAChosenDrawing) {
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        // No drawing chosen: the accept command does nothing.
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0);
+    });
+    dialog.steps.push_back([](CMainFrame& frame) {
+        ASSERT_NE(g_pTessel3Doc, nullptr);
+        g_pTessel3Doc->m_strName = "plan.dwg";
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0);
+    });
+    EXPECT_EQ(Run(dialog), 1);
+}
+
+TEST_F(ExplorerFrame, SavedDrawingNameStartsTheSearchAndIsCleared) {
+    WriteSettings("[CurrentPath]\r\nName=plan-b.dwg\r\n");
+    RunDialog dialog;
+    std::string text, name = "unset";
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        text = frame.GetSearchEdit().GetWindowText();
+        name = g_pTessel3Doc ? g_pTessel3Doc->m_strName : "no document";
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(text, "plan-b");
+    EXPECT_EQ(name, "");
+}
+
+TEST_F(ExplorerFrame, HostFrameIsDisabledWhileTheExplorerIsOpen) {
+    static HWND s_host = nullptr;
+    CWnd host;
+    ASSERT_TRUE(host.CreateEx(0, nullptr, "host", WS_OVERLAPPEDWINDOW, CRect(0, 0, 200, 100), nullptr, 0));
+    s_host = host.m_hWnd;
+    HostApi api;
+    api.acedGetAcadFrame = [] { return s_host; };
+    SetHostApi(api);
+    RunDialog dialog;
+    dialog.hostFrame = host.m_hWnd;
+    dialog.steps.push_back([](CMainFrame& frame) { frame.PostMessage(WM_CLOSE); });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_TRUE(dialog.hostDisabledDuringRun);
+    host.DestroyWindow();
+}
+
+TEST_F(ExplorerFrame, ClearCommandClearsTheFocusWindowSelection) {
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        CEditSearch& edit = frame.GetSearchEdit();
+        edit.SetWindowText("abcdef");
+        edit.SetFocus();
+        edit.SetSel(0, 3);
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_CLEAR, 1), 0);
+        EXPECT_EQ(edit.GetWindowText(), "def");
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+}
