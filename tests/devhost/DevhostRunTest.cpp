@@ -131,11 +131,11 @@ using Lines = std::vector<std::string>;
 // What the fake prints around the calls when it is loaded with one drawing.
 Lines Opening() {
     return {"fake: initApp", "fake: message 1 linker 1 unlock 1 mdi 1 other id 0", "fake: created #1",
-            "fake: activated #1", "fake: message 3 in #1 defined 10"};
+            "fake: activated #1", "fake: message 3 in #1 defined 11"};
 }
 
 Lines Closing() {
-    return {"fake: message 4 in #1 undefined 10", "fake: to be destroyed #1", "fake: message 2",
+    return {"fake: message 4 in #1 undefined 11", "fake: to be destroyed #1", "fake: message 2",
             "fake: uninitApp"};
 }
 
@@ -163,10 +163,10 @@ TEST(Devhost, LifecycleModuleFirstWithTwoDrawings) {
     EXPECT_EQ(run.exitCode, 0u) << run.errors;
     EXPECT_EQ(run.lines,
               (Lines{"fake: initApp", "fake: message 1 linker 1 unlock 1 mdi 1 other id 0",
-                     "fake: created #1", "fake: activated #1", "fake: message 3 in #1 defined 10",
-                     "fake: created #2", "fake: activated #2", "fake: message 3 in #2 defined 10",
-                     "fake: activated #1", "=> (1 2)", "fake: message 4 in #1 undefined 10",
-                     "fake: to be destroyed #1", "fake: activated #2", "fake: message 4 in #2 undefined 10",
+                     "fake: created #1", "fake: activated #1", "fake: message 3 in #1 defined 11",
+                     "fake: created #2", "fake: activated #2", "fake: message 3 in #2 defined 11",
+                     "fake: activated #1", "=> (1 2)", "fake: message 4 in #1 undefined 11",
+                     "fake: to be destroyed #1", "fake: activated #2", "fake: message 4 in #2 undefined 11",
                      "fake: to be destroyed #2", "fake: message 2", "fake: uninitApp"}));
 }
 
@@ -174,8 +174,8 @@ TEST(Devhost, LifecycleEntryFirst) {
     const RunResult run = RunDevhost({L"--order", L"entry-first"});
     EXPECT_EQ(run.exitCode, 0u) << run.errors;
     EXPECT_EQ(run.lines, (Lines{"fake: message 1 linker 1 unlock 1 mdi 1 other id 0", "fake: initApp",
-                                "fake: created #1", "fake: activated #1", "fake: message 3 in #1 defined 10",
-                                "fake: message 4 in #1 undefined 10", "fake: to be destroyed #1",
+                                "fake: created #1", "fake: activated #1", "fake: message 3 in #1 defined 11",
+                                "fake: message 4 in #1 undefined 11", "fake: to be destroyed #1",
                                 "fake: message 2", "fake: uninitApp"}));
 }
 
@@ -270,10 +270,10 @@ TEST(Devhost, ScriptDrivesADialogWithRealInput) {
                             "fake: message 1 linker 1 unlock 1 mdi 1 other id 0",
                             "fake: created #1",
                             "fake: activated #1",
-                            "fake: message 3 in #1 defined 10",
+                            "fake: message 3 in #1 defined 11",
                             "fake: created #2",
                             "fake: activated #2",
-                            "fake: message 3 in #2 defined 10",
+                            "fake: message 3 in #2 defined 11",
                             "fake: activated #1",
                             "[script] count 1",
                             "[script] count 2",
@@ -283,10 +283,10 @@ TEST(Devhost, ScriptDrivesADialogWithRealInput) {
                             "=> (\"picker\" 7 \"hi ther\")",
                             "[script] focus DevhostDrawingView id=59648",
                             "[script] done",
-                            "fake: message 4 in #1 undefined 10",
+                            "fake: message 4 in #1 undefined 11",
                             "fake: to be destroyed #1",
                             "fake: activated #2",
-                            "fake: message 4 in #2 undefined 10",
+                            "fake: message 4 in #2 undefined 11",
                             "fake: to be destroyed #2",
                             "fake: message 2",
                             "fake: uninitApp"}));
@@ -327,6 +327,30 @@ TEST(Devhost, ScriptOnTheHostsOwnWindows) {
     EXPECT_EQ(facts, (Lines{"[script] text devhost", "[script] exists yes", "[script] exists no",
                             "[script] count 3", "[script] tooltip (none)"}))
         << run.output;
+}
+
+// The sample drawings lie beside the checkout; under Wine the Unix root is drive Z:.
+std::wstring SampleFolder() {
+    std::wstring path = L"Z:" + devhost::FromUtf8(ORVEX_SOURCE_DIR "/../shared/dwg-samples");
+    for (wchar_t& c : path)
+        if (c == L'/')
+            c = L'\\';
+    return path;
+}
+
+TEST(Devhost, DrawsTheStoredPreviewOfADrawing) {
+    const std::wstring sample = SampleFolder() + L"\\2000\\Arc.dwg";
+    if (GetFileAttributesW(sample.c_str()) == INVALID_FILE_ATTRIBUTES)
+        GTEST_SKIP() << "no sample drawings at " << devhost::ToUtf8(SampleFolder());
+    std::wstring escaped;
+    for (wchar_t c : sample)
+        escaped += c == L'\\' ? std::wstring(L"\\\\") : std::wstring(1, c);
+    const RunResult run = RunDevhost(
+        {L"--eval", L"(preview \"" + escaped + L"\")", L"--eval", L"(preview \"no-such-file.dwg\")"});
+    EXPECT_EQ(run.exitCode, 0u) << run.errors;
+    ASSERT_EQ(run.lines.size(), Opening().size() + 2 + Closing().size()) << run.output;
+    EXPECT_EQ(run.lines[Opening().size()], "=> (1 1)"); // drawn, and more than the background shows
+    EXPECT_EQ(run.lines[Opening().size() + 1].rfind("=> (0 ", 0), 0u) << run.output; // nothing to draw
 }
 
 TEST(Devhost, BadScriptIsAUsageError) {

@@ -148,6 +148,36 @@ void Misc() {
     Host().acutRelRb(list);
 }
 
+// Draws a drawing's preview into the view and tells whether it was drawn and how many colours a grid of
+// the view's pixels then shows.
+void Preview() {
+    resbuf* args = Host().acedGetArgs();
+    HWND view = Host().acedGetAcadDwgView();
+    const std::uint32_t white = 0x00FFFFFF;
+    const bool drawn = args && args->restype == RTSTR &&
+                       Host().acdbDisplayPreviewFromDwg(args->resval.rstring, view, &white);
+    std::vector<COLORREF> colours;
+    RECT client{};
+    GetClientRect(view, &client);
+    HDC dc = GetDC(view);
+    for (int y = 0; y < 24; ++y) {
+        for (int x = 0; x < 24; ++x) {
+            const COLORREF c = GetPixel(dc, client.right * x / 24, client.bottom * y / 24);
+            bool seen = false;
+            for (COLORREF known : colours)
+                seen = seen || known == c;
+            if (!seen)
+                colours.push_back(c);
+        }
+    }
+    ReleaseDC(view, dc);
+    resbuf* list =
+        Host().acutBuildList(RTSHORT, drawn ? 1 : 0, RTSHORT, static_cast<int>(colours.size() > 1), 0);
+    Host().acedRetList(list);
+    Host().acutRelRb(list);
+    Host().acutRelRb(args);
+}
+
 wchar_t g_pickedText[256];
 
 INT_PTR CALLBACK PickerProc(HWND dialog, UINT message, WPARAM wParam, LPARAM) {
@@ -190,8 +220,9 @@ struct Function {
 };
 
 const Function kFunctions[] = {
-    {L"echo", &Echo},   {L"keep", &Keep},   {L"nothing", &Nothing}, {L"void", &Void}, {L"talk", &Talk},
-    {L"build", &Build}, {L"layer", &Layer}, {L"windows", &Windows}, {L"misc", &Misc}, {L"picker", &Picker},
+    {L"echo", &Echo}, {L"keep", &Keep},     {L"nothing", &Nothing}, {L"void", &Void},
+    {L"talk", &Talk}, {L"build", &Build},   {L"layer", &Layer},     {L"windows", &Windows},
+    {L"misc", &Misc}, {L"picker", &Picker}, {L"preview", &Preview},
 };
 constexpr int kFunctionCount = sizeof kFunctions / sizeof kFunctions[0];
 
