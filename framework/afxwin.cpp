@@ -1,6 +1,7 @@
 #include "afxwin.h"
 
 #include <cstdio>
+#include <deque>
 #include <exception>
 #include <vector>
 
@@ -16,10 +17,18 @@ AFX_ERROR_REPORTER g_reporter = nullptr;
 // framework in one process -- a host program and this library -- never take each other's windows).
 const char* const kBindProperty = "Orvex1.CWnd";
 
-// Window classes registered by this module, unregistered by AfxWinTerm.
-std::vector<std::string>& RegisteredClasses() {
-    static std::vector<std::string> names;
+// Window classes registered by this module, unregistered by AfxWinTerm. A deque keeps the names where
+// they are, so the pointers AfxRegisterWndClass hands out stay valid until then.
+std::deque<std::string>& RegisteredClasses() {
+    static std::deque<std::string> names;
     return names;
+}
+
+const char* StableName(const std::string& name) {
+    for (const std::string& known : RegisteredClasses())
+        if (known == name)
+            return known.c_str();
+    return nullptr;
 }
 
 bool RegisterFrameworkClass(const char* name, UINT style, HCURSOR cursor, HBRUSH background, HICON icon) {
@@ -27,8 +36,11 @@ bool RegisterFrameworkClass(const char* name, UINT style, HCURSOR cursor, HBRUSH
     WNDCLASSEXA existing{};
     existing.cbSize = sizeof existing;
     if (::GetClassInfoExA(hInst, name, &existing)) {
-        if (existing.lpfnWndProc == AfxWndProc)
+        if (existing.lpfnWndProc == AfxWndProc) {
+            if (!StableName(name))
+                RegisteredClasses().emplace_back(name);
             return true;
+        }
         // Left behind by an earlier load of this library whose code is gone: replace it.
         ::UnregisterClassA(name, hInst);
     }
@@ -137,7 +149,7 @@ void AfxInitCommonControls() {
 }
 
 const char* AfxRegisterWndClass(UINT classStyle, HCURSOR cursor, HBRUSH background, HICON icon) {
-    static thread_local char name[96];
+    char name[96];
     if (classStyle == (CS_DBLCLKS | CS_HREDRAW | CS_VREDRAW) && !cursor && !background && !icon) {
         RegisterFrameworkClass(AFX_WND_CLASS, classStyle, ::LoadCursorA(nullptr, IDC_ARROW),
                                reinterpret_cast<HBRUSH>(COLOR_WINDOW + 1), nullptr);
@@ -145,8 +157,11 @@ const char* AfxRegisterWndClass(UINT classStyle, HCURSOR cursor, HBRUSH backgrou
     }
     std::snprintf(name, sizeof name, "Orvex1:%x:%p:%p:%p", classStyle, static_cast<void*>(cursor),
                   static_cast<void*>(background), static_cast<void*>(icon));
-    RegisterFrameworkClass(name, classStyle, cursor, background, icon);
-    return name;
+    if (const char* known = StableName(name))
+        return known;
+    if (!RegisterFrameworkClass(name, classStyle, cursor, background, icon))
+        return AFX_WND_CLASS;
+    return StableName(name);
 }
 
 // ---- CWinApp ----------------------------------------------------------------------------------------
