@@ -11,6 +11,7 @@
 #include <fstream>
 #include <set>
 #include <sstream>
+#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -55,8 +56,11 @@ void MakeDir(const std::string& path) {
 }
 
 void PutLe32(std::vector<unsigned char>& v, std::size_t at, std::uint32_t x) {
-    for (int i = 0; i < 4; ++i)
-        v[at + static_cast<std::size_t>(i)] = static_cast<unsigned char>(x >> (8 * i));
+    if (at + 4 > v.size())
+        throw std::out_of_range("PutLe32 outside the buffer");
+    const unsigned char bytes[4] = {static_cast<unsigned char>(x), static_cast<unsigned char>(x >> 8),
+                                    static_cast<unsigned char>(x >> 16), static_cast<unsigned char>(x >> 24)};
+    std::copy(bytes, bytes + 4, v.begin() + static_cast<std::ptrdiff_t>(at));
 }
 
 struct Entry {
@@ -511,6 +515,32 @@ TEST(SyntheticDwg, NamesAreVariedDrawingNames) {
     }
     EXPECT_TRUE(upperExtension);
     EXPECT_GT(stems.size(), 20u);
+}
+
+} // namespace
+
+namespace {
+
+// The fuzzer's seeds stay what their names say.
+TEST(DwgPreviewSeeds, SeedsParseAsNamed) {
+    const std::string dir = ORVEX_FUZZ_SEEDS;
+    struct Seed {
+        const char* name;
+        DwgPreviewKind kind;
+    } seeds[] = {{"bmp24", DwgPreviewKind::Bmp},        {"bmp8", DwgPreviewKind::Bmp},
+                 {"bmp4", DwgPreviewKind::Bmp},         {"png", DwgPreviewKind::Png},
+                 {"wmf", DwgPreviewKind::Wmf},          {"bmp_wmf", DwgPreviewKind::Bmp},
+                 {"r2000_layout", DwgPreviewKind::Bmp}, {"header_only", DwgPreviewKind::None},
+                 {"no_entries", DwgPreviewKind::None},  {"pre_r13", DwgPreviewKind::None}};
+    for (const Seed& s : seeds) {
+        SCOPED_TRACE(s.name);
+        const std::string path = dir + "/" + s.name;
+        if (!IsDirectory(dir))
+            GTEST_SKIP() << "fuzz seeds not found at " << dir;
+        DwgPreview p;
+        EXPECT_EQ(ReadDwgPreview(path, p), s.kind != DwgPreviewKind::None);
+        EXPECT_EQ(p.kind, s.kind);
+    }
 }
 
 } // namespace

@@ -108,7 +108,8 @@ void FillBackground(HDC dc, const RECT& area, COLORREF background) {
 
 // A small grey cross in the middle: the file has no picture to show.
 void DrawNoPreviewMark(HDC dc, const RECT& area) {
-    const int size = std::min({16, static_cast<int>(area.right - area.left) / 2, static_cast<int>(area.bottom - area.top) / 2});
+    const int size = std::min(
+        {16, static_cast<int>(area.right - area.left) / 2, static_cast<int>(area.bottom - area.top) / 2});
     if (size < 2)
         return;
     const int cx = (area.left + area.right) / 2;
