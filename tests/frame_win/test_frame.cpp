@@ -7,6 +7,7 @@
 #include "host/Orvex.h"
 #include "settings/SettingsPath.h"
 #include "settings/Tessel3Doc.h"
+#include "thumbs/Tessel3View.h"
 
 #include "res/resource.h"
 
@@ -15,6 +16,7 @@
 #include <cstdio>
 #include <fstream>
 #include <functional>
+#include <initializer_list>
 #include <string>
 #include <vector>
 
@@ -483,4 +485,67 @@ TEST_F(ExplorerFrame, ClearCommandClearsTheFocusWindowSelection) {
         frame.PostMessage(WM_CLOSE);
     });
     EXPECT_EQ(Run(dialog), 2);
+}
+
+namespace {
+
+// A folder with empty drawing files: enough for the scan, the search and the pick.
+std::string FolderWithDrawings(const char* name, std::initializer_list<const char*> files) {
+    const std::string folder = TempFolder(name);
+    for (const char* file : files)
+        std::ofstream(folder + "\\" + file, std::ios::binary) << "";
+    return folder;
+}
+
+void RemoveFolder(const std::string& folder, std::initializer_list<const char*> files) {
+    for (const char* file : files)
+        std::remove((folder + "\\" + file).c_str());
+    ::RemoveDirectoryA(folder.c_str());
+}
+
+} // namespace
+
+TEST_F(ExplorerFrame, TypingAPrefixChoosesTheDrawingAndAcceptTakesIt) {
+    const auto files = {"abc.dwg", "xyz.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-search", files);
+    std::snprintf(g_szStartPath, kPathChars, "%s\\", folder.c_str());
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        EXPECT_FALSE(frame.IsPickEnabled());
+        CEditSearch& edit = frame.GetSearchEdit();
+        edit.SetFocus();
+        edit.PostMessage(WM_CHAR, 'A', 1);
+        edit.PostMessage(WM_CHAR, 'B', 1);
+    });
+    dialog.steps.push_back([](CMainFrame& frame) {
+        EXPECT_EQ(frame.GetSearchEdit().GetWindowText(), "AB");
+        ASSERT_NE(g_pTessel3Doc, nullptr);
+        EXPECT_EQ(g_pTessel3Doc->m_strName, "abc.dwg");
+        EXPECT_TRUE(frame.IsPickEnabled());
+        EXPECT_TRUE(frame.GetPickToolBar().GetToolBarCtrl().IsButtonEnabled(ID_ACCEPT));
+        frame.GetPickToolBar().PostMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, BN_CLICKED),
+                                           reinterpret_cast<LPARAM>(frame.GetPickToolBar().m_hWnd));
+    });
+    EXPECT_EQ(Run(dialog), 1);
+    ASSERT_NE(g_pTessel3Doc, nullptr);
+    EXPECT_EQ(g_pTessel3Doc->m_strPath, folder);
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "abc.dwg");
+    RemoveFolder(folder, files);
+}
+
+TEST_F(ExplorerFrame, GridCommandsAreForwardedToTheGrid) {
+    RunDialog dialog;
+    int before = 0, after = 0;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        ASSERT_NE(frame.GetGridView(), nullptr);
+        before = frame.GetGridView()->GetPictureWidth();
+        // Through the accelerator table and the menu alike the command reaches the frame first.
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_VIEW_INCREASE, 0), 0);
+        after = frame.GetGridView()->GetPictureWidth();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_GT(after, before);
+    ASSERT_NE(g_pTessel3Doc, nullptr);
+    EXPECT_EQ(g_pTessel3Doc->m_nPictureWidth, after) << "the picture size goes back into the settings";
 }
