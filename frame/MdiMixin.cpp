@@ -78,15 +78,15 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog) {
     HWND hostFrame = acedGetAcadFrame();
     if (hostFrame)
         ::EnableWindow(hostFrame, FALSE);
-    // 4.
+    // 4. The object is kept through a failed creation (its window may have come and gone) and freed here.
+    frame->m_bAutoDelete = false;
     if (!frame->LoadFrame(m_nIDFrameResource, WS_OVERLAPPEDWINDOW | FWS_ADDTOTITLE, dialog, nullptr)) {
         if (hostFrame)
             ::EnableWindow(hostFrame, TRUE);
-        // A frame whose window never came up did not delete itself.
-        if (!frame->m_hWnd)
-            delete frame;
+        delete frame;
         return false;
     }
+    frame->m_bAutoDelete = true;
     // 5. The posted accept and cancel messages go to the dialog.
     m_pMainWnd = dialog;
     frame->InitialUpdateFrame(doc, false);

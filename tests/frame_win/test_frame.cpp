@@ -549,3 +549,46 @@ TEST_F(ExplorerFrame, GridCommandsAreForwardedToTheGrid) {
     ASSERT_NE(g_pTessel3Doc, nullptr);
     EXPECT_EQ(g_pTessel3Doc->m_nPictureWidth, after) << "the picture size goes back into the settings";
 }
+
+TEST_F(ExplorerFrame, AboutBoxShowsItsTitleAndText) {
+    RunDialog dialog;
+    std::string text;
+    bool found = false;
+    dialog.steps.push_back(
+        [](CMainFrame& frame) { frame.PostMessage(WM_COMMAND, MAKEWPARAM(ID_APP_ABOUT, 0), 0); });
+    dialog.steps.push_back([&](CMainFrame&) {
+        // Runs inside the about box's own modal loop.
+        HWND about = ::FindWindowA(nullptr, "About Orvex1");
+        found = about != nullptr;
+        if (!about)
+            return;
+        char buffer[64] = "";
+        ::GetDlgItemTextA(about, IDC_ABOUT_TEXT, buffer, sizeof buffer);
+        text = buffer;
+        ::PostMessageA(about, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED), 0);
+    });
+    dialog.steps.push_back([](CMainFrame& frame) {
+        EXPECT_EQ(::FindWindowA(nullptr, "About Orvex1"), nullptr);
+        frame.PostMessage(WM_COMMAND, MAKEWPARAM(ID_APP_EXIT, 0), 0);
+    });
+    EXPECT_EQ(Run(dialog), 2) << "Exit closes the frame, which cancels";
+    EXPECT_TRUE(found);
+    EXPECT_EQ(text, "Orvex1");
+}
+
+TEST_F(ExplorerFrame, CancelButtonOfTheBottomToolbarCancelsByMouse) {
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        CToolBar& bar = frame.GetPickToolBar();
+        CRect rc;
+        bar.GetItemRect(bar.CommandToIndex(ID_CANCEL_PICK), &rc);
+        // The caption label lies over the button but lets the mouse through to it.
+        const CPoint at = rc.CenterPoint();
+        CPoint screen = at;
+        bar.ClientToScreen(&screen);
+        EXPECT_EQ(::WindowFromPoint(screen), bar.m_hWnd);
+        bar.PostMessage(WM_LBUTTONDOWN, MK_LBUTTON, MAKELPARAM(at.x, at.y));
+        bar.PostMessage(WM_LBUTTONUP, 0, MAKELPARAM(at.x, at.y));
+    });
+    EXPECT_EQ(Run(dialog), 2);
+}
