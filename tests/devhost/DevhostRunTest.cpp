@@ -301,6 +301,20 @@ TEST(Devhost, ScriptDrivesADialogWithRealInput) {
     DeleteFileW(shot.c_str());
 }
 
+TEST(Devhost, AlertBoxWaitsForThePerson) {
+    const std::wstring script = TempFile(L"alert.txt");
+    WriteFileText(script, "wait class=#32770 text=devhost timeout=10000\n"
+                          "text class=#32770 text=devhost > class=Static contains=line2\n"
+                          "click class=#32770 text=devhost > class=Button text=OK\n"
+                          "gone class=#32770 text=devhost visible=any\n");
+    const RunResult run = RunDevhost({L"--alert-box", L"--script", script, L"--eval", L"(talk)"});
+    EXPECT_EQ(run.exitCode, 0u) << run.errors;
+    EXPECT_EQ(run.lines,
+              WithCalls({"", "hello wide 42 1.50 narrow", R"([alert] \nline1\nline2\t\\end)",
+                         R"([script] text \nline1\nline2\t\\end)", R"([fail] oops\n)", "=> (no value)"}));
+    DeleteFileW(script.c_str());
+}
+
 TEST(Devhost, ScriptTimeoutFailsTheRunAndCancelsTheCall) {
     const std::wstring script = TempFile(L"timeout.txt");
     WriteFileText(script, "wait class=#32770 text=\"Fake picker\"\n"
