@@ -165,3 +165,40 @@ TEST(DrawPreviewWin, ForgedImageBytesAreNotDrawn) {
 }
 
 } // namespace
+
+namespace {
+
+void PutWords(std::vector<unsigned char>& out, std::initializer_list<unsigned> words) {
+    for (unsigned w : words) {
+        out.push_back(static_cast<unsigned char>(w));
+        out.push_back(static_cast<unsigned char>(w >> 8));
+    }
+}
+
+// A placeable metafile of 300 x 200 units holding one white rectangle with a black edge.
+std::vector<unsigned char> RectangleMetafile() {
+    std::vector<unsigned char> wmf;
+    PutWords(wmf, {0xCDD7, 0x9AC6, 0, 0, 0, 300, 200, 1440, 0, 0, 0}); // placeable header
+    PutWords(wmf, {1, 9, 0x0300, 29, 0, 0, 7, 0, 0});                  // header: 29 words, largest record 7
+    PutWords(wmf, {5, 0, 0x020B, 0, 0});                               // SetWindowOrg(0, 0)
+    PutWords(wmf, {5, 0, 0x020C, 200, 300});                           // SetWindowExt(300, 200)
+    PutWords(wmf, {7, 0, 0x041B, 190, 290, 10, 10});                   // Rectangle(10, 10, 290, 190)
+    PutWords(wmf, {3, 0, 0});                                          // end
+    return wmf;
+}
+
+TEST(DrawPreviewWin, MetafileIsPlayed) {
+    const std::string path = TempFile("orvex-draw-metafile.dwg");
+    WriteAll(path, dwggen::BuildDwgWithPicture(dwgfmt::kWmf, RectangleMetafile(), 0, 3));
+    DwgPreview preview;
+    ASSERT_TRUE(ReadDwgPreview(path, preview));
+    EXPECT_EQ(preview.kind, DwgPreviewKind::Wmf);
+    EXPECT_EQ(preview.width, 300);
+    EXPECT_EQ(preview.height, 200);
+    MemoryCanvas canvas(200, 150);
+    EXPECT_TRUE(DrawDwgPreview(canvas.dc(), canvas.rect(), Wide(path).c_str(), kBackground));
+    EXPECT_GT(canvas.CountOther(kCentre, kBackground), 1000);
+    DeleteFileA(path.c_str());
+}
+
+} // namespace

@@ -197,6 +197,11 @@ std::vector<unsigned char> DrawDib(const PictureOptions& picture, std::uint64_t 
 
 std::vector<unsigned char> BuildDwg(const std::vector<unsigned char>& dib, std::size_t fillerBytes,
                                     std::uint64_t seed) {
+    return BuildDwgWithPicture(dwgfmt::kBmp, dib, fillerBytes, seed);
+}
+
+std::vector<unsigned char> BuildDwgWithPicture(unsigned char code, const std::vector<unsigned char>& dib,
+                                               std::size_t fillerBytes, std::uint64_t seed) {
     constexpr std::size_t kSectionAddress = 0x1C0;
     constexpr std::size_t kHeaderDataBytes = 80;
     constexpr unsigned kEntries = 2;
@@ -223,7 +228,7 @@ std::vector<unsigned char> BuildDwg(const std::vector<unsigned char>& dib, std::
     PutLe32(e + 1, static_cast<std::uint32_t>(headerStart));
     PutLe32(e + 5, static_cast<std::uint32_t>(kHeaderDataBytes));
     e += dwgfmt::kEntryBytes;
-    e[0] = dwgfmt::kBmp;
+    e[0] = code;
     PutLe32(e + 1, static_cast<std::uint32_t>(dibStart));
     PutLe32(e + 5, static_cast<std::uint32_t>(dib.size()));
     for (std::size_t i = 0; i < kHeaderDataBytes; ++i)

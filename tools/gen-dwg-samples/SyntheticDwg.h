@@ -23,6 +23,9 @@ std::vector<unsigned char> DrawDib(const PictureOptions& picture, std::uint64_t 
 // that files differ in size.
 std::vector<unsigned char> BuildDwg(const std::vector<unsigned char>& dib, std::size_t fillerBytes,
                                     std::uint64_t seed);
+// The same around a picture of another kind (entry code 2 bitmap, 3 metafile, 6 PNG).
+std::vector<unsigned char> BuildDwgWithPicture(unsigned char code, const std::vector<unsigned char>& picture,
+                                               std::size_t fillerBytes, std::uint64_t seed);
 
 // File name of sample number index: varied words, mixed case, mostly ".dwg" in either case.
 std::string SampleName(std::uint64_t index, std::uint64_t seed);
