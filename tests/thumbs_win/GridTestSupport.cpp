@@ -1,0 +1,252 @@
+#include "GridTestSupport.h"
+
+#include "host/HostApi.h"
+#include "thumbs/ThumbsGlue.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+
+// ---- the frame's side of the glue, recorded ---------------------------------------------------------
+
+FrameRecord& Frame() {
+    static FrameRecord record;
+    return record;
+}
+
+int FrameSortMode() {
+    return Frame().sortMode;
+}
+void FrameEnablePick(bool enable) {
+    Frame().pickEnabled = enable;
+    ++Frame().pickCalls;
+}
+void FrameSetTitle(const std::string& text) {
+    Frame().title = text;
+}
+void FrameUpdateStatus() {
+    ++Frame().statusUpdates;
+}
+void FrameFocusFolderTree() {
+    ++Frame().treeFocusRequests;
+}
+HWND FrameWindow() {
+    return Frame().frame;
+}
+
+// ---- host ---------------------------------------------------------------------------------------------
+
+PaintRecord& Paints() {
+    static PaintRecord record;
+    return record;
+}
+
+namespace {
+
+bool CountingPreview(const wchar_t* fileName, HWND window, const std::uint32_t* bgColor) {
+    PaintRecord& r = Paints();
+    ++r.count;
+    r.names.emplace_back(fileName ? fileName : L"");
+    r.windows.push_back(window);
+    if (!bgColor || *bgColor != 0)
+        r.backgroundZero = false;
+    return true;
+}
+
+} // namespace
+
+void InstallCountingHost() {
+    HostApi api{};
+    api.acdbDisplayPreviewFromDwg = &CountingPreview;
+    SetHostApi(api);
+}
+
+// ---- windows ------------------------------------------------------------------------------------------
+
+LRESULT MainWindow::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+    if (message == WM_APP) {
+        results.push_back(wParam);
+        return 0;
+    }
+    return CWnd::WindowProc(message, wParam, lParam);
+}
+
+MainWindow& Main() {
+    static MainWindow main;
+    if (!main.m_hWnd) {
+        main.CreateEx(0, nullptr, "main", WS_POPUP, CRect(0, 0, 10, 10), nullptr, 0);
+        if (CWinApp* app = AfxGetApp())
+            app->m_pMainWnd = &main;
+    }
+    return main;
+}
+
+bool TestFrame::CreateFrame(int clientWidth, int clientHeight) {
+    RECT rc{0, 0, clientWidth, clientHeight};
+    ::AdjustWindowRectEx(&rc, WS_OVERLAPPEDWINDOW, FALSE, 0);
+    if (!CreateEx(0, nullptr, "grid", WS_OVERLAPPEDWINDOW | WS_CLIPCHILDREN,
+                  CRect(20, 20, 20 + rc.right - rc.left, 20 + rc.bottom - rc.top), nullptr, 0))
+        return false;
+    view = new CTessel3View; // deletes itself with its window
+    if (!view->Create(nullptr, nullptr, WS_CHILD | WS_VISIBLE, CRect(0, 0, clientWidth, clientHeight), this,
+                      0xE900, nullptr))
+        return false;
+    view->OnInitialUpdate();
+    ShowWindow(SW_SHOW);
+    UpdateWindow();
+    ::SetForegroundWindow(m_hWnd);
+    view->SetFocus();
+    return true;
+}
+
+void TestFrame::OnSize(UINT type, int cx, int cy) {
+    Default();
+    if (view && view->m_hWnd)
+        view->MoveWindow(0, 0, cx, cy);
+}
+
+void Pump() {
+    MSG msg;
+    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
+        if (!AfxPreTranslateMessage(&msg)) {
+            ::TranslateMessage(&msg);
+            ::DispatchMessageA(&msg);
+        }
+    }
+}
+
+namespace {
+
+bool g_realInput = true;
+
+bool SendRealKey(WORD vk) {
+    INPUT in[2] = {};
+    in[0].type = INPUT_KEYBOARD;
+    in[0].ki.wVk = vk;
+    in[1] = in[0];
+    in[1].ki.dwFlags = KEYEVENTF_KEYUP;
+    if (::SendInput(2, in, sizeof(INPUT)) != 2)
+        return false;
+    // The input reaches the queue asynchronously: wait for the key up, then let the loop handle both.
+    for (int i = 0; i < 200; ++i) {
+        MSG msg;
+        if (::PeekMessageA(&msg, nullptr, WM_KEYUP, WM_KEYUP, PM_NOREMOVE))
+            return true;
+        ::MsgWaitForMultipleObjects(0, nullptr, FALSE, 5, QS_ALLINPUT);
+    }
+    return false;
+}
+
+} // namespace
+
+bool RealInputWorks() {
+    return g_realInput;
+}
+
+void PressKey(WORD vk) {
+    HWND focus = ::GetFocus();
+    const bool foreground = focus && ::GetForegroundWindow() == ::GetAncestor(focus, GA_ROOT);
+    if (!(g_realInput && foreground && SendRealKey(vk))) {
+        g_realInput = false;
+        ::PostMessageA(focus, WM_KEYDOWN, vk, 1);
+        ::PostMessageA(focus, WM_KEYUP, vk, static_cast<LPARAM>(0xC0000001));
+    }
+    Pump();
+}
+
+// ---- list and windows ---------------------------------------------------------------------------------
+
+void FillList(int count) {
+    BeginScan();
+    for (int i = 0; i < count; ++i) {
+        DwgFindEntry e;
+        char name[32];
+        std::snprintf(name, sizeof name, "d%05d.dwg", i);
+        e.name = name;
+        e.timeWrite = 1600000000 + i;
+        e.size = static_cast<std::uint32_t>(1000 + i);
+        AppendScanEntry(e);
+    }
+    EndScan();
+}
+
+namespace {
+
+struct ChildCount {
+    HWND parent;
+    const char* className;
+    int count;
+};
+
+BOOL CALLBACK CountChild(HWND hwnd, LPARAM lParam) {
+    auto* c = reinterpret_cast<ChildCount*>(lParam);
+    char name[64] = {};
+    ::GetClassNameA(hwnd, name, sizeof name);
+    if (::GetParent(hwnd) == c->parent && ::lstrcmpiA(name, c->className) == 0)
+        ++c->count;
+    return TRUE;
+}
+
+} // namespace
+
+int LiveThumbnails(HWND view) {
+    ChildCount c{view, AFX_WND_CLASS, 0};
+    ::EnumChildWindows(view, CountChild, reinterpret_cast<LPARAM>(&c));
+    return c.count;
+}
+
+int LiveLabels(HWND view) {
+    ChildCount c{view, "Edit", 0};
+    ::EnumChildWindows(view, CountChild, reinterpret_cast<LPARAM>(&c));
+    return c.count;
+}
+
+CRect RectInView(HWND control, HWND view) {
+    CRect rc;
+    ::GetWindowRect(control, &rc);
+    ::MapWindowPoints(nullptr, view, reinterpret_cast<POINT*>(&rc), 2);
+    return rc;
+}
+
+// ---- bench --------------------------------------------------------------------------------------------
+
+namespace {
+void RecordReport(const char* text) {
+    Reports().emplace_back(text ? text : "");
+}
+} // namespace
+
+std::vector<std::string>& Reports() {
+    static std::vector<std::string> reports;
+    return reports;
+}
+
+GridBench::GridBench(int clientWidth, int clientHeight) {
+    // A caught error must not wait in a message box.
+    AfxSetErrorReporter(&RecordReport);
+    Reports().clear();
+    InstallCountingHost();
+    Main().results.clear();
+    Frame() = FrameRecord{};
+    Paints() = PaintRecord{};
+    char temp[MAX_PATH];
+    ::GetTempPathA(MAX_PATH, temp);
+    m_settings = std::string(temp) + "orvex-grid-test.ini";
+    ::DeleteFileA(m_settings.c_str());
+    m_doc = std::make_unique<CTessel3Doc>(m_settings);
+    m_frame.CreateFrame(clientWidth, clientHeight);
+    Frame().frame = m_frame.m_hWnd;
+    Pump();
+}
+
+GridBench::~GridBench() {
+    m_frame.DestroyWindow(); // the view goes with it and deletes itself
+    Pump();
+    Frame().frame = nullptr;
+    m_doc.reset();
+    g_pTessel3Doc = nullptr;
+    ::DeleteFileA(m_settings.c_str());
+    DwgList.RemoveAll();
+    for (const std::string& report : Reports())
+        ADD_FAILURE() << "reported error: " << report;
+}

@@ -1,0 +1,91 @@
+// The test bench of the grid: a stand-in frame (a top-level window holding the grid view), the frame
+// requests recorded, a host that counts preview paints, the message pump of the modal loop, key presses.
+#pragma once
+
+#include "framework/afxwin.h"
+#include "settings/Tessel3Doc.h"
+#include "thumbs/DwgList.h"
+#include "thumbs/Tessel3View.h"
+
+#include <memory>
+#include <string>
+#include <vector>
+
+// What the grid asked of the frame (ThumbsGlue.h).
+struct FrameRecord {
+    int sortMode = 0;
+    bool pickEnabled = false;
+    int pickCalls = 0;
+    std::string title;
+    int statusUpdates = 0;
+    int treeFocusRequests = 0;
+    HWND frame = nullptr;
+};
+FrameRecord& Frame();
+
+// Preview paints the host was asked for.
+struct PaintRecord {
+    int count = 0;
+    std::vector<std::wstring> names;
+    std::vector<HWND> windows;
+    bool backgroundZero = true;
+};
+PaintRecord& Paints();
+void InstallCountingHost();
+
+// The application's main window: it receives the accept and cancel messages.
+class MainWindow : public CWnd {
+public:
+    std::vector<WPARAM> results;
+
+protected:
+    LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
+};
+MainWindow& Main();
+
+// A top-level frame whose client is the grid view.
+class TestFrame : public CWnd {
+public:
+    bool CreateFrame(int clientWidth, int clientHeight);
+    CTessel3View* view = nullptr;
+
+protected:
+    void OnSize(UINT type, int cx, int cy) override;
+};
+
+// Dispatches everything queued, offering each message to PreTranslateMessage first, as the explorer's
+// modal loop does.
+void Pump();
+// A key pressed on the window that has the focus: real input when the window is in the foreground,
+// otherwise the same messages posted to the focus window; then pumped.
+void PressKey(WORD vk);
+bool RealInputWorks();
+
+// Errors the framework caught and reported during a bench's life.
+std::vector<std::string>& Reports();
+
+// Fills the drawing list with count records named d00000.dwg...
+void FillList(int count);
+
+// Live thumbnail windows (and labels) that are children of the view.
+int LiveThumbnails(HWND view);
+int LiveLabels(HWND view);
+
+// A control's rectangle in the view's client coordinates.
+CRect RectInView(HWND control, HWND view);
+
+// The document, the frame and the view of one test.
+class GridBench {
+public:
+    explicit GridBench(int clientWidth = 700, int clientHeight = 600);
+    ~GridBench();
+    GridBench(const GridBench&) = delete;
+    GridBench& operator=(const GridBench&) = delete;
+    CTessel3View& view() { return *m_frame.view; }
+    TestFrame& frame() { return m_frame; }
+
+private:
+    std::string m_settings;
+    std::unique_ptr<CTessel3Doc> m_doc;
+    TestFrame m_frame;
+};

@@ -1,0 +1,338 @@
+// The grid view in real windows: layout, the ring of controls while scrolling through thousands of
+// drawings, the jumps of the keyboard and the scroll bar, cell sizes and alignment.
+#include "GridTestSupport.h"
+
+#include "res/resource.h"
+#include "thumbs/GridMath.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cstdio>
+
+namespace {
+
+class TestApp : public CWinApp {
+public:
+    TestApp() : CWinApp("ThumbsWinTests") {}
+};
+TestApp theApp;
+
+int RowPitch(CTessel3View& view) {
+    return view.GetPictureHeight() + CTessel3View::LabelHeight();
+}
+
+// The drawing shown at the top left is the first drawing of the first row, at the top of the client.
+void ExpectFirstRowAtTop(CTessel3View& view) {
+    exCDwgThumbnail* first = view.ControlOf(view.GetFirstRow() * view.GetColumns());
+    ASSERT_NE(first, nullptr) << "first row " << view.GetFirstRow();
+    EXPECT_EQ(RectInView(first->m_hWnd, view.m_hWnd).top, 0) << "first row " << view.GetFirstRow();
+}
+
+TEST(GridLayout, TenDrawingsInThreeColumns) {
+    GridBench bench(700, 600);
+    FillList(10);
+    bench.view().Rebuild();
+    Pump();
+    CTessel3View& view = bench.view();
+    EXPECT_EQ(view.GetColumns(), 3); // (700 + 5) / 178
+    EXPECT_EQ(view.GetRows(), 4);
+    EXPECT_EQ(view.GetVisibleRows(), 600 / RowPitch(view));
+    EXPECT_EQ(view.GetPoolRows(), view.GetVisibleRows() + 2);
+    EXPECT_EQ(view.GetPoolSize(), 3 * view.GetPoolRows());
+    EXPECT_EQ(LiveThumbnails(view.m_hWnd), 10);
+    EXPECT_EQ(LiveLabels(view.m_hWnd), 10);
+    // The last row holds one control, in the first column.
+    exCDwgThumbnail* last = view.ControlOf(9);
+    ASSERT_NE(last, nullptr);
+    CRect rc = RectInView(last->m_hWnd, view.m_hWnd);
+    EXPECT_EQ(rc.left, 0);
+    EXPECT_EQ(rc.top, 3 * RowPitch(view));
+    EXPECT_EQ(rc.Width(), 173);
+    EXPECT_EQ(rc.Height(), 143);
+    EXPECT_TRUE(last->GetStyle() & WS_BORDER);
+    exCDwgThumbnail* fifth = view.ControlOf(4);
+    ASSERT_NE(fifth, nullptr);
+    EXPECT_EQ(RectInView(fifth->m_hWnd, view.m_hWnd).left, 178);
+    EXPECT_EQ(RectInView(fifth->m_hWnd, view.m_hWnd).top, RowPitch(view));
+    // The label lies under the picture, inset by the edges.
+    CRect label = RectInView(fifth->Label().m_hWnd, view.m_hWnd);
+    const int cx = ::GetSystemMetrics(SM_CXEDGE), cy = ::GetSystemMetrics(SM_CYEDGE);
+    EXPECT_EQ(label.left, 178 + cx);
+    EXPECT_EQ(label.right, 178 + 173 - cx);
+    EXPECT_EQ(label.top, RowPitch(view) + 143 + cy);
+    EXPECT_EQ(label.bottom, RowPitch(view) + 143 + CTessel3View::LabelHeight() - cy);
+    EXPECT_EQ(fifth->Label().GetWindowText(), "d00004.dwg");
+    EXPECT_TRUE(fifth->Label().GetStyle() & ES_READONLY);
+    // The rebuild set the title to the folder and refreshed the status.
+    EXPECT_EQ(Frame().statusUpdates, 1);
+}
+
+TEST(GridLayout, ThumbnailsPaintThroughTheHostWithTheBareName) {
+    GridBench bench(700, 600);
+    FillList(4);
+    bench.view().Rebuild();
+    Paints() = PaintRecord{};
+    bench.view().RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW | RDW_ALLCHILDREN);
+    Pump();
+    EXPECT_GE(Paints().count, 4);
+    EXPECT_TRUE(Paints().backgroundZero);
+    for (int i = 0; i < 4; ++i) {
+        exCDwgThumbnail* control = bench.view().ControlOf(i);
+        ASSERT_NE(control, nullptr);
+        auto it = std::find(Paints().windows.begin(), Paints().windows.end(), control->m_hWnd);
+        ASSERT_NE(it, Paints().windows.end());
+        wchar_t expected[32];
+        swprintf(expected, 32, L"d%05d.dwg", i);
+        EXPECT_EQ(Paints().names[static_cast<size_t>(it - Paints().windows.begin())], expected);
+    }
+}
+
+TEST(GridLayout, EmptyListHasNoControls) {
+    GridBench bench(700, 600);
+    FillList(0);
+    bench.view().Rebuild();
+    EXPECT_EQ(bench.view().GetRows(), 0);
+    EXPECT_EQ(bench.view().GetPoolRows(), 0);
+    EXPECT_EQ(LiveThumbnails(bench.view().m_hWnd), 0);
+}
+
+TEST(GridScroll, DownArrowThroughThreeThousandDrawingsKeepsTheRing) {
+    GridBench bench(700, 600);
+    FillList(3000);
+    CTessel3View& view = bench.view();
+    view.Rebuild();
+    Pump();
+    const int columns = view.GetColumns();
+    const int rows = view.GetRows();
+    ASSERT_EQ(rows, (3000 + columns - 1) / columns);
+    ASSERT_GT(rows * RowPitch(view), grid::kScrollCap); // the capped range must wrap round
+    const int limit = columns * (view.GetVisibleRows() + 2);
+    int wraps = 0;
+    int lastY = 0;
+    int steps = 0;
+    while (view.GetFirstRow() + view.GetVisibleRows() < rows && steps < rows + 5) {
+        const int before = view.GetFirstRow();
+        view.SetFocus();
+        PressKey(VK_DOWN);
+        ++steps;
+        ASSERT_EQ(view.GetFirstRow(), before + 1) << "step " << steps;
+        ASSERT_LE(LiveThumbnails(view.m_hWnd), limit) << "step " << steps;
+        ASSERT_LE(LiveLabels(view.m_hWnd), limit) << "step " << steps;
+        const int y = view.GetScrollPosition().y;
+        if (y < lastY)
+            ++wraps;
+        lastY = y;
+        if (steps % 97 == 0)
+            ExpectFirstRowAtTop(view);
+    }
+    EXPECT_EQ(view.GetFirstRow(), rows - view.GetVisibleRows());
+    EXPECT_GE(wraps, 1);
+    ExpectFirstRowAtTop(view);
+    // The very last drawing is on screen.
+    exCDwgThumbnail* last = view.ControlOf(2999);
+    ASSERT_NE(last, nullptr);
+    CRect client = view.GetClientRect();
+    CRect rc = RectInView(last->m_hWnd, view.m_hWnd);
+    EXPECT_GE(rc.top, 0);
+    EXPECT_LE(rc.bottom, client.bottom);
+    // No further step at the bottom.
+    PressKey(VK_DOWN);
+    EXPECT_EQ(view.GetFirstRow(), rows - view.GetVisibleRows());
+    // And back up a few rows, the contents following.
+    for (int i = 0; i < 5; ++i)
+        PressKey(VK_UP);
+    EXPECT_EQ(view.GetFirstRow(), rows - view.GetVisibleRows() - 5);
+    EXPECT_LE(LiveThumbnails(view.m_hWnd), limit);
+    ExpectFirstRowAtTop(view);
+    std::printf("key presses: %s\n", RealInputWorks() ? "real input (SendInput)" : "posted messages");
+}
+
+TEST(GridScroll, EndHomePageDownPageUp) {
+    GridBench bench(700, 600);
+    FillList(900); // 300 rows: beyond the capped range
+    CTessel3View& view = bench.view();
+    view.Rebuild();
+    Pump();
+    const int rows = view.GetRows();
+    const int visible = view.GetVisibleRows();
+    const int limit = view.GetColumns() * (visible + 2);
+
+    PressKey(VK_END);
+    EXPECT_EQ(view.GetFirstRow(), rows - visible);
+    EXPECT_NE(view.ControlOf(899), nullptr);
+    EXPECT_LE(LiveThumbnails(view.m_hWnd), limit);
+    ExpectFirstRowAtTop(view);
+
+    PressKey(VK_HOME);
+    EXPECT_EQ(view.GetFirstRow(), 0);
+    EXPECT_EQ(view.GetScrollPosition().y, 0);
+    ExpectFirstRowAtTop(view);
+
+    PressKey(VK_NEXT);
+    EXPECT_EQ(view.GetFirstRow(), visible);
+    ExpectFirstRowAtTop(view);
+    // Less than a page below the top: Page Up goes to the very top.
+    const int half = std::max(1, visible / 2);
+    for (int i = 0; i < half; ++i)
+        PressKey(VK_DOWN);
+    EXPECT_EQ(view.GetFirstRow(), visible + half);
+    PressKey(VK_PRIOR);
+    EXPECT_EQ(view.GetFirstRow(), half < visible ? 0 : half);
+
+    // Page Down all the way reaches the last row and stops there.
+    for (int i = 0; i < rows; ++i) {
+        PressKey(VK_NEXT);
+        if (view.GetFirstRow() == rows - visible)
+            break;
+    }
+    EXPECT_EQ(view.GetFirstRow(), rows - visible);
+    PressKey(VK_NEXT);
+    EXPECT_EQ(view.GetFirstRow(), rows - visible);
+    EXPECT_NE(view.ControlOf(899), nullptr);
+    EXPECT_LE(LiveThumbnails(view.m_hWnd), limit);
+    ExpectFirstRowAtTop(view);
+}
+
+TEST(GridScroll, ScrollBarAndWheelStepOneRow) {
+    GridBench bench(700, 600);
+    FillList(300);
+    CTessel3View& view = bench.view();
+    view.Rebuild();
+    Pump();
+    const int rows = view.GetRows();
+    const int visible = view.GetVisibleRows();
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_LINEDOWN, 0), 0);
+    EXPECT_EQ(view.GetFirstRow(), 1);
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_PAGEDOWN, 0), 0);
+    EXPECT_EQ(view.GetFirstRow(), 2);
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_PAGEUP, 0), 0);
+    EXPECT_EQ(view.GetFirstRow(), 1);
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_LINEUP, 0), 0);
+    EXPECT_EQ(view.GetFirstRow(), 0);
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_LINEUP, 0), 0);
+    EXPECT_EQ(view.GetFirstRow(), 0);
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_THUMBPOSITION, 500), 0);
+    EXPECT_EQ(view.GetFirstRow(), 0);
+    CRect rc = view.GetWindowRect();
+    view.SendMessage(WM_MOUSEWHEEL, MAKEWPARAM(0, static_cast<WORD>(-WHEEL_DELTA)),
+                     MAKELPARAM(rc.left + 5, rc.top + 5));
+    EXPECT_EQ(view.GetFirstRow(), 1);
+    // The scroll bar alone reaches the last row.
+    for (int i = 0; i < rows; ++i)
+        view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_LINEDOWN, 0), 0);
+    EXPECT_EQ(view.GetFirstRow(), rows - visible);
+    EXPECT_NE(view.ControlOf(299), nullptr);
+    ExpectFirstRowAtTop(view);
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_TOP, 0), 0);
+    EXPECT_EQ(view.GetFirstRow(), 0);
+    ExpectFirstRowAtTop(view);
+}
+
+TEST(GridSize, IncreaseDecreaseAndTheirLimits) {
+    GridBench bench(700, 600);
+    FillList(50);
+    CTessel3View& view = bench.view();
+    view.Rebuild();
+    view.SendMessage(WM_COMMAND, ID_VIEW_INCREASE);
+    EXPECT_EQ(view.GetPictureHeight(), 179);
+    EXPECT_EQ(view.GetPictureWidth(), 216);
+    EXPECT_EQ(view.GetColumns(), (view.GetClientRect().right + 5) / (216 + 5));
+    exCDwgThumbnail* first = view.ControlOf(0);
+    ASSERT_NE(first, nullptr);
+    EXPECT_EQ(first->GetClientRect().Height() + 2, 179); // one-pixel border
+    view.SendMessage(WM_COMMAND, ID_VIEW_DECREASE);
+    EXPECT_EQ(view.GetPictureHeight(), 143);
+    EXPECT_EQ(view.GetPictureWidth(), 173);
+    // Down to the smallest size, then no further.
+    for (int i = 0; i < 20; ++i)
+        view.Decrease();
+    EXPECT_LT(std::min(view.GetPictureHeight(), view.GetPictureWidth()), grid::kMinCellSize);
+    const int h = view.GetPictureHeight(), w = view.GetPictureWidth();
+    view.Decrease();
+    EXPECT_EQ(view.GetPictureHeight(), h);
+    EXPECT_EQ(view.GetPictureWidth(), w);
+    EXPECT_LE(LiveThumbnails(view.m_hWnd), view.GetColumns() * (view.GetVisibleRows() + 2));
+    // Up until the picture would no longer fit the client height.
+    for (int i = 0; i < 40; ++i)
+        view.Increase();
+    EXPECT_LT(view.GetPictureHeight(), view.GetClientRect().Height());
+    EXPECT_GE(view.GetPictureHeight() * 5 / 4, view.GetClientRect().Height());
+}
+
+TEST(GridSize, AlignFitsTheFrameToWholeColumnsAndRows) {
+    GridBench bench(731, 611);
+    FillList(200);
+    CTessel3View& view = bench.view();
+    view.Rebuild();
+    Pump();
+    view.SendMessage(WM_COMMAND, ID_VIEW_ALIGNE);
+    Pump();
+    const CRect client = view.GetClientRect();
+    const int pitch = 173 + 5;
+    EXPECT_EQ((client.right + 5) % pitch, 0) << client.right;
+    EXPECT_EQ(client.bottom % RowPitch(view), 0) << client.bottom;
+    EXPECT_EQ(view.GetColumns(), (client.right + 5) / pitch);
+}
+
+TEST(GridKeys, EscapeCancelsTabGoesToTheTree) {
+    GridBench bench(700, 600);
+    FillList(20);
+    bench.view().Rebuild();
+    Pump();
+    bench.view().SetFocus();
+    PressKey(VK_TAB);
+    EXPECT_EQ(Frame().treeFocusRequests, 1);
+    bench.view().SetFocus();
+    PressKey(VK_ESCAPE);
+    Pump();
+    ASSERT_EQ(Main().results.size(), 1u);
+    EXPECT_EQ(Main().results[0], 2u);
+}
+
+TEST(GridKeys, KeysOnAThumbnailReachTheGrid) {
+    GridBench bench(700, 600);
+    FillList(300);
+    bench.view().Rebuild();
+    Pump();
+    exCDwgThumbnail* control = bench.view().ControlOf(1);
+    ASSERT_NE(control, nullptr);
+    control->SetFocus();
+    ::PostMessageA(control->m_hWnd, WM_KEYDOWN, VK_DOWN, 1);
+    Pump();
+    EXPECT_EQ(bench.view().GetFirstRow(), 1);
+    EXPECT_EQ(::GetFocus(), bench.view().m_hWnd);
+}
+
+TEST(GridSelection, SelectAllMarksEveryRecord) {
+    GridBench bench(700, 600);
+    FillList(40);
+    bench.view().Rebuild();
+    bench.view().SendMessage(WM_COMMAND, ID_SELECT_ALL);
+    for (int i = 0; i < DwgList.GetSize(); ++i)
+        EXPECT_TRUE(DwgList[i].IsSelected());
+    bench.view().DeselectAll();
+    EXPECT_FALSE(AnySelected());
+}
+
+TEST(GridSort, RebuildSortsByTheFrameModeKeepingTheLastRecord) {
+    GridBench bench(700, 600);
+    BeginScan();
+    const char* names[] = {"c.dwg", "a.dwg", "d.dwg", "b.dwg"};
+    for (int i = 0; i < 4; ++i) {
+        DwgFindEntry e;
+        e.name = names[i];
+        e.size = static_cast<std::uint32_t>(10 - i);
+        AppendScanEntry(e);
+    }
+    EndScan();
+    Frame().sortMode = 0;
+    bench.view().Rebuild();
+    EXPECT_EQ(DwgList[0].m_strName, "a.dwg");
+    EXPECT_EQ(DwgList[1].m_strName, "c.dwg");
+    EXPECT_EQ(DwgList[2].m_strName, "d.dwg");
+    EXPECT_EQ(DwgList[3].m_strName, "b.dwg");
+    EXPECT_EQ(bench.view().ControlOf(0)->Label().GetWindowText(), "a.dwg");
+}
+
+} // namespace

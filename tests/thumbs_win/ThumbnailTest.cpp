@@ -1,0 +1,354 @@
+// The thumbnail control in real windows: clicks and their selection flags, the pick, the tooltip, the
+// context menu, rename in the label, and the search of the frame's search edit.
+#include "GridTestSupport.h"
+
+#include "res/resource.h"
+#include "thumbs/ThumbSearch.h"
+
+#include <gtest/gtest.h>
+
+#include <ctime>
+
+namespace {
+
+std::string CurrentDir() {
+    char buffer[MAX_PATH] = {};
+    DWORD n = ::GetCurrentDirectoryA(MAX_PATH, buffer);
+    return std::string(buffer, n);
+}
+
+void Click(exCDwgThumbnail* control, WPARAM flags, UINT message = WM_LBUTTONDOWN) {
+    ASSERT_NE(control, nullptr);
+    ::PostMessageA(control->m_hWnd, message, flags, MAKELPARAM(10, 10));
+    if (message == WM_LBUTTONDOWN)
+        ::PostMessageA(control->m_hWnd, WM_LBUTTONUP, flags & ~static_cast<WPARAM>(MK_LBUTTON),
+                       MAKELPARAM(10, 10));
+    Pump();
+}
+
+bool LabelHighlighted(exCDwgThumbnail* control) {
+    int start = 0, end = 0;
+    control->Label().GetSel(start, end);
+    return start == 0 && end == control->Label().GetWindowTextLength() && end > 0;
+}
+
+TEST(ThumbnailClick, PlainClickSelectsOnlyThisOne) {
+    GridBench bench;
+    FillList(12);
+    bench.view().Rebuild();
+    Pump();
+    DwgList[3].Select();
+    DwgList[7].Select();
+    exCDwgThumbnail* control = bench.view().ControlOf(5);
+    Click(control, MK_LBUTTON);
+    for (int i = 0; i < 12; ++i)
+        EXPECT_EQ(DwgList[i].IsSelected(), i == 5) << i;
+    EXPECT_TRUE(LabelHighlighted(control));
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "d00005.dwg");
+    EXPECT_EQ(Frame().title, CurrentDir() + "\\d00005.dwg");
+    EXPECT_TRUE(Frame().pickEnabled);
+}
+
+TEST(ThumbnailClick, CtrlClickTogglesOnlyThisOne) {
+    GridBench bench;
+    FillList(12);
+    bench.view().Rebuild();
+    Pump();
+    Click(bench.view().ControlOf(1), MK_LBUTTON);
+    Click(bench.view().ControlOf(2), MK_LBUTTON | MK_CONTROL);
+    EXPECT_TRUE(DwgList[1].IsSelected());
+    EXPECT_TRUE(DwgList[2].IsSelected());
+    EXPECT_TRUE(LabelHighlighted(bench.view().ControlOf(2)));
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "d00002.dwg");
+    // Ctrl+click on a selected one deselects only it.
+    Click(bench.view().ControlOf(1), MK_LBUTTON | MK_CONTROL);
+    EXPECT_FALSE(DwgList[1].IsSelected());
+    EXPECT_TRUE(DwgList[2].IsSelected());
+    EXPECT_FALSE(LabelHighlighted(bench.view().ControlOf(1)));
+    EXPECT_FALSE(Frame().pickEnabled);
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "");
+    EXPECT_EQ(Frame().title, CurrentDir());
+    EXPECT_EQ(::GetFocus(), bench.view().ControlOf(1)->m_hWnd);
+}
+
+TEST(ThumbnailClick, ShiftClickDoesNothing) {
+    GridBench bench;
+    FillList(6);
+    bench.view().Rebuild();
+    Pump();
+    Click(bench.view().ControlOf(0), MK_LBUTTON);
+    const int pickCalls = Frame().pickCalls;
+    Click(bench.view().ControlOf(3), MK_LBUTTON | MK_SHIFT);
+    EXPECT_TRUE(DwgList[0].IsSelected());
+    EXPECT_FALSE(DwgList[3].IsSelected());
+    EXPECT_EQ(Frame().pickCalls, pickCalls);
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "d00000.dwg");
+}
+
+TEST(ThumbnailClick, DoubleClickPicksTheDrawing) {
+    GridBench bench;
+    FillList(6);
+    bench.view().Rebuild();
+    Pump();
+    Click(bench.view().ControlOf(4), MK_LBUTTON, WM_LBUTTONDBLCLK);
+    ASSERT_EQ(Main().results.size(), 1u);
+    EXPECT_EQ(Main().results[0], 1u);
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "d00004.dwg");
+    std::string folder = CurrentDir();
+    if (folder.back() != '\\')
+        folder += '\\';
+    EXPECT_EQ(g_pTessel3Doc->m_strPath, folder);
+}
+
+TEST(ThumbnailClick, RightClickSelectsWithoutClearingOthers) {
+    GridBench bench;
+    FillList(6);
+    bench.view().Rebuild();
+    Pump();
+    DwgList[0].Select();
+    exCDwgThumbnail* control = bench.view().ControlOf(2);
+    // The context menu waits for the user: a timer keeps dismissing it until it is gone.
+    struct Dismiss {
+        static void CALLBACK Tick(HWND, UINT, UINT_PTR, DWORD) { ::EndMenu(); }
+    };
+    const UINT_PTR timer = ::SetTimer(nullptr, 0, 100, &Dismiss::Tick);
+    Click(control, MK_RBUTTON, WM_RBUTTONDOWN);
+    ::KillTimer(nullptr, timer);
+    EXPECT_TRUE(DwgList[0].IsSelected());
+    EXPECT_TRUE(DwgList[2].IsSelected());
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "d00002.dwg");
+}
+
+TEST(ThumbnailMenu, PasteGreyedWithoutFilesAndSortModeChecked) {
+    GridBench bench;
+    if (::OpenClipboard(nullptr)) {
+        ::EmptyClipboard();
+        ::CloseClipboard();
+    }
+    Frame().sortMode = 1;
+    CMenu menu;
+    CMenu popup = BuildThumbnailMenu(menu);
+    ASSERT_NE(popup.m_hMenu, nullptr);
+    EXPECT_TRUE(popup.GetMenuState(ID_THUMB_PASTE, MF_BYCOMMAND) & MF_GRAYED);
+    EXPECT_FALSE(popup.GetMenuState(ID_THUMB_COPY, MF_BYCOMMAND) & MF_GRAYED);
+    EXPECT_TRUE(popup.GetMenuState(ID_SORT_DATE, MF_BYCOMMAND) & MF_CHECKED);
+    EXPECT_FALSE(popup.GetMenuState(ID_SORT_NAME, MF_BYCOMMAND) & MF_CHECKED);
+    EXPECT_FALSE(popup.GetMenuState(ID_SORT_SIZE, MF_BYCOMMAND) & MF_CHECKED);
+}
+
+TEST(ThumbnailTooltip, NameSizeAndLocalDateInOneNarrowTip) {
+    GridBench bench;
+    std::tm local{};
+    local.tm_year = 2021 - 1900;
+    local.tm_mon = 2;
+    local.tm_mday = 5;
+    local.tm_hour = 14;
+    local.tm_min = 7;
+    local.tm_sec = 9;
+    local.tm_isdst = -1;
+    const __time64_t when = _mktime64(&local);
+    BeginScan();
+    DwgFindEntry e;
+    e.name = "a.dwg";
+    e.size = 1234;
+    e.timeWrite = when;
+    AppendScanEntry(e);
+    EndScan();
+    bench.view().Rebuild();
+    Pump();
+    exCDwgThumbnail* control = bench.view().ControlOf(0);
+    ASSERT_NE(control, nullptr);
+    const std::string expected = "a.dwg               Size=1234          05/03/2021;14.07.09";
+    EXPECT_EQ(control->ToolTipText(), expected);
+
+    CToolTipCtrl& tip = control->ToolTip();
+    ASSERT_NE(tip.m_hWnd, nullptr);
+    EXPECT_EQ(tip.GetToolCount(), 1);
+    EXPECT_EQ(tip.SendMessage(TTM_GETMAXTIPWIDTH), 19);
+    char text[256] = {};
+    TTTOOLINFOA ti{};
+    ti.cbSize = TTTOOLINFOA_V2_SIZE;
+    ti.hwnd = control->m_hWnd;
+    ti.uId = reinterpret_cast<UINT_PTR>(control->m_hWnd);
+    ti.lpszText = text;
+    tip.SendMessage(TTM_GETTEXTA, sizeof text, reinterpret_cast<LPARAM>(&ti));
+    EXPECT_EQ(std::string(text), expected);
+}
+
+// ---- rename -------------------------------------------------------------------------------------------
+
+class TempFolder {
+public:
+    TempFolder() {
+        char base[MAX_PATH];
+        ::GetTempPathA(MAX_PATH, base);
+        m_path = std::string(base) + "orvex-rename-" + std::to_string(::GetCurrentProcessId());
+        ::CreateDirectoryA(m_path.c_str(), nullptr);
+    }
+    ~TempFolder() {
+        char base[MAX_PATH];
+        ::GetTempPathA(MAX_PATH, base);
+        ::SetCurrentDirectoryA(base);
+        WIN32_FIND_DATAA fd;
+        HANDLE h = ::FindFirstFileA((m_path + "\\*").c_str(), &fd);
+        if (h != INVALID_HANDLE_VALUE) {
+            do {
+                ::DeleteFileA((m_path + "\\" + fd.cFileName).c_str());
+            } while (::FindNextFileA(h, &fd));
+            ::FindClose(h);
+        }
+        ::RemoveDirectoryA(m_path.c_str());
+    }
+    TempFolder(const TempFolder&) = delete;
+    TempFolder& operator=(const TempFolder&) = delete;
+    void File(const std::string& name) {
+        HANDLE h = ::CreateFileA((m_path + "\\" + name).c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS,
+                                 FILE_ATTRIBUTE_NORMAL, nullptr);
+        ::CloseHandle(h);
+    }
+    bool Exists(const std::string& name) const {
+        return ::GetFileAttributesA((m_path + "\\" + name).c_str()) != INVALID_FILE_ATTRIBUTES;
+    }
+    const std::string& path() const { return m_path; }
+
+private:
+    std::string m_path;
+};
+
+class RenameTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        m_folder.File("a.dwg");
+        m_folder.File("b.dwg");
+        ASSERT_EQ(ScanFolderPath(m_folder.path().c_str(), ".dwg"), 1);
+        g_pTessel3Doc->m_strPath = m_folder.path();
+        Frame().sortMode = 0;
+        m_bench.view().Rebuild();
+        Pump();
+    }
+    CThumbLabel& LabelOf(const std::string& name) {
+        for (int i = 0; i < DwgList.GetSize(); ++i) {
+            if (DwgList[i].m_strName == name)
+                return m_bench.view().ControlOf(i)->Label();
+        }
+        throw std::runtime_error("no such drawing");
+    }
+    void Type(CThumbLabel& label, const std::string& text) {
+        ::PostMessageA(label.m_hWnd, WM_KEYDOWN, VK_END, 1);
+        for (char c : text)
+            ::PostMessageA(label.m_hWnd, WM_CHAR, static_cast<WPARAM>(static_cast<unsigned char>(c)), 1);
+        Pump();
+    }
+    void Key(CThumbLabel& label, WPARAM vk) {
+        ::PostMessageA(label.m_hWnd, WM_KEYDOWN, vk, 1);
+        Pump();
+    }
+
+    GridBench m_bench;
+    TempFolder m_folder;
+};
+
+TEST_F(RenameTest, DoubleClickOnTheLabelBeginsEnterCommits) {
+    CThumbLabel& label = LabelOf("a.dwg");
+    ::PostMessageA(label.m_hWnd, WM_LBUTTONDBLCLK, MK_LBUTTON, MAKELPARAM(5, 5));
+    Pump();
+    EXPECT_TRUE(label.IsRenaming());
+    EXPECT_FALSE(label.GetStyle() & ES_READONLY);
+    EXPECT_EQ(::GetFocus(), label.m_hWnd);
+    Type(label, "x");
+    EXPECT_EQ(label.GetWindowText(), "a.dwgx");
+    label.SetWindowText("c.dwg");
+    Key(label, VK_RETURN);
+    EXPECT_FALSE(m_folder.Exists("a.dwg"));
+    EXPECT_TRUE(m_folder.Exists("c.dwg"));
+    // The folder was scanned again and the grid rebuilt.
+    ASSERT_EQ(DwgList.GetSize(), 2);
+    EXPECT_EQ(DwgList[0].m_strName == "c.dwg" || DwgList[1].m_strName == "c.dwg", true);
+    EXPECT_NO_THROW(LabelOf("c.dwg"));
+}
+
+TEST_F(RenameTest, EscapeRestoresTheOldName) {
+    CThumbLabel& label = LabelOf("a.dwg");
+    label.BeginRename();
+    Type(label, "zzz");
+    Key(label, VK_ESCAPE);
+    EXPECT_FALSE(label.IsRenaming());
+    EXPECT_EQ(label.GetWindowText(), "a.dwg");
+    EXPECT_TRUE(m_folder.Exists("a.dwg"));
+    Pump();
+    EXPECT_TRUE(Main().results.empty()); // Escape in the label does not cancel the explorer
+}
+
+TEST_F(RenameTest, LeavingTheLabelAbandonsTheRename) {
+    CThumbLabel& label = LabelOf("a.dwg");
+    label.BeginRename();
+    Type(label, "zzz");
+    m_bench.view().SetFocus();
+    Pump();
+    EXPECT_FALSE(label.IsRenaming());
+    EXPECT_EQ(label.GetWindowText(), "a.dwg");
+    EXPECT_TRUE(label.GetStyle() & ES_READONLY);
+    EXPECT_TRUE(m_folder.Exists("a.dwg"));
+}
+
+TEST_F(RenameTest, FailedRenameRestoresTheOldName) {
+    CThumbLabel& label = LabelOf("a.dwg");
+    label.BeginRename();
+    label.SetWindowText("b.dwg"); // exists already
+    Key(label, VK_RETURN);
+    EXPECT_EQ(label.GetWindowText(), "a.dwg");
+    EXPECT_TRUE(m_folder.Exists("a.dwg"));
+    EXPECT_TRUE(label.GetStyle() & ES_READONLY);
+}
+
+// ---- search -------------------------------------------------------------------------------------------
+
+TEST(Search, FindsThePrefixSelectsShowsAndKeepsTheFocus) {
+    GridBench bench(700, 600);
+    FillList(3000);
+    bench.view().Rebuild();
+    Pump();
+    CEdit edit;
+    ASSERT_TRUE(edit.Create(WS_CHILD | WS_VISIBLE, CRect(0, 0, 100, 20), &bench.frame(), 1));
+    edit.SetFocus();
+    DwgList[0].Select();
+    DwgList[10].Select();
+    RunSearch("D02500");
+    EXPECT_TRUE(DwgList[2500].IsSelected());
+    EXPECT_FALSE(DwgList[0].IsSelected());
+    EXPECT_FALSE(DwgList[10].IsSelected());
+    exCDwgThumbnail* control = bench.view().ControlOf(2500);
+    ASSERT_NE(control, nullptr);
+    EXPECT_TRUE(LabelHighlighted(control));
+    EXPECT_EQ(bench.view().GetFirstRow(), 2500 / bench.view().GetColumns());
+    EXPECT_EQ(::GetFocus(), edit.m_hWnd);
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "d02500.dwg");
+    EXPECT_EQ(Frame().title, CurrentDir() + "\\d02500.dwg");
+    EXPECT_TRUE(Frame().pickEnabled);
+
+    // No match: record 0 becomes the current drawing, nothing selected.
+    RunSearch("zz");
+    EXPECT_FALSE(AnySelected());
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "d00000.dwg");
+    // A name exactly as long as the text never matches.
+    RunSearch("d00007.dwg");
+    EXPECT_FALSE(DwgList[7].IsSelected());
+    edit.DestroyWindow();
+}
+
+TEST(Search, EmptyTextOrListChangesNothing) {
+    GridBench bench(700, 600);
+    FillList(5);
+    bench.view().Rebuild();
+    DwgList[3].Select();
+    g_pTessel3Doc->m_strName = "keep";
+    RunSearch("");
+    EXPECT_TRUE(DwgList[3].IsSelected());
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "keep");
+    FillList(0);
+    bench.view().Rebuild();
+    RunSearch("d");
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "keep");
+}
+
+} // namespace
