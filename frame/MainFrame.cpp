@@ -2,7 +2,7 @@
 
 #include "frame/AboutDlgArx.h"
 #include "frame/GridLink.h"
-#include "frame/LeftPaneView.h"
+#include "frame/FolderPaneLink.h"
 #include "settings/IniFile.h"
 #include "settings/Tessel3Doc.h"
 #include "host/Orvex.h"
@@ -185,11 +185,8 @@ bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {
     if (!m_wndSplitter.CreateStatic(this, 1, 2))
         return false;
     const int leftWidth = g_pTessel3Doc ? g_pTessel3Doc->m_nSplitterSize : 100;
-    if (!m_wndSplitter.CreateView(
-            0, 0, [] { return static_cast<CView*>(new CLeftPaneView); }, CSize(leftWidth, 0), context))
-        return false;
-    return m_wndSplitter.CreateView(
-        0, 1, [] { return NewGridView(); }, CSize(0, 0), context);
+    return m_wndSplitter.CreateView(0, 0, &NewFolderPaneView, CSize(leftWidth, 0), context) &&
+           m_wndSplitter.CreateView(0, 1, &NewGridView, CSize(0, 0), context);
 }
 
 void CMainFrame::OnDestroy() {

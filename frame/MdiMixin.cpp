@@ -1,5 +1,6 @@
 #include "frame/MdiMixin.h"
 
+#include "frame/FolderPaneLink.h"
 #include "frame/GridLink.h"
 #include "frame/MainFrame.h"
 #include "host/HostApi.h"
@@ -90,8 +91,9 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog) {
     // 5. The posted accept and cancel messages go to the dialog.
     m_pMainWnd = dialog;
     frame->InitialUpdateFrame(doc, false);
-    // Until the folder tree picks the folder, the grid shows the start folder.
-    ShowStartFolder(*frame, *doc);
+    // Without the folder tree to pick it, the grid shows the start folder.
+    if (!HasFolderTree())
+        ShowStartFolder(*frame, *doc);
 
     // 6. Placement from the dialog's rectangle and the stored size.
     const CRect rcDialog = dialog->GetWindowRect();
@@ -104,7 +106,8 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog) {
         frame->ShowWindow(SW_SHOWNORMAL);
     }
 
-    // 7. The folder tree re-selects its item here once the left pane holds it.
+    // 7. The folder tree shows its current folder again and takes the focus.
+    ReselectFolderTree();
 
     // 8. Nothing is chosen yet.
     frame->UpdateWindow();
