@@ -117,7 +117,10 @@ void Pump() {
 
 namespace {
 
-bool g_realInput = true;
+int g_realKeys = 0;
+int g_postedKeys = 0;
+// Set once a real key got lost (another program took the foreground): post from then on.
+bool g_realLost = false;
 
 bool SendRealKey(WORD vk) {
     INPUT in[2] = {};
@@ -139,15 +142,22 @@ bool SendRealKey(WORD vk) {
 
 } // namespace
 
-bool RealInputWorks() {
-    return g_realInput;
+std::string KeyPressSummary() {
+    return std::to_string(g_realKeys) + " key presses through the input queue (SendInput), " +
+           std::to_string(g_postedKeys) + " posted to the focus window";
 }
 
 void PressKey(WORD vk) {
+    // Real input only while one of our windows is in the foreground: the Wine server may be shared with
+    // other programs, whose windows must not receive our keys.
     HWND focus = ::GetFocus();
     const bool foreground = focus && ::GetForegroundWindow() == ::GetAncestor(focus, GA_ROOT);
-    if (!(g_realInput && foreground && SendRealKey(vk))) {
-        g_realInput = false;
+    if (foreground && !g_realLost && SendRealKey(vk)) {
+        ++g_realKeys;
+    } else {
+        if (foreground && !g_realLost)
+            g_realLost = true;
+        ++g_postedKeys;
         ::PostMessageA(focus, WM_KEYDOWN, vk, 1);
         ::PostMessageA(focus, WM_KEYUP, vk, static_cast<LPARAM>(0xC0000001));
     }

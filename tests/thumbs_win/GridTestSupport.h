@@ -59,7 +59,8 @@ void Pump();
 // A key pressed on the window that has the focus: real input when the window is in the foreground,
 // otherwise the same messages posted to the focus window; then pumped.
 void PressKey(WORD vk);
-bool RealInputWorks();
+// How many key presses went which way so far.
+std::string KeyPressSummary();
 
 // Errors the framework caught and reported during a bench's life.
 std::vector<std::string>& Reports();

@@ -98,7 +98,7 @@ TEST(GridLayout, EmptyListHasNoControls) {
 }
 
 TEST(GridScroll, DownArrowThroughThreeThousandDrawingsKeepsTheRing) {
-    GridBench bench(700, 600);
+    GridBench bench(1000, 600); // 5 columns, 600 rows
     FillList(3000);
     CTessel3View& view = bench.view();
     view.Rebuild();
@@ -145,7 +145,7 @@ TEST(GridScroll, DownArrowThroughThreeThousandDrawingsKeepsTheRing) {
     EXPECT_EQ(view.GetFirstRow(), rows - view.GetVisibleRows() - 5);
     EXPECT_LE(LiveThumbnails(view.m_hWnd), limit);
     ExpectFirstRowAtTop(view);
-    std::printf("key presses: %s\n", RealInputWorks() ? "real input (SendInput)" : "posted messages");
+    std::printf("%s\n", KeyPressSummary().c_str());
 }
 
 TEST(GridScroll, EndHomePageDownPageUp) {
