@@ -311,6 +311,16 @@ void exCDwgThumbnail::Pick() {
 bool exCDwgThumbnail::PreTranslateMessage(MSG* pMsg) {
     if (!m_hWnd)
         return false;
+    // Called from message loops, outside any window procedure: nothing may escape from here.
+    try {
+        return TranslateInput(pMsg);
+    } catch (...) {
+        AfxReportCurrentException();
+        return true;
+    }
+}
+
+bool exCDwgThumbnail::TranslateInput(MSG* pMsg) {
     switch (pMsg->message) {
     case WM_MOUSEMOVE:
     case WM_LBUTTONUP:

@@ -78,6 +78,8 @@ protected:
 private:
     friend class CThumbLabel;
     bool CreateLabel(const std::string& name, CWnd* parentView, const RECT& cell);
+    // The mouse and key table of PreTranslateMessage; true when the message was consumed.
+    bool TranslateInput(MSG* pMsg);
     // Marks this drawing selected and current; clearOthers first drops every other selection.
     void SelectThis(bool clearOthers);
     void ToggleSelection();

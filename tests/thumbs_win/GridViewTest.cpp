@@ -32,9 +32,11 @@ void ExpectFirstRowAtTop(CTessel3View& view) {
 TEST(GridLayout, TenDrawingsInThreeColumns) {
     GridBench bench(700, 600);
     FillList(10);
+    g_pTessel3Doc->m_strPath = "C:\\drawings";
     bench.view().Rebuild();
     Pump();
     CTessel3View& view = bench.view();
+    EXPECT_EQ(Frame().title, "C:\\drawings");
     EXPECT_EQ(view.GetColumns(), 3); // (700 + 5) / 178
     EXPECT_EQ(view.GetRows(), 4);
     EXPECT_EQ(view.GetVisibleRows(), 600 / RowPitch(view));

@@ -352,3 +352,23 @@ TEST(Search, EmptyTextOrListChangesNothing) {
 }
 
 } // namespace
+
+namespace {
+
+TEST(ThumbnailErrors, AnIndexOutsideTheListIsReportedNotPassedOn) {
+    GridBench bench;
+    FillList(5);
+    bench.view().Rebuild();
+    Pump();
+    exCDwgThumbnail* control = bench.view().ControlOf(3);
+    ASSERT_NE(control, nullptr);
+    DwgList.RemoveAll(); // the list changed without a rebuild
+    Click(control, MK_LBUTTON);
+    Click(control, MK_LBUTTON, WM_LBUTTONDBLCLK);
+    ASSERT_EQ(Reports().size(), 2u);
+    EXPECT_EQ(Reports()[0], "Invalid argument.");
+    EXPECT_TRUE(Main().results.empty());
+    Reports().clear();
+}
+
+} // namespace
