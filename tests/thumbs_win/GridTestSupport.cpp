@@ -105,6 +105,11 @@ void TestFrame::OnSize(UINT type, int cx, int cy) {
         view->MoveWindow(0, 0, cx, cy);
 }
 
+bool TestFrame::OnCmdMsg(UINT id, int code) {
+    commands.push_back(id);
+    return true;
+}
+
 void Pump() {
     MSG msg;
     while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {

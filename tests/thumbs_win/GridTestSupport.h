@@ -48,9 +48,11 @@ class TestFrame : public CWnd {
 public:
     bool CreateFrame(int clientWidth, int clientHeight);
     CTessel3View* view = nullptr;
+    std::vector<UINT> commands; // menu commands that reached the frame
 
 protected:
     void OnSize(UINT type, int cx, int cy) override;
+    bool OnCmdMsg(UINT id, int code) override;
 };
 
 // Dispatches everything queued, offering each message to PreTranslateMessage first, as the explorer's

@@ -372,3 +372,56 @@ TEST(ThumbnailErrors, AnIndexOutsideTheListIsReportedNotPassedOn) {
 }
 
 } // namespace
+
+namespace {
+
+// Types into the context menu once it is up: the menu's loop takes the thread's keyboard messages.
+struct MenuKeys {
+    static std::string keys;
+    static HWND target;
+    static void CALLBACK Tick(HWND, UINT, UINT_PTR id, DWORD) {
+        if (keys.empty()) {
+            ::EndMenu();
+            return;
+        }
+        const char c = keys.front();
+        keys.erase(keys.begin());
+        ::PostMessageA(target, WM_CHAR, static_cast<WPARAM>(c), 1);
+    }
+};
+std::string MenuKeys::keys;
+HWND MenuKeys::target = nullptr;
+
+void RightClickAndType(exCDwgThumbnail* control, const std::string& keys) {
+    MenuKeys::keys = keys;
+    MenuKeys::target = control->m_hWnd;
+    const UINT_PTR timer = ::SetTimer(nullptr, 0, 150, &MenuKeys::Tick);
+    Click(control, MK_RBUTTON, WM_RBUTTONDOWN);
+    ::KillTimer(nullptr, timer);
+}
+
+TEST(ThumbnailMenu, SortEntryGoesToTheFrame) {
+    GridBench bench;
+    FillList(6);
+    bench.view().Rebuild();
+    Pump();
+    RightClickAndType(bench.view().ControlOf(1), "sd");
+    Pump();
+    ASSERT_EQ(bench.frame().commands.size(), 1u);
+    EXPECT_EQ(bench.frame().commands[0], static_cast<UINT>(ID_SORT_DATE));
+}
+
+TEST(ThumbnailMenu, RenameEntryStartsTheRename) {
+    GridBench bench;
+    FillList(6);
+    bench.view().Rebuild();
+    Pump();
+    exCDwgThumbnail* control = bench.view().ControlOf(2);
+    RightClickAndType(control, "r");
+    EXPECT_TRUE(control->Label().IsRenaming());
+    EXPECT_FALSE(control->Label().GetStyle() & ES_READONLY);
+    EXPECT_EQ(::GetFocus(), control->Label().m_hWnd);
+    EXPECT_TRUE(bench.frame().commands.empty());
+}
+
+} // namespace
