@@ -186,20 +186,29 @@ void CTessel3View::Layout() {
     m_nCount = DwgList.GetSize();
     const grid::Geometry g = Geometry();
 
-    // Showing or hiding a scroll bar changes the client height: settle the bars first.
+    // Showing or hiding a scroll bar changes the client area: settle the bars first. A vertical bar that
+    // appears may leave too little width for the columns; then there is one column less.
     grid::LayoutNumbers n;
     int clientHeight = GetClientRect().Height();
-    for (int pass = 0; pass < 3; ++pass) {
+    for (int pass = 0; pass < 4; ++pass) {
         n = grid::ComputeLayout(g, m_nCount, m_nColumns, clientHeight);
         {
             FlagGuard guard(m_bAligning); // the size messages of the bars do not re-enter the layout
             SetScrollSizes(MM_TEXT, CSize(n.totalWidth, n.totalHeight), CSize(n.lineX, n.lineY),
                            CSize(n.lineX, n.lineY));
         }
-        const int now = GetClientRect().Height();
-        if (now == clientHeight)
+        const CRect now = GetClientRect();
+        bool changed = now.Height() != clientHeight;
+        clientHeight = now.Height();
+        const int fit = grid::ColumnsForWidth(now.Width(), m_nCellWidth, m_nGap);
+        if (m_nCount > 0 && fit < m_nColumns) {
+            m_nFirstRow = grid::RelayoutFirstRow(m_nColumns, m_nFirstRow, fit, m_nCount);
+            m_nColumns = fit;
+            m_nOldColumns = fit;
+            changed = true;
+        }
+        if (!changed)
             break;
-        clientHeight = now;
     }
     m_nRows = n.rows;
     m_nVisibleRows = n.visibleRows;

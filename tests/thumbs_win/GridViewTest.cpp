@@ -338,3 +338,22 @@ TEST(GridSort, RebuildSortsByTheFrameModeKeepingTheLastRecord) {
 }
 
 } // namespace
+
+namespace {
+
+TEST(GridLayout, ColumnsFitBesideTheVerticalScrollBar) {
+    // 710 pixels hold 4 columns (707) until the vertical bar takes its width.
+    GridBench bench(710, 600);
+    FillList(300);
+    bench.view().Rebuild();
+    Pump();
+    CTessel3View& view = bench.view();
+    const CRect client = view.GetClientRect();
+    EXPECT_TRUE(view.GetStyle() & WS_VSCROLL);
+    EXPECT_LE(view.GetColumns() * 178 - 5, client.Width());
+    EXPECT_EQ(view.GetColumns(), (client.Width() + 5) / 178);
+    EXPECT_FALSE(view.GetStyle() & WS_HSCROLL);
+    EXPECT_LE(LiveThumbnails(view.m_hWnd), view.GetColumns() * (view.GetVisibleRows() + 2));
+}
+
+} // namespace
