@@ -227,6 +227,7 @@ bool exCDwgThumbnail::DestroyWindow() {
     m_wndLabel.DestroyWindow();
     m_wndLabel.m_pOwner = nullptr;
     m_wndToolTip.DestroyWindow();
+    m_bToolTipActive = false;
     return CWnd::DestroyWindow();
 }
 
@@ -323,6 +324,15 @@ bool exCDwgThumbnail::PreTranslateMessage(MSG* pMsg) {
 bool exCDwgThumbnail::TranslateInput(MSG* pMsg) {
     switch (pMsg->message) {
     case WM_MOUSEMOVE:
+        // Created inactive, the tooltip starts to work when the mouse first moves over the picture; from
+        // then on the control's own delays decide when it shows.
+        if (m_wndToolTip.m_hWnd && !m_bToolTipActive) {
+            m_wndToolTip.Activate(true);
+            m_bToolTipActive = true;
+        }
+        if (m_wndToolTip.m_hWnd)
+            m_wndToolTip.RelayEvent(pMsg);
+        return false;
     case WM_LBUTTONUP:
         if (m_wndToolTip.m_hWnd)
             m_wndToolTip.RelayEvent(pMsg);

@@ -70,6 +70,7 @@ public:
     // The tooltip's text as it was built at creation.
     const std::string& ToolTipText() const { return m_strToolTip; }
     bool NoFrameColour() const { return m_bNoFrameColour != 0; }
+    bool ToolTipActive() const { return m_bToolTipActive; }
 
 protected:
     LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
@@ -97,6 +98,7 @@ private:
     COLORREF m_savedColour = 0;
     CToolTipCtrl m_wndToolTip;
     std::string m_strToolTip;
+    bool m_bToolTipActive = false;
 };
 
 // The current directory with a "\" at its end.

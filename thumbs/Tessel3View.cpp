@@ -477,6 +477,13 @@ LRESULT CTessel3View::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
     case WM_THUMBS_REFRESH:
         Refresh();
         return 0;
+    case WM_PRINTCLIENT: {
+        // Drawing into a given DC (screenshots, print-window): the background and the rename edge.
+        CDC dc(reinterpret_cast<HDC>(wParam));
+        OnPrepareDC(&dc);
+        OnDraw(&dc);
+        return 0;
+    }
     default:
         return CScrollView::WindowProc(message, wParam, lParam);
     }

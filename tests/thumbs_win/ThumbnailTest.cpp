@@ -425,3 +425,77 @@ TEST(ThumbnailMenu, RenameEntryStartsTheRename) {
 }
 
 } // namespace
+
+namespace {
+
+// The view drawn into a bitmap of its client size.
+class ViewPicture {
+public:
+    explicit ViewPicture(CTessel3View& view) {
+        const CRect client = view.GetClientRect();
+        CClientDC screen(view.m_hWnd);
+        m_dc = ::CreateCompatibleDC(screen);
+        m_bitmap.CreateCompatibleBitmap(screen, client.Width(), client.Height());
+        m_old = ::SelectObject(m_dc, m_bitmap);
+        view.SendMessage(WM_PRINTCLIENT, reinterpret_cast<WPARAM>(m_dc), PRF_CLIENT);
+    }
+    ~ViewPicture() {
+        ::SelectObject(m_dc, m_old);
+        ::DeleteDC(m_dc);
+    }
+    ViewPicture(const ViewPicture&) = delete;
+    ViewPicture& operator=(const ViewPicture&) = delete;
+    COLORREF At(int x, int y) const { return ::GetPixel(m_dc, x, y); }
+
+private:
+    HDC m_dc = nullptr;
+    CBitmap m_bitmap;
+    HGDIOBJ m_old = nullptr;
+};
+
+COLORREF Nearest(CTessel3View& view, COLORREF c) {
+    CClientDC dc(view.m_hWnd);
+    return ::GetNearestColor(dc, c);
+}
+
+TEST(ThumbnailRename, SunkenEdgeAroundTheLabelOnlyWhileRenaming) {
+    GridBench bench;
+    FillList(6);
+    bench.view().Rebuild();
+    Pump();
+    CThumbLabel& label = bench.view().ControlOf(4)->Label();
+    const CRect edge = label.EdgeRect();
+    const COLORREF background = Nearest(bench.view(), ::GetSysColor(COLOR_SCROLLBAR));
+    {
+        ViewPicture before(bench.view());
+        EXPECT_EQ(before.At(edge.left, edge.top + 3), background);
+    }
+    label.BeginRename();
+    {
+        ViewPicture during(bench.view());
+        EXPECT_EQ(during.At(edge.left, edge.top + 3), Nearest(bench.view(), ::GetSysColor(COLOR_BTNSHADOW)));
+        EXPECT_EQ(during.At(edge.right - 1, edge.top + 3),
+                  Nearest(bench.view(), ::GetSysColor(COLOR_BTNHIGHLIGHT)));
+        EXPECT_EQ(during.At(edge.left - 2, edge.top + 3), background);
+    }
+    ::PostMessageA(label.m_hWnd, WM_KEYDOWN, VK_ESCAPE, 1);
+    Pump();
+    ViewPicture after(bench.view());
+    EXPECT_EQ(after.At(edge.left, edge.top + 3), background);
+}
+
+TEST(ThumbnailTooltip, ActiveOnceTheMouseMovesOverThePicture) {
+    GridBench bench;
+    FillList(3);
+    bench.view().Rebuild();
+    Pump();
+    exCDwgThumbnail* control = bench.view().ControlOf(1);
+    ASSERT_NE(control, nullptr);
+    EXPECT_FALSE(control->ToolTipActive());
+    ::PostMessageA(control->m_hWnd, WM_MOUSEMOVE, 0, MAKELPARAM(20, 20));
+    Pump();
+    EXPECT_TRUE(control->ToolTipActive());
+    EXPECT_FALSE(bench.view().ControlOf(0)->ToolTipActive());
+}
+
+} // namespace
