@@ -215,7 +215,8 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
             }
             continue;
         }
-        if (key == L"at" && name->window) {
+        if ((key == L"at" || key == L"window-at") && name->window) {
+            command.windowPoint = key == L"window-at";
             const std::size_t comma = value.find(L',');
             if (comma == std::wstring::npos || !ParseInt(value.substr(0, comma), command.x, true) ||
                 !ParseInt(value.substr(comma + 1), command.y, true)) {

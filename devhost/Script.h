@@ -55,6 +55,7 @@ struct ScriptCommand {
     std::vector<WindowStep> window;
     int timeoutMs = 5000;  // timeout=MS (wait, gone, and the commands that need their window)
     bool hasPoint = false; // at=X,Y: a point of the window's client area
+    bool windowPoint = false; // window-at=X,Y: a point of the whole window (negative: from right/bottom)
     int x = 0, y = 0;
     unsigned modifiers = 0;     // with=ctrl+shift+alt
     std::vector<KeyChord> keys; // key

@@ -197,6 +197,12 @@ void AddMouse(std::vector<INPUT>& inputs, DWORD flags) {
 // The screen point of the command: at=X,Y in the window's client area, or the client area's centre.
 POINT TargetPoint(HWND hwnd, const ScriptCommand& command) {
     POINT point{command.x, command.y};
+    if (command.windowPoint) { // the caption and the frame too, e.g. a close box: window-at=-12,10
+        RECT window{};
+        GetWindowRect(hwnd, &window);
+        return {command.x < 0 ? window.right + command.x : window.left + command.x,
+                command.y < 0 ? window.bottom + command.y : window.top + command.y};
+    }
     if (!command.hasPoint) {
         RECT client{};
         GetClientRect(hwnd, &client);

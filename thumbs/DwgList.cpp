@@ -25,6 +25,14 @@ void AppendScanEntry(const DwgFindEntry& entry) {
     DwgList.Add(DwgData(entry));
 }
 
+void AppendScanRecords(std::vector<DwgData>&& records) {
+    const int start = DwgList.GetSize();
+    DwgList.SetSize(start + static_cast<int>(records.size()));
+    for (std::size_t i = 0; i < records.size(); ++i)
+        DwgList[start + static_cast<int>(i)] = std::move(records[i]);
+    records.clear();
+}
+
 void EndScan() {
     DwgList.FreeExtra();
 }

@@ -6,6 +6,8 @@
 #include <io.h>
 
 #include <string>
+#include <utility>
+#include <vector>
 
 namespace {
 
@@ -48,11 +50,13 @@ int ScanFolderPath(const char* path, const char* needle) {
     FindHandle search(_findfirst64i32(pattern.c_str(), &found));
     if (search.get() == -1)
         return 0;
+    std::vector<DwgData> records;
     do {
         DwgFindEntry entry = EntryOf(found);
         if (AcceptScanEntry(entry, needle))
-            AppendScanEntry(entry);
+            records.emplace_back(entry);
     } while (_findnext64i32(search.get(), &found) == 0);
+    AppendScanRecords(std::move(records));
     EndScan();
     return 1;
 }

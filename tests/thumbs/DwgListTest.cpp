@@ -146,6 +146,21 @@ TEST_F(DwgListTest, ScanStartsFromEmptyWithGrowStepAndShrinksAtEnd) {
     EXPECT_EQ(DwgList[0].m_strName, "f0.dwg");
 }
 
+TEST_F(DwgListTest, WholeFolderAppendGrowsByStepsAndKeepsTheScanOrder) {
+    std::vector<DwgData> records;
+    for (int i = 0; i < 250; ++i)
+        records.emplace_back(File("r" + std::to_string(i) + ".dwg"));
+    BeginScan();
+    AppendScanRecords(std::move(records));
+    EXPECT_EQ(DwgList.GetSize(), 250);
+    EXPECT_EQ(DwgList.GetAllocated(), 300u);
+    EndScan();
+    EXPECT_EQ(DwgList.GetAllocated(), 250u);
+    EXPECT_EQ(DwgList.GetGrowBy(), kDwgListGrowBy);
+    EXPECT_EQ(DwgList[0].m_strName, "r0.dwg");
+    EXPECT_EQ(DwgList[249].m_strName, "r249.dwg");
+}
+
 TEST_F(DwgListTest, IndexOutsideListThrows) {
     Scan({File("a.dwg")});
     EXPECT_THROW(DwgList[1], CInvalidArgException);
