@@ -54,3 +54,10 @@ finish() {
   echo "$((checks - failures)) passed, $failures failed"
   [ "$failures" -eq 0 ]
 }
+
+# gen_dwg DIR COUNT [ARGS...]: synthetic drawing files made by the project's generator (a Windows program here).
+gen_dwg() {
+  local dir=$1 count=$2; shift 2
+  mkdir -p "$dir"
+  "$WINE_RUN" "$GEN_DWG" "$(winpath "$dir")" "$count" "$@" >/dev/null 2>"$WORK/gen.err"
+}

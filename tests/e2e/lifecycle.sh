@@ -3,7 +3,7 @@
 . "$(dirname "$0")/lib.sh"
 
 exports=$("${OBJDUMP:-x86_64-w64-mingw32-objdump}" -p "$ORVEX_ARX" |
-  sed -n '/\[Ordinal\/Name Pointer\] Table/,/^$/p' | awk 'NF==2 && $1 ~ /^\[/ {print $2}' | sort | tr '\n' ' ')
+  sed -n '/\[Ordinal\/Name Pointer\] Table/,/^$/p' | sed -n 's/^[[:space:]]*\[ *[0-9]*\] //p' | sort | tr '\n' ' ')
 if [ "$exports" == "acrxEntryPoint acrxGetApiVersion odrxCreateModuleObject odrxGetAPIVersion " ]; then
   pass "the export table holds the four entry points and nothing else"
 else

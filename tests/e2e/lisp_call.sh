@@ -14,7 +14,7 @@ expect_output "one argument: missing printed, type message alerted" \
 
 devhost --eval '(Orvex "a" 2 "" "" "")'
 expect_output "first argument not a short" \
-  "${nl}Argument should be an short[alert] \\nArgument should be an short${nl}=> (no value)"
+  "${nl}Argument should be an short${nl}[alert] \\nArgument should be an short${nl}=> (no value)"
 
 devhost --eval '(Orvex 1 2.5 "" "" "")'
 expect_output "second argument not a short: alerted, then printed" \
@@ -29,24 +29,27 @@ expect_line "cancel caption missing" "[alert] \\nArgument should be an short"
 devhost --after-ms 300 --post cancel --eval '(Orvex 1 2 "" "Insert" "Close")'
 expect_output "cancelled run gives nil" "=> nil"
 
-# A pick: the document's folder and name come from the settings file beside the library.
+# A pick. Without a start path the explorer opens the folder saved in the settings file beside the library.
 folder="$WORK/drawings"
 mkdir -p "$folder"
-printf '[CurrentPath]\r\nPath=%s\r\nName=plan.dwg\r\n\r\n' "$(winpath "$folder")" >"$WORK/lib/Orvex1.ini"
-devhost --after-ms 300 --post accept --eval '(Orvex 1 2 "" "" "")'
-expect_output "accepted run without datains.ini gives three empty strings" \
+gen_dwg "$folder" 3 --seed 11
+cp "$folder/$(ls "$folder" | head -1)" "$folder/plan.dwg"
+printf 'wait text="plan.dwg" timeout=20000\ndouble-click text="plan.dwg" at=60,-50\n' >"$WORK/pick.txt"
+printf '[CurrentPath]\r\nPath=%s\r\nName=\r\n\r\n' "$(winpath "$folder")" >"$WORK/lib/Orvex1.ini"
+devhost --script "$(winpath "$WORK/pick.txt")" --eval '(Orvex 1 2 "" "" "")'
+expect_output "a pick in a folder without datains.ini gives three empty strings" \
   "=> (\"$(lisppath "$folder")\\\\plan.dwg\" (\"\" \"\" \"\"))"
 
 printf '[Default Parameters]\r\nLayer=Walls\r\nLisp command=(command "_zoom" "_e")\r\nColor=3\r\n\r\n' >"$folder/datains.ini"
-printf '[CurrentPath]\r\nPath=%s\\\r\nName=plan.dwg\r\n\r\n' "$(winpath "$folder")" >"$WORK/lib/Orvex1.ini"
-devhost --after-ms 300 --post accept --eval '(Orvex 1 2 "" "" "")'
-expect_output "accepted run returns layer, colour and command of the folder; no doubled separator" \
+printf '[CurrentPath]\r\nPath=%s\\\r\nName=\r\n\r\n' "$(winpath "$folder")" >"$WORK/lib/Orvex1.ini"
+devhost --script "$(winpath "$WORK/pick.txt")" --eval '(Orvex 1 2 "" "" "")'
+expect_output "a pick returns layer, colour and command of the folder; no doubled separator" \
   "=> (\"$(lisppath "$folder")\\\\plan.dwg\" (\"Walls\" \"3\" \"(command \\\"_zoom\\\" \\\"_e\\\")\"))"
 
 devhost --after-ms 300 --post cancel --eval '(Orvex 1 2 "C:\\Work\\a.dwg" "" "")' --eval '(Orvex 1 2 "" "" "")'
 expect_output "two calls in a row, each cancelled" "=> nil${nl}=> nil"
 
-devhost --eval '(Orvex 1 2 "" "" "")' --eval '(orvex2)'
+devhost --eval '(orvex2)'
 expect_line "unknown function" "; error: no function definition: orvex2"
 
 finish
