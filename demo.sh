@@ -1,25 +1,62 @@
 #!/usr/bin/env bash
-# The main job: build Orvex1.arx and devhost.exe, then call the LISP function the way a LISP program
-# in the CAD application does, and print the call and its result.
+# The main job: build Orvex1.arx and the development host, then call the LISP function the way a LISP
+# program in the CAD application does, on a folder of drawings, and print the call and its result.
+#
+# With a display (DISPLAY set) the explorer waits for you: pick a drawing (double-click it, or type the
+# start of its name and press "Insert"), or press Escape. Without one it runs headless under Xvfb: a
+# script moves the mouse, types and picks like a person would, and screenshots go to docs/.
 set -euo pipefail
 cd "$(dirname "$0")"
 tools/ensure-packages
 cmake --preset windows >/dev/null
-cmake --build --preset windows
+cmake --build --preset windows --target Orvex1 devhost gen-dwg-samples
 
-# Drawings to show: the real samples beside the project when they are there, else the project's
-# synthetic ones (files in the drawing container layout with generated preview pictures).
+# Drawings to show: the real samples beside the project when they are there, else synthetic ones the
+# project generates (files in the drawing container layout with generated preview pictures).
 samples="$(cd .. && pwd)/shared/dwg-samples/2004"
 if [ ! -d "$samples" ]; then
   samples="$PWD/build/demo-drawings"
   if [ ! -d "$samples" ]; then
-    cmake --preset native >/dev/null && cmake --build --preset native --target gen-dwg-samples
-    build/native/tools/gen-dwg-samples/gen-dwg-samples "$samples" 60
+    mkdir -p "$samples"
+    tools/wine-run build/windows/bin/gen-dwg-samples.exe "$(printf 'Z:%s' "$samples" | tr '/' '\\')" 60 >/dev/null
   fi
 fi
 folder=$(printf 'Z:%s\\' "$samples" | tr '/' '\\')
 lisp_folder=$(printf '%s' "$folder" | sed 's/\\/\\\\/g')
 call="(Orvex 1 2 \"$lisp_folder\" \"Insert\" \"Close\")"
-
 echo "Command: $call"
-tools/wine-run build/windows/bin/devhost.exe --after-ms 3000 --post cancel --eval "$call" | tr -d '\r'
+
+if [ -n "${DISPLAY:-}" ] && [ -z "${CI:-}" ] && [ -z "${DEMO_HEADLESS:-}" ]; then
+  tools/wine-run build/windows/bin/devhost.exe --eval "$call" | tr -d '\r'
+  exit 0
+fi
+
+# Headless: a person's session, scripted, from fresh explorer settings.
+rm -f build/windows/bin/Orvex1.ini
+mkdir -p docs
+names=$(ls "$samples" | grep -i '\.dwg' | tr 'A-Z' 'a-z' | sort)
+first=$(printf '%s\n' "$names" | head -1)
+pick=$(printf '%s\n' "$names" | sed -n 3p)
+prefix=${pick:0:2}
+frame="contains=\"$(basename "$samples")\" nth=0"   # the frame's title shows the folder
+script=build/demo-script.txt
+win() { printf 'Z:%s/%s' "$PWD" "$1" | tr '/' '\\'; }
+cat >"$script" <<SCRIPT
+# Look at the explorer, hover a drawing for its tooltip, type the start of a name, pick that drawing.
+wait contains=".dwg" timeout=30000
+sleep 800
+screenshot $frame $(win docs/explorer.png)
+move text="$first" at=60,-50
+sleep 200
+move text="$first" at=70,-55
+sleep 1500
+tooltip
+screenshot $frame $(win docs/explorer-tooltip.png)
+click id=32790
+type "$prefix"
+sleep 500
+screenshot $frame $(win docs/explorer-search.png)
+double-click text="$pick" at=60,-50
+SCRIPT
+tools/wine-run build/windows/bin/devhost.exe --script "$(win "$script")" --eval "$call" | tr -d '\r'
+echo "Screenshots: docs/explorer.png, docs/explorer-tooltip.png, docs/explorer-search.png"
