@@ -122,7 +122,7 @@ int main() {
     std::vector<Sample> synthetic;
     for (std::uint64_t i = 0; i < options.count; ++i) {
         Sample s;
-        s.path = genDir + "/" + dwggen::SampleName(i, options.seed);
+        s.path = genDir + "/" + dwggen::SampleName(i, options.variant);
         if (Locate(s))
             synthetic.push_back(s);
     }

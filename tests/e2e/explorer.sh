@@ -10,7 +10,7 @@ if [ -d "$ROOT/../shared/dwg-samples/2004" ]; then
   real_samples=yes
 else
   echo "note: ../shared/dwg-samples is absent; the checks on real previews are skipped"
-  gen_dwg "$folder" 12 --seed 7
+  gen_dwg "$folder" 12 --variant 7
   real_samples=no
 fi
 names=$(ls "$folder" | tr 'A-Z' 'a-z' | sort)

@@ -4,7 +4,7 @@
 . "$(dirname "$0")/lib.sh"
 
 folder="$WORK/orvexmany"
-gen_dwg "$folder" 3000 --seed 5
+gen_dwg "$folder" 3000 --variant 5
 [ "$(ls "$folder" | wc -l)" -eq 3000 ] && pass "3000 drawings generated" || fail "generator: $(cat "$WORK/gen.err")"
 names=$(ls "$folder" | tr 'A-Z' 'a-z' | LC_ALL=C sort -f)
 first=$(printf '%s\n' "$names" | head -1)

@@ -32,7 +32,7 @@ expect_output "cancelled run gives nil" "=> nil"
 # A pick. Without a start path the explorer opens the folder saved in the settings file beside the library.
 folder="$WORK/drawings"
 mkdir -p "$folder"
-gen_dwg "$folder" 3 --seed 11
+gen_dwg "$folder" 3 --variant 11
 cp "$folder/$(ls "$folder" | head -1)" "$folder/plan.dwg"
 printf 'wait text="plan.dwg" timeout=20000\ndouble-click text="plan.dwg" at=60,-50\n' >"$WORK/pick.txt"
 printf '[CurrentPath]\r\nPath=%s\r\nName=\r\n\r\n' "$(winpath "$folder")" >"$WORK/lib/Orvex1.ini"

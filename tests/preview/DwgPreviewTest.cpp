@@ -460,14 +460,14 @@ TEST(SyntheticDwg, GeneratedFilesReadBack) {
     dwggen::GenerateOptions options;
     options.outDir = dir;
     options.count = 25;
-    options.seed = 7;
+    options.variant = 7;
     std::string error;
     ASSERT_EQ(dwggen::GenerateSamples(options, error), 25u) << error;
     std::set<std::string> names;
     std::set<std::size_t> sizes;
     std::set<long long> times;
     for (std::uint64_t i = 0; i < options.count; ++i) {
-        const std::string name = dwggen::SampleName(i, options.seed);
+        const std::string name = dwggen::SampleName(i, options.variant);
         names.insert(name);
         const std::string path = dir + "/" + name;
         SCOPED_TRACE(path);
@@ -524,7 +524,7 @@ namespace {
 // The fuzzer's seeds stay what their names say.
 TEST(DwgPreviewSeeds, SeedsParseAsNamed) {
     const std::string dir = ORVEX_FUZZ_SEEDS;
-    struct Seed {
+    struct Variant {
         const char* name;
         DwgPreviewKind kind;
     } seeds[] = {{"bmp24", DwgPreviewKind::Bmp},        {"bmp8", DwgPreviewKind::Bmp},
@@ -532,7 +532,7 @@ TEST(DwgPreviewSeeds, SeedsParseAsNamed) {
                  {"wmf", DwgPreviewKind::Wmf},          {"bmp_wmf", DwgPreviewKind::Bmp},
                  {"r2000_layout", DwgPreviewKind::Bmp}, {"header_only", DwgPreviewKind::None},
                  {"no_entries", DwgPreviewKind::None},  {"pre_r13", DwgPreviewKind::None}};
-    for (const Seed& s : seeds) {
+    for (const Variant& s : seeds) {
         SCOPED_TRACE(s.name);
         const std::string path = dir + "/" + s.name;
         if (!IsDirectory(dir))

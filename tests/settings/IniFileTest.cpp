@@ -686,10 +686,10 @@ std::string RandomValue(std::mt19937& rng) {
 
 TEST_F(IniFileTest, RandomStoresRoundTrip) {
     const unsigned seeds[] = {1, 2, 3, 5, 8, 13, 21, 34, 55, 89, 144, 233, 377, 610, 987, 1597, 2024, 65535};
-    for (unsigned seed : seeds) {
-        SCOPED_TRACE("seed " + std::to_string(seed));
-        std::mt19937 rng(seed);
-        CIniFile ini(m_dir.File("random-" + std::to_string(seed) + ".ini"));
+    for (unsigned variant : seeds) {
+        SCOPED_TRACE("variant " + std::to_string(variant));
+        std::mt19937 rng(variant);
+        CIniFile ini(m_dir.File("random-" + std::to_string(variant) + ".ini"));
         std::vector<std::string> sectionPool;
         std::vector<std::string> namePool;
         int operations = std::uniform_int_distribution<int>(0, 60)(rng);

@@ -117,8 +117,8 @@ unsigned CubeIndex(Rgb c) {
 
 } // namespace
 
-std::vector<unsigned char> DrawDib(const PictureOptions& picture, std::uint64_t seed) {
-    Rng rng(seed);
+std::vector<unsigned char> DrawDib(const PictureOptions& picture, std::uint64_t variant) {
+    Rng rng(variant);
     const int w = std::max(1, picture.width);
     const int h = std::max(1, picture.height);
     const int bits = (picture.bitsPerPixel == 4 || picture.bitsPerPixel == 8) ? picture.bitsPerPixel : 24;
@@ -196,12 +196,12 @@ std::vector<unsigned char> DrawDib(const PictureOptions& picture, std::uint64_t 
 }
 
 std::vector<unsigned char> BuildDwg(const std::vector<unsigned char>& dib, std::size_t fillerBytes,
-                                    std::uint64_t seed) {
-    return BuildDwgWithPicture(dwgfmt::kBmp, dib, fillerBytes, seed);
+                                    std::uint64_t variant) {
+    return BuildDwgWithPicture(dwgfmt::kBmp, dib, fillerBytes, variant);
 }
 
 std::vector<unsigned char> BuildDwgWithPicture(unsigned char code, const std::vector<unsigned char>& dib,
-                                               std::size_t fillerBytes, std::uint64_t seed) {
+                                               std::size_t fillerBytes, std::uint64_t variant) {
     constexpr std::size_t kSectionAddress = 0x1C0;
     constexpr std::size_t kHeaderDataBytes = 80;
     constexpr unsigned kEntries = 2;
@@ -212,7 +212,7 @@ std::vector<unsigned char> BuildDwgWithPicture(unsigned char code, const std::ve
     std::vector<unsigned char> file(sectionEnd + 16 + fillerBytes, 0);
     unsigned char* p = file.data();
 
-    Rng rng(seed ^ 0xD1B54A32D192ED03ull);
+    Rng rng(variant ^ 0xD1B54A32D192ED03ull);
     std::memcpy(p, "AC1018", 6);
     for (std::size_t i = 6; i < kSectionAddress; ++i)
         p[i] = static_cast<unsigned char>(rng.Next());
@@ -243,12 +243,12 @@ std::vector<unsigned char> BuildDwgWithPicture(unsigned char code, const std::ve
     return file;
 }
 
-std::string SampleName(std::uint64_t index, std::uint64_t seed) {
+std::string SampleName(std::uint64_t index, std::uint64_t variant) {
     static const char* const kWords[] = {
         "Plan", "floor", "SECTION", "detail", "Elevation", "site",   "roof",    "Stair", "door",  "WINDOW",
         "wall", "Beam",  "column",  "slab",   "Facade",    "garden", "Kitchen", "bath",  "Lobby", "Garage"};
     static const char* const kExtensions[] = {".dwg", ".dwg", ".dwg", ".DWG", ".Dwg", ".dwg"};
-    Rng rng(seed * 31 + index);
+    Rng rng(variant * 31 + index);
     const std::size_t words = sizeof kWords / sizeof kWords[0];
     std::string name = kWords[rng.Next() % words];
     if (rng.Range(0, 2) == 0) {
@@ -273,7 +273,7 @@ std::uint64_t GenerateSamples(const GenerateOptions& options, std::string& error
     const std::size_t smallest = std::max<std::size_t>(8 * 1024, baseSize + 1024);
     const std::size_t largest = std::max<std::size_t>(20 * 1024, smallest + 4096);
     for (std::uint64_t i = 0; i < options.count; ++i) {
-        Rng rng(options.seed * 1000003ull + i);
+        Rng rng(options.variant * 1000003ull + i);
         const std::uint64_t pictureSeed = rng.Next();
         const std::vector<unsigned char> dib = DrawDib(options.picture, pictureSeed);
         const std::size_t target = smallest + rng.Next() % (largest - smallest + 1);
@@ -282,7 +282,7 @@ std::uint64_t GenerateSamples(const GenerateOptions& options, std::string& error
         const std::vector<unsigned char> file = BuildDwg(dib, target > core ? target - core : 0, rng.Next());
 
         path.resize(dirLength);
-        path += SampleName(i, options.seed);
+        path += SampleName(i, options.variant);
         std::FILE* f = std::fopen(path.c_str(), "wb");
         if (f == nullptr) {
             error = "cannot create " + path;

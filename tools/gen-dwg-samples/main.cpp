@@ -1,4 +1,4 @@
-// gen-dwg-samples OUTDIR COUNT [--seed N] [--width W] [--height H] [--bpp 24|8|4]
+// gen-dwg-samples OUTDIR COUNT [--variant N] [--width W] [--height H] [--bpp 24|8|4]
 // Writes COUNT synthetic drawing files (container layout and preview picture only, no drawing content)
 // into OUTDIR, for tests and benchmarks of the thumbnail browser.
 #include "SyntheticDwg.h"
@@ -12,7 +12,7 @@ namespace {
 
 int Usage() {
     std::fprintf(stderr,
-                 "usage: gen-dwg-samples OUTDIR COUNT [--seed N] [--width W] [--height H] [--bpp 24|8|4]\n");
+                 "usage: gen-dwg-samples OUTDIR COUNT [--variant N] [--width W] [--height H] [--bpp 24|8|4]\n");
     return 2;
 }
 
@@ -38,8 +38,8 @@ int main(int argc, char** argv) {
         if (i + 1 >= argc || !ParseNumber(argv[i + 1], value))
             return Usage();
         ++i;
-        if (std::strcmp(flag, "--seed") == 0)
-            options.seed = value;
+        if (std::strcmp(flag, "--variant") == 0)
+            options.variant = value;
         else if (std::strcmp(flag, "--width") == 0 && value > 0 && value <= 4096)
             options.picture.width = static_cast<int>(value);
         else if (std::strcmp(flag, "--height") == 0 && value > 0 && value <= 4096)
