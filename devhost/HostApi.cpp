@@ -6,6 +6,7 @@
 #include "devhost/Palette.h"
 #include "devhost/ResultBuffers.h"
 #include "devhost/Text.h"
+#include "devhost/Timing.h"
 
 #ifdef DEVHOST_HAVE_DWGPREVIEW
 #include "thumbs/preview/DrawPreview.h"
@@ -224,6 +225,7 @@ bool acdbDisplayPreviewFromDwg(const wchar_t* fileName, HWND window, const std::
         const COLORREF background = bgColor ? static_cast<COLORREF>(*bgColor) : GetSysColor(COLOR_WINDOW);
         const bool drawn = DrawDwgPreview(dc, area, fileName, background);
         ReleaseDC(window, dc);
+        TimingPreviewDrawn(window, fileName);
         return drawn;
     });
 #else

@@ -7,7 +7,7 @@ namespace devhost {
 const wchar_t* const kUsage =
     L"usage: devhost.exe [--arx PATH] [--order entry-first|module-first] [--drawings N]\n"
     L"                   [--layer NAME=ACI]... [--alert-box] [--after-ms MS --post accept|cancel]\n"
-    L"                   [--eval EXPR]... [--script FILE] [--verbose]\n";
+    L"                   [--eval EXPR]... [--script FILE] [--verbose] [--timing]\n";
 
 namespace {
 
@@ -111,6 +111,8 @@ bool ParseOptions(const std::vector<std::wstring>& args, Options& options, std::
                 return false;
         } else if (option == L"--verbose") {
             options.verbose = true;
+        } else if (option == L"--timing") {
+            options.timing = true;
         } else if (option == L"--help" || option == L"-h" || option == L"/?") {
             options.help = true;
         } else {

@@ -25,6 +25,7 @@ struct Options {
     std::vector<std::wstring> evals;
     std::wstring script;
     bool verbose = false;
+    bool timing = false; // [timing] lines: when previews are drawn and keys are taken, in ms
     bool help = false;
 };
 

@@ -8,6 +8,7 @@
 #include "devhost/Script.h"
 #include "devhost/ScriptRunner.h"
 #include "devhost/Text.h"
+#include "devhost/Timing.h"
 
 #include <windows.h>
 
@@ -282,8 +283,10 @@ void Session::Evaluate(const std::wstring& expression) {
         timer = SetTimer(nullptr, 0, static_cast<UINT>(m_options.afterMs), &PostTimer);
     }
     StartScript();
+    TimingCallBegins();
 
     m_entryPoint(AcRx::kInvkSubrMsg, host.appId);
+    TimingCallEnded();
 
     if (timer)
         KillTimer(nullptr, timer);

@@ -31,6 +31,8 @@ TEST(Options, Defaults) {
     EXPECT_EQ(options.post, Options::Post::None);
     EXPECT_TRUE(options.evals.empty());
     EXPECT_TRUE(options.script.empty());
+    EXPECT_FALSE(options.verbose);
+    EXPECT_FALSE(options.timing);
 }
 
 TEST(Options, EveryOption) {
@@ -38,7 +40,7 @@ TEST(Options, EveryOption) {
         Parse({L"--arx",   L"x.arx",    L"--order", L"entry-first", L"--drawings",  L"3",
                L"--layer", L"WALLS=1",  L"--layer", L"A=B=250",     L"--alert-box", L"--after-ms",
                L"500",     L"--post",   L"cancel",  L"--eval",      L"(f 1)",       L"--eval",
-               L"(g)",     L"--script", L"s.txt",   L"--verbose"});
+               L"(g)",     L"--script", L"s.txt",   L"--verbose",   L"--timing"});
     EXPECT_EQ(options.arx, L"x.arx");
     EXPECT_EQ(options.order, Options::Order::EntryFirst);
     EXPECT_EQ(options.drawings, 3);
@@ -53,6 +55,7 @@ TEST(Options, EveryOption) {
     EXPECT_EQ(options.evals, (std::vector<std::wstring>{L"(f 1)", L"(g)"}));
     EXPECT_EQ(options.script, L"s.txt");
     EXPECT_TRUE(options.verbose);
+    EXPECT_TRUE(options.timing);
     EXPECT_EQ(Parse({L"--order", L"module-first"}).order, Options::Order::ModuleFirst);
     EXPECT_EQ(Parse({L"--after-ms", L"0", L"--post", L"accept"}).post, Options::Post::Accept);
 }

@@ -1,0 +1,24 @@
+// --timing: "[timing] MS WHAT ..." lines that let a benchmark see how fast the library answers, MS being
+// milliseconds (three decimals) since the running LISP call began. Used on the user-interface thread only.
+//
+//   [timing] 0.000 call                   the call begins (the clock starts)
+//   [timing] MS preview DRAWN/VISIBLE NAME a preview was drawn into a window: VISIBLE windows of that
+//                                          window's class are shown inside their parent's client area
+//                                          (the thumbnails one can see), DRAWN of them have had a preview
+//                                          drawn since they were created
+//   [timing] MS key VK                    the user-interface thread took a key press (WM_KEYDOWN) from its
+//                                          queue; VK is the virtual-key code in decimal
+//   [timing] MS key-handled               the next message it took after that key: the key's handling
+//                                          had ended
+//   [timing] MS call-end                  the call returned
+#pragma once
+
+#include <windows.h>
+
+namespace devhost {
+
+void TimingCallBegins();
+void TimingCallEnded();
+void TimingPreviewDrawn(HWND window, const wchar_t* fileName);
+
+} // namespace devhost
