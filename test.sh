@@ -26,7 +26,7 @@ fi
 
 step "fuzz targets (${FUZZ_SECONDS}s each)"
 fuzz_rc=0; fuzz_n=0; fuzz_bad=0
-if cmake --preset fuzz >/dev/null && cmake --build --preset fuzz; then
+if cmake --preset fuzz >/dev/null && cmake --build --preset fuzz --target orvex_fuzz_all; then
   for t in $(cat build/fuzz/fuzz-targets.txt 2>/dev/null); do
     corpus=tests/fuzz/corpus/$(basename "$t")
     work=build/fuzz/corpus/$(basename "$t"); mkdir -p "$work"
