@@ -35,6 +35,8 @@ function(orvex_gtest name)
   if(WIN32)
     add_test(NAME ${name} COMMAND ${CMAKE_CROSSCOMPILING_EMULATOR} $<TARGET_FILE:${name}>
              WORKING_DIRECTORY ${T_WORKING_DIRECTORY})
+    # One desktop for every Windows test: windows of two tests would take the focus from each other.
+    set_tests_properties(${name} PROPERTIES RESOURCE_LOCK wine_desktop)
   else()
     gtest_discover_tests(${name} WORKING_DIRECTORY ${T_WORKING_DIRECTORY} DISCOVERY_TIMEOUT 60)
   endif()
