@@ -1,0 +1,41 @@
+#!/usr/bin/env bash
+# Builds what the benchmarks need and runs them all, printing their tables:
+#   bench_sort, bench_preview   (Windows build, under Wine)
+#   bench_first_paint.sh        LISP call -> first complete paint of the explorer
+#   bench_scroll.sh             one scroll step at the top and at the bottom of the grid
+#   bench_scan                  folder scan against a bare FindFirstFile loop (last: it makes its folders)
+# Builds go to build/bench-win (mingw-w64, Release) and build/bench-native (the generator, to make the big
+# folders of drawings quickly); drawings to build/bench-data, kept between runs. BENCH_RUNS sets the runs
+# of the explorer benchmarks (default 5).
+set -euo pipefail
+root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
+cd "$root"
+source bench/explorer-lib.sh
+
+{
+  cmake -S . -B "$win_build" -G Ninja --toolchain cmake/mingw-w64-x86_64.cmake -DCMAKE_BUILD_TYPE=Release
+  cmake --build "$win_build" --target Orvex1 devhost gen-dwg-samples bench_sort bench_preview bench_scan
+  cmake -S . -B "$native_build" -G Ninja -DCMAKE_BUILD_TYPE=Release
+  cmake --build "$native_build" --target gen-dwg-samples
+} >"$root/build/bench-build.log" 2>&1 || {
+  echo "build failed: see build/bench-build.log" >&2
+  exit 1
+}
+
+run_wine() { "$root/tools/wine-run" "$@" 2>/dev/null; }
+
+echo "== bench_sort"
+run_wine "$win_build/bin/bench_sort.exe"
+echo
+echo "== bench_preview"
+run_wine "$win_build/bin/bench_preview.exe"
+echo
+echo "== bench_first_paint.sh"
+bench/bench_first_paint.sh
+echo
+echo "== bench_scroll.sh"
+bench/bench_scroll.sh
+echo
+echo "== bench_scan"
+mkdir -p "$data/scan"
+run_wine "$win_build/bin/bench_scan.exe" "$(winpath "$data/scan")"
