@@ -28,7 +28,8 @@ echo "== bench_sort"
 run_wine "$win_build/bin/bench_sort.exe"
 echo
 echo "== bench_preview"
-run_wine "$win_build/bin/bench_preview.exe"
+mkdir -p "$data"
+(cd "$data" && run_wine "$win_build/bin/bench_preview.exe") # it writes its synthetic drawings where it runs
 echo
 echo "== bench_first_paint.sh"
 bench/bench_first_paint.sh
