@@ -1,5 +1,7 @@
 #include "thumbs/DwgList.h"
 
+#include <utility>
+
 #include <algorithm>
 #include <cctype>
 #include <cstring>
@@ -8,6 +10,9 @@ CDwgArray DwgList;
 
 DwgData::DwgData(const DwgFindEntry& found)
     : m_bSelected(0), m_strName(found.name), m_timeWrite(found.timeWrite), m_nSize(found.size) {}
+
+DwgData::DwgData(DwgFindEntry&& found)
+    : m_bSelected(0), m_strName(std::move(found.name)), m_timeWrite(found.timeWrite), m_nSize(found.size) {}
 
 bool AcceptScanEntry(DwgFindEntry& entry, const char* needle) {
     if (entry.isDirectory && (entry.name.empty() || entry.name[0] != '.'))

@@ -54,7 +54,7 @@ int ScanFolderPath(const char* path, const char* needle) {
     do {
         DwgFindEntry entry = EntryOf(found);
         if (AcceptScanEntry(entry, needle))
-            records.emplace_back(entry);
+            records.emplace_back(std::move(entry));
     } while (_findnext64i32(search.get(), &found) == 0);
     AppendScanRecords(std::move(records));
     EndScan();
