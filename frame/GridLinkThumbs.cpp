@@ -1,8 +1,13 @@
-// The right pane is the thumbnail grid of thumbs/.
+// The right pane is the thumbnail grid of thumbs/, and the frame answers the grid's requests
+// (thumbs/ThumbsGlue.h). Both live in this one file, which the frame always links (it makes the grid),
+// so the grid's calls back into the frame are resolved with it.
 #include "frame/GridLink.h"
 
+#include "frame/MainFrame.h"
+#include "settings/Tessel3Doc.h"
 #include "thumbs/Tessel3View.h"
 #include "thumbs/ThumbSearch.h"
+#include "thumbs/ThumbsGlue.h"
 
 CView* NewGridView() {
     return new CTessel3View;
@@ -28,4 +33,45 @@ void GridPictureSize(int& width, int& height) {
 
 void SearchDrawings(const std::string& text) {
     RunSearch(text);
+}
+
+// ---- what the grid asks of the frame ----
+
+int FrameSortMode() {
+    if (g_pMainFrame)
+        return g_pMainFrame->GetSortMode();
+    return g_pTessel3Doc ? g_pTessel3Doc->m_nSort : 0;
+}
+
+void FrameEnablePick(bool enable) {
+    if (g_pMainFrame)
+        g_pMainFrame->EnablePick(enable);
+}
+
+void FrameSetTitle(const std::string& text) {
+    if (g_pMainFrame)
+        g_pMainFrame->SetTitleText(text);
+}
+
+void FrameUpdateStatus() {
+    if (g_pMainFrame)
+        g_pMainFrame->UpdateLayerLabel();
+}
+
+void FrameFocusFolderTree() {
+    // The folder pane is the splitter's first column, beside the grid.
+    if (!g_pTessel3View)
+        return;
+    auto* splitter = dynamic_cast<CSplitterWnd*>(g_pTessel3View->GetParent());
+    CWnd* pane = splitter ? splitter->GetPane(0, 0) : nullptr;
+    if (!pane || !pane->m_hWnd)
+        return;
+    HWND target = pane->m_hWnd;
+    if (HWND tree = ::GetWindow(target, GW_CHILD))
+        target = tree;
+    ::SetFocus(target);
+}
+
+HWND FrameWindow() {
+    return g_pMainFrame ? g_pMainFrame->m_hWnd : nullptr;
 }

@@ -1,6 +1,6 @@
 // What the thumbnail browser asks of the explorer frame, in one place: the sort mode, the pick button,
 // the title, the status, the folder pane and the frame window itself. The explorer links
-// ListGlueFrame.cpp, which goes through g_pMainFrame; test programs link a stand-in of their own.
+// frame/GridLinkThumbs.cpp, which goes through g_pMainFrame; test programs link a stand-in of their own.
 // Every function copes with a missing frame (there is none outside a call of the LISP function).
 #pragma once
 
