@@ -19,18 +19,7 @@ public:
         g_commands.emplace_back(name, id);
         return true;
     }
-    bool OnUpdateCmdUI(CCmdUI* pCmdUI) override {
-        switch (pCmdUI->m_nID) {
-        case ID_TEST_GREY:
-            pCmdUI->Enable(false);
-            return true;
-        case ID_TEST_CHECK:
-            pCmdUI->SetCheck(1);
-            return true;
-        default:
-            return false;
-        }
-    }
+    bool OnUpdateCmdUI(CCmdUI* pCmdUI) override { return UpdateTestCommand(pCmdUI); }
     void OnInitialUpdate() override {
         ++g_initialUpdates;
         CView::OnInitialUpdate();

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "afxwin.h"
+#include "resource.h"
 
 #include <string>
 #include <vector>
@@ -34,4 +35,18 @@ private:
 
 inline CRect SomeRect() {
     return CRect(10, 10, 310, 210);
+}
+
+// The update handler the test windows share: the grey command is disabled, the check command checked.
+inline bool UpdateTestCommand(CCmdUI* pCmdUI) {
+    switch (pCmdUI->m_nID) {
+    case ID_TEST_GREY:
+        pCmdUI->Enable(false);
+        return true;
+    case ID_TEST_CHECK:
+        pCmdUI->SetCheck(1);
+        return true;
+    default:
+        return false;
+    }
 }

@@ -70,18 +70,7 @@ protected:
         commands.emplace_back(id, code);
         return true;
     }
-    bool OnUpdateCmdUI(CCmdUI* pCmdUI) override {
-        switch (pCmdUI->m_nID) {
-        case ID_TEST_GREY:
-            pCmdUI->Enable(false);
-            return true;
-        case ID_TEST_CHECK:
-            pCmdUI->SetCheck(1);
-            return true;
-        default:
-            return false;
-        }
-    }
+    bool OnUpdateCmdUI(CCmdUI* pCmdUI) override { return UpdateTestCommand(pCmdUI); }
 };
 
 class ReflectingEdit : public CEdit {
