@@ -106,21 +106,9 @@ public:
         if (IsIntegerToken(name) || IsRealToken(name))
             return Fail(L"bad function: " + Excerpt(name));
         call.function.assign(name.begin(), name.end());
-        call.args.clear();
-        for (;;) {
-            SkipSpace();
-            if (AtEnd())
-                return Fail(L"missing ) at the end of the call");
-            if (Peek() == L')') {
-                ++m_pos;
-                break;
-            }
-            LispValue value;
-            if (!ReadValue(value, 0))
-                return false;
-            if (value.kind != LispValue::Kind::Nil)
-                call.args.push_back(std::move(value));
-        }
+        // nil in a call passes no argument, so it is not kept.
+        if (!ReadItems(call.args, 0, L"missing ) at the end of the call", false))
+            return false;
         SkipSpace();
         if (!AtEnd())
             return Fail(L"extra text after the call: " + Excerpt(m_text.substr(m_pos)));
@@ -179,25 +167,32 @@ private:
         return ReadAtom(value);
     }
 
+    // Reads values up to and including the closing parenthesis.
+    bool ReadItems(std::vector<LispValue>& items, int depth, const wchar_t* unclosed, bool keepNil) {
+        items.clear();
+        for (;;) {
+            SkipSpace();
+            if (AtEnd())
+                return Fail(unclosed);
+            if (Peek() == L')') {
+                ++m_pos;
+                return true;
+            }
+            LispValue item;
+            if (!ReadValue(item, depth))
+                return false;
+            if (keepNil || item.kind != LispValue::Kind::Nil)
+                items.push_back(std::move(item));
+        }
+    }
+
     bool ReadList(LispValue& value, int depth) {
         if (depth > kMaxListDepth)
             return Fail(L"lists nested too deeply");
         ++m_pos; // (
         value.kind = LispValue::Kind::List;
-        value.items.clear();
-        for (;;) {
-            SkipSpace();
-            if (AtEnd())
-                return Fail(L"missing ) at the end of a list");
-            if (Peek() == L')') {
-                ++m_pos;
-                break;
-            }
-            LispValue item;
-            if (!ReadValue(item, depth))
-                return false;
-            value.items.push_back(std::move(item));
-        }
+        if (!ReadItems(value.items, depth, L"missing ) at the end of a list", true))
+            return false;
         if (value.items.empty()) // '() is nil
             value.kind = LispValue::Kind::Nil;
         return true;
