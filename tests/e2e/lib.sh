@@ -61,3 +61,22 @@ gen_dwg() {
   mkdir -p "$dir"
   "$WINE_RUN" "$GEN_DWG" "$(winpath "$dir")" "$count" "$@" >/dev/null 2>"$WORK/gen.err"
 }
+
+# The host must take input again after every call: its main frame enabled, the keyboard focus back in
+# its drawing view, and keys typed then reaching that view. HOST_CHECKS are script lines that wait for
+# the call to return and then look; append them to every script (the script goes on after the call).
+HOST_CHECKS=('returned timeout=30000' 'enabled class=DevhostFrame' 'focus' 'type "ok"' 'typed')
+# script_with_host_checks LINE...: writes $WORK/script.txt with the lines, then the host checks.
+script_with_host_checks() { printf '%s\n' "$@" "${HOST_CHECKS[@]}" >"$WORK/script.txt"; }
+# expect_host_usable NAME: the output of a run with HOST_CHECKS shows a host that takes input.
+expect_host_usable() {
+  local name=$1
+  if printf '%s\n' "$OUT" | grep -qx '\[script\] enabled yes' &&
+     printf '%s\n' "$OUT" | grep -qE '^\[script\] focus DevhostDrawingView id=' &&
+     printf '%s\n' "$OUT" | grep -qx '\[script\] typed ok'; then
+    pass "$name: the host takes input again"
+  else
+    fail "$name: the host takes input again"
+    echo "--- got (exit $RC)"; printf '%s\n' "$OUT" | grep -E '^\[script\]|^=>' | tail -8
+  fi
+}
