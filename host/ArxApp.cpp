@@ -2,6 +2,9 @@
 
 #include "host/DataManager.h"
 #include "host/Guard.h"
+#include "host/HostApi.h"
+#include "host/TextConv.h"
+#include "settings/SettingsReport.h"
 
 HINSTANCE g_hOrvexModule = nullptr;
 
@@ -14,5 +17,12 @@ bool CTesselArxApp::InitInstance() {
     g_hOrvexModule = GetModuleHandleA("Orvex1.arx");
     // An exception caught in a window procedure is shown the host's way: command line and alert box.
     AfxSetErrorReporter([](const char* text) { ReportLibraryError("explorer window", text); });
+    // Settings files that cannot be read or saved are said on the host's command line (and alerted).
+    SetSettingsReporter([](const char* text, bool alert) {
+        const std::wstring wide = WidenAnsi(text);
+        acutPrintf(L"%ls", wide.c_str());
+        if (alert)
+            acedAlert(wide.c_str());
+    });
     return SetUp(IDR_MAINFRAME);
 }

@@ -1,81 +1,51 @@
 #include "settings/IniFile.h"
 
+#include "settings/IniFileIo.h"
+#include "settings/SettingsReport.h"
+
+#include <algorithm>
+#include <climits>
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
-#include <sys/stat.h>
+#include <unordered_set>
 #include <utility>
-
-#ifdef _WIN32
-#include <share.h>
-#endif
 
 namespace {
 
-// The line buffer holds 2048 characters with its terminator, so a line may carry at most 2047.
-constexpr int kLineBufferSize = 2048;
+// Line ends on disk.
+constexpr char kLineEnd[] = "\r\n";
 
-// Opens shared for reading and writing by others, without locking.
-std::FILE* OpenShared(const std::string& fileName, const char* mode) {
-#ifdef _WIN32
-    return _fsopen(fileName.c_str(), mode, _SH_DENYNO);
-#else
-    return std::fopen(fileName.c_str(), mode);
-#endif
-}
-
-bool FileExists(const std::string& fileName, bool& isDirectory) {
-#ifdef _WIN32
-    struct _stat64 st;
-    if (_stat64(fileName.c_str(), &st) != 0)
-        return false;
-    isDirectory = (st.st_mode & _S_IFDIR) != 0;
-#else
-    struct stat st;
-    if (::stat(fileName.c_str(), &st) != 0)
-        return false;
-    isDirectory = S_ISDIR(st.st_mode);
-#endif
-    return true;
-}
-
-enum class LineResult { Line, End, TooLong };
-
-// Reads one line without its end. "\r\n" and "\n" both end a line, so files written on any platform
-// read alike; a carriage return anywhere else is an ordinary character. End means nothing was read.
-LineResult ReadLine(std::FILE* file, std::string& line) {
-    line.clear();
-    bool readAnything = false;
-    for (;;) {
-        int c = std::getc(file);
-        if (c == EOF)
-            return readAnything ? LineResult::Line : LineResult::End;
-        readAnything = true;
-        if (c == '\n')
-            return LineResult::Line;
-        if (c == '\r') {
-            int next = std::getc(file);
-            if (next == '\n')
-                return LineResult::Line;
-            if (next != EOF)
-                std::ungetc(next, file);
-        }
-        if (static_cast<int>(line.size()) == kLineBufferSize - 1)
-            return LineResult::TooLong; // the buffer is full and the line goes on
-        line.push_back(static_cast<char>(c));
-    }
-}
-
-void WriteLineEnd(std::FILE* file) {
-    std::fputs("\r\n", file);
-    std::fflush(file);
-}
-
-void WriteText(std::FILE* file, const std::string& text) {
-    if (!text.empty())
-        std::fwrite(text.data(), 1, text.size(), file);
+// The next line of text from pos, without its end; pos moves past the line end. "\r\n" and "\n" both
+// end a line, so files written on any platform read alike; a carriage return anywhere else is an
+// ordinary character.
+std::string NextLine(const std::string& text, std::size_t& pos) {
+    std::size_t end = text.find('\n', pos);
+    std::size_t next = end == std::string::npos ? text.size() : end + 1;
+    if (end == std::string::npos)
+        end = text.size();
+    else if (end > pos && text[end - 1] == '\r')
+        --end;
+    std::string line = text.substr(pos, end - pos);
+    pos = next;
+    return line;
 }
 
 } // namespace
+
+int LenientInt(const std::string& text) {
+    std::size_t i = 0;
+    while (i < text.size() && (text[i] == ' ' || (text[i] >= '\t' && text[i] <= '\r')))
+        ++i;
+    bool negative = false;
+    if (i < text.size() && (text[i] == '+' || text[i] == '-'))
+        negative = text[i++] == '-';
+    long long magnitude = 0;
+    const long long limit = negative ? -static_cast<long long>(INT_MIN) : INT_MAX;
+    for (; i < text.size() && text[i] >= '0' && text[i] <= '9'; ++i)
+        magnitude = std::min(limit, magnitude * 10 + (text[i] - '0'));
+    return static_cast<int>(negative ? -magnitude : magnitude);
+}
 
 CIniFile::key& CIniFile::key::operator=(const key& other) {
     if (this == &other)
@@ -96,21 +66,39 @@ void CIniFile::SetPath(std::string newPath) {
 }
 
 bool CIniFile::ReadFile() {
-    bool isDirectory = false;
-    if (!FileExists(path, isDirectory))
+    std::string text;
+    switch (ReadWholeFile(path, kMaxIniFileBytes, text)) {
+    case WholeFileRead::Read:
+        break;
+    case WholeFileRead::Missing:
         return false;
-
-    // A directory cannot be opened as a file on Windows; other systems would open it, so refuse it here.
-    std::FILE* file = isDirectory ? nullptr : OpenShared(path, "rb");
-    if (!file) {
+    case WholeFileRead::TooLarge:
+        error = "Ini file is larger than 1 MiB.";
+        LeaveFileAlone("it is larger than 1 MiB");
+        ReportSettingsProblem("\nOrvex: " + path + " is larger than 1 MiB; it was not read\n");
+        return false;
+    case WholeFileRead::CannotOpen:
+    case WholeFileRead::Failed:
         error = "Unable to open ini file.";
+        LeaveFileAlone("it could not be read");
         return false;
     }
 
+    // Positions given a value by this file: a second line for one of them replaces the first, which a
+    // save would then lose.
+    std::unordered_set<std::uint64_t> fromThisFile;
+    std::string keepWhy;
     std::string keyname;
-    std::string line;
-    LineResult result;
-    while ((result = ReadLine(file, line)) == LineResult::Line) {
+    std::size_t pos = 0;
+    for (int lineNumber = 1; pos < text.size(); ++lineNumber) {
+        std::string line = NextLine(text, pos);
+        if (line.size() > static_cast<std::size_t>(kMaxIniLineChars)) {
+            // The line and the rest of the file are not taken.
+            if (keepWhy.empty())
+                keepWhy = "line " + std::to_string(lineNumber) + " is longer than " +
+                          std::to_string(kMaxIniLineChars) + " characters";
+            break;
+        }
         if (line.empty())
             continue;
         if (line.front() == '[' && line.back() == ']') {
@@ -124,40 +112,75 @@ bool CIniFile::ReadFile() {
             continue;
         }
         // Without "=" the name is empty and the value is the line less its first character; files in
-        // use rely on this reading, so it stays.
+        // use rely on this reading, so it stays. Saving would write the line otherwise.
         std::string::size_type eq = line.find('=');
+        if (eq == std::string::npos && keepWhy.empty())
+            keepWhy = "line " + std::to_string(lineNumber) + " is neither a [section] nor a name=value line";
         std::string valuename = eq == std::string::npos ? std::string() : line.substr(0, eq);
         std::string value = line.substr(valuename.size() + 1);
-        SetValue(keyname, std::move(valuename), std::move(value), true);
+        const Position at = Place(keyname, std::move(valuename), true);
+        keys[at.key].values[at.value] = std::move(value);
+        const std::uint64_t atBits =
+            (static_cast<std::uint64_t>(at.key) << 32) | static_cast<std::uint32_t>(at.value);
+        if (!fromThisFile.insert(atBits).second && keepWhy.empty())
+            keepWhy = "line " + std::to_string(lineNumber) + " repeats a name of its section";
     }
 
-    std::fclose(file);
+    if (!keepWhy.empty())
+        LeaveFileAlone(keepWhy);
+    else if (m_strLeaveAlone == path)
+        m_strLeaveAlone.clear(); // read whole this time
     return true;
 }
 
-void CIniFile::WriteFile() {
-    std::FILE* file = OpenShared(path, "wb");
-    if (!file)
-        return;
+void CIniFile::LeaveFileAlone(const std::string& why) {
+    m_strLeaveAlone = path;
+    m_strLeaveAloneWhy = why;
+}
 
+bool CIniFile::WriteFile() {
+    if (!m_strLeaveAlone.empty() && m_strLeaveAlone == path) {
+        ReportSettingsProblem("\nOrvex: " + path + " was not saved: " + m_strLeaveAloneWhy +
+                              "; the file is left as it was\n");
+        return false;
+    }
+
+    if (path.empty()) {
+        ReportSettingsProblem("\nOrvex: settings were not saved: the file has no name\n");
+        return false;
+    }
+
+    std::string text;
     for (int k = 0; k < keys.GetSize(); ++k) {
         const key& section = keys[k];
         if (section.names.GetSize() == 0)
             continue;
-        WriteText(file, "[" + names[k] + "]");
-        WriteLineEnd(file);
+        text += "[" + names[k] + "]" + kLineEnd;
         for (int j = 0; j < section.names.GetSize(); ++j) {
-            WriteText(file, section.names[j] + "=" + section.values[j]);
-            WriteLineEnd(file);
+            text += section.names[j];
+            text += '=';
+            text += section.values[j];
+            text += kLineEnd;
         }
-        WriteLineEnd(file);
+        text += kLineEnd;
     }
-    std::fclose(file);
+
+    std::string reason;
+    if (!ReplaceWholeFile(path, text, reason)) {
+        ReportSettingsProblem("\nOrvex: " + path + " was not saved: " + reason +
+                              "; the file is left as it was\n");
+        return false;
+    }
+    return true;
 }
 
 void CIniFile::Reset() {
     keys.RemoveAll();
     names.RemoveAll();
+    m_keyIndex.clear();
+    m_valueIndex.clear();
+    m_strLeaveAlone.clear();
+    m_strLeaveAloneWhy.clear();
 }
 
 int CIniFile::GetNumKeys() const {
@@ -171,23 +194,40 @@ int CIniFile::GetNumValues(std::string keyname) const {
     return keys[keynum].names.GetSize();
 }
 
-int CIniFile::FindKey(std::string keyname) const {
-    for (int k = 0; k < names.GetSize(); ++k) {
-        if (names[k] == keyname)
-            return k;
+void CIniFile::IndexNames(const CArray<std::string>& arrayNames, PositionIndex& index) {
+    index.clear();
+    index.reserve(static_cast<std::size_t>(arrayNames.GetSize()));
+    for (int i = 0; i < arrayNames.GetSize(); ++i)
+        index.emplace(arrayNames[i], i); // a repeated name keeps its first position, as a search would
+}
+
+int CIniFile::Find(const CArray<std::string>& arrayNames, PositionIndex& index, const std::string& name) {
+    // The member functions keep every name unique and indexed, so the sizes agree; if they do not, or
+    // a hit points elsewhere, the arrays were changed directly and the index is built again.
+    if (index.size() != static_cast<std::size_t>(arrayNames.GetSize()))
+        IndexNames(arrayNames, index);
+    auto found = index.find(name);
+    if (found != index.end() &&
+        (found->second >= arrayNames.GetSize() || arrayNames[found->second] != name)) {
+        IndexNames(arrayNames, index);
+        found = index.find(name);
     }
-    return -1;
+    return found == index.end() ? -1 : found->second;
+}
+
+int CIniFile::FindKey(std::string keyname) const {
+    if (m_valueIndex.size() != static_cast<std::size_t>(keys.GetSize()))
+        m_valueIndex.assign(static_cast<std::size_t>(keys.GetSize()), PositionIndex());
+    return Find(names, m_keyIndex, keyname);
 }
 
 int CIniFile::FindValue(int keynum, std::string valuename) const {
     if (keynum == -1)
         return -1;
-    const key& section = keys[keynum];
-    for (int j = 0; j < section.names.GetSize(); ++j) {
-        if (section.names[j] == valuename)
-            return j;
-    }
-    return -1;
+    const key& section = keys[keynum]; // throws for a position outside the array
+    if (m_valueIndex.size() != static_cast<std::size_t>(keys.GetSize()))
+        m_valueIndex.assign(static_cast<std::size_t>(keys.GetSize()), PositionIndex());
+    return Find(section.names, m_valueIndex[static_cast<std::size_t>(keynum)], valuename);
 }
 
 std::string CIniFile::GetValue(std::string keyname, std::string valuename) {
@@ -205,36 +245,50 @@ std::string CIniFile::GetValue(std::string keyname, std::string valuename) {
 }
 
 int CIniFile::GetValueI(std::string keyname, std::string valuename) {
-    return std::atoi(GetValue(std::move(keyname), std::move(valuename)).c_str());
+    return LenientInt(GetValue(std::move(keyname), std::move(valuename)));
 }
 
 double CIniFile::GetValueF(std::string keyname, std::string valuename) {
     return std::atof(GetValue(std::move(keyname), std::move(valuename)).c_str());
 }
 
+template <class T> void CIniFile::GrowTo(CArray<T>& array, int size) {
+    array.SetSize(size, std::max(array.GetSize(), 4));
+}
+
+CIniFile::Position CIniFile::Place(std::string keyname, std::string valuename, bool create) {
+    Position at;
+    at.key = FindKey(keyname);
+    if (at.key == -1) {
+        if (!create)
+            return Position();
+        at.key = names.GetSize();
+        GrowTo(keys, at.key + 1);
+        GrowTo(names, at.key + 1);
+        names[at.key] = keyname;
+        m_keyIndex.emplace(std::move(keyname), at.key);
+        m_valueIndex.emplace_back();
+    }
+
+    at.value = FindValue(at.key, valuename);
+    if (at.value == -1) {
+        if (!create)
+            return Position();
+        key& section = keys[at.key];
+        at.value = section.names.GetSize();
+        GrowTo(section.names, at.value + 1);
+        GrowTo(section.values, at.value + 2);
+        section.names[at.value] = valuename;
+        m_valueIndex[static_cast<std::size_t>(at.key)].emplace(std::move(valuename), at.value);
+    }
+    return at;
+}
+
 bool CIniFile::SetValue(std::string keyname, std::string valuename, std::string value, bool create) {
-    int keynum = FindKey(keyname);
-    if (keynum == -1) {
-        if (!create)
-            return false;
-        keys.SetSize(keys.GetSize() + 1);
-        names.SetSize(names.GetSize() + 1);
-        keynum = names.GetSize() - 1;
-        names[keynum] = std::move(keyname);
-    }
-
-    int valuenum = FindValue(keynum, valuename);
-    if (valuenum == -1) {
-        if (!create)
-            return false;
-        key& section = keys[keynum];
-        section.names.SetSize(section.names.GetSize() + 1);
-        section.values.SetSize(section.names.GetSize() + 1);
-        valuenum = section.names.GetSize() - 1;
-        section.names[valuenum] = std::move(valuename);
-    }
-
-    keys[keynum].values[valuenum] = std::move(value);
+    const Position at = Place(std::move(keyname), std::move(valuename), create);
+    if (at.value == -1)
+        return false;
+    keys[at.key].values[at.value] = std::move(value);
     return true;
 }
 
@@ -260,6 +314,12 @@ bool CIniFile::DeleteValue(std::string keyname, std::string valuename) {
     key& section = keys[keynum];
     section.names.RemoveAt(valuenum);
     section.values.RemoveAt(valuenum);
+    PositionIndex& index = m_valueIndex[static_cast<std::size_t>(keynum)];
+    index.erase(valuename);
+    for (auto& entry : index) {
+        if (entry.second > valuenum)
+            --entry.second;
+    }
     return true;
 }
 
@@ -269,5 +329,11 @@ bool CIniFile::DeleteKey(std::string keyname) {
         return false;
     keys.RemoveAt(keynum);
     names.RemoveAt(keynum);
+    m_valueIndex.erase(m_valueIndex.begin() + keynum);
+    m_keyIndex.erase(keyname);
+    for (auto& entry : m_keyIndex) {
+        if (entry.second > keynum)
+            --entry.second;
+    }
     return true;
 }

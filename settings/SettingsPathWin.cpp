@@ -2,22 +2,29 @@
 
 #include <windows.h>
 
-#include <stdlib.h>
+#include <vector>
+
+namespace {
+
+// The module's whole file name, however long: the length is checked after, not cut by the buffer.
+std::string ModuleFileName(HMODULE hModule) {
+    std::vector<char> buffer(kSettingsFileNameSize);
+    for (;;) {
+        const DWORD length = GetModuleFileNameA(hModule, buffer.data(), static_cast<DWORD>(buffer.size()));
+        if (length == 0)
+            return "";
+        if (length < buffer.size() || buffer.size() >= 32768)
+            return std::string(buffer.data(), length);
+        buffer.resize(buffer.size() * 2);
+    }
+}
+
+} // namespace
 
 void GetSettingsFileName(char* pszFileName) {
     // When the module is loaded under another name the handle is null and the host's own executable
     // names the file instead; that is how it has always behaved.
-    HMODULE hModule = GetModuleHandleA(kSettingsModuleName);
-    char szModule[kSettingsFileNameSize] = "";
-    GetModuleFileNameA(hModule, szModule, kSettingsFileNameSize);
-    szModule[kSettingsFileNameSize - 1] = '\0';
-
-    char szDrive[_MAX_DRIVE];
-    char szDir[_MAX_DIR];
-    char szName[_MAX_FNAME];
-    char szExt[_MAX_EXT];
-    _splitpath(szModule, szDrive, szDir, szName, szExt);
-    _makepath(pszFileName, szDrive, szDir, szName, "ini");
+    FormSettingsFileName(ModuleFileName(GetModuleHandleA(kSettingsModuleName)), pszFileName);
 }
 
 std::string ExplorerSettingsPath() {

@@ -2,8 +2,6 @@
 
 #include "settings/SettingsPath.h"
 
-#include <cstdlib>
-
 CTessel3Doc* g_pTessel3Doc = nullptr;
 
 namespace {
@@ -35,23 +33,27 @@ CTessel3Doc::~CTessel3Doc() {
 }
 
 void CTessel3Doc::Load(const std::string& settingsFile) {
+    // No name: the settings file could not be named (that has been reported); defaults, nothing saved.
+    m_bSaveOnClose = !settingsFile.empty();
     m_IniFile.SetPath(settingsFile);
-    if (m_IniFile.ReadFile()) {
+    if (m_bSaveOnClose && m_IniFile.ReadFile()) {
         m_strPath = m_IniFile.GetValue(kSectionCurrentPath, "Path");
         m_strName = m_IniFile.GetValue(kSectionCurrentPath, "Name");
         m_strShellPath = m_IniFile.GetValue(kSectionCurrentPath, "ShellPath");
-        m_nSplitterSize = std::atoi(m_IniFile.GetValue(kSectionSize, "SplitterSize").c_str());
-        m_nWindowWidth = std::atoi(m_IniFile.GetValue(kSectionSize, "WindowWidth").c_str());
-        m_nWindowHeight = std::atoi(m_IniFile.GetValue(kSectionSize, "WindowHeight").c_str());
-        m_nPictureWidth = std::atoi(m_IniFile.GetValue(kSectionView, "PictureWidth").c_str());
-        m_nPictureHeight = std::atoi(m_IniFile.GetValue(kSectionView, "PictureHeight").c_str());
-        m_nSort = std::atoi(m_IniFile.GetValue(kSectionView, "Sort").c_str());
+        m_nSplitterSize = LenientInt(m_IniFile.GetValue(kSectionSize, "SplitterSize"));
+        m_nWindowWidth = LenientInt(m_IniFile.GetValue(kSectionSize, "WindowWidth"));
+        m_nWindowHeight = LenientInt(m_IniFile.GetValue(kSectionSize, "WindowHeight"));
+        m_nPictureWidth = LenientInt(m_IniFile.GetValue(kSectionView, "PictureWidth"));
+        m_nPictureHeight = LenientInt(m_IniFile.GetValue(kSectionView, "PictureHeight"));
+        m_nSort = LenientInt(m_IniFile.GetValue(kSectionView, "Sort"));
     }
     if (m_nSplitterSize == 0)
         m_nSplitterSize = kDefaultSplitterSize;
 }
 
 void CTessel3Doc::Save() {
+    if (!m_bSaveOnClose)
+        return;
     m_IniFile.SetValue(kSectionCurrentPath, "Path", m_strPath, true);
     m_IniFile.SetValue(kSectionCurrentPath, "Name", m_strName, true);
     m_IniFile.SetValue(kSectionCurrentPath, "ShellPath", m_strShellPath, true);

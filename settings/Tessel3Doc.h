@@ -10,11 +10,13 @@
 
 class CTessel3Doc : public CDocument {
 public:
-    // Loads the settings file beside the extension module (ExplorerSettingsPath).
+    // Loads the settings file beside the extension module (ExplorerSettingsPath); an empty name (the
+    // module's folder is too long) gives the defaults and saves nothing.
     CTessel3Doc();
     // Loads the given settings file.
     explicit CTessel3Doc(const std::string& settingsFile);
-    // Saves the fields into the file; a file that cannot be written is passed over silently.
+    // Saves the fields into the file. A file that cannot be written, or that was not read whole (too
+    // large, a line too long, unreadable), is left as it was, and the reporter says so.
     ~CTessel3Doc() override;
 
     std::string m_strPath;      // current folder of the browser          [CurrentPath] Path
@@ -29,6 +31,8 @@ public:
 
     // Kept for the document's lifetime so keys the explorer does not know survive the save.
     CIniFile m_IniFile;
+    // False when the settings file could not be named: the explorer then runs with defaults only.
+    bool m_bSaveOnClose = true;
 
 private:
     void Load(const std::string& settingsFile);

@@ -2,13 +2,17 @@
 
 #include "settings/SettingsPath.h"
 
+#include "ReportedMessages.h"
 #include "TempDir.h"
 
 #include <gtest/gtest.h>
 
+#include <climits>
 #include <filesystem>
 #include <memory>
+#include <random>
 #include <string>
+#include <vector>
 
 namespace {
 
@@ -228,3 +232,150 @@ TEST_F(Tessel3DocTest, DefaultConstructorUsesTheSettingsFileBesideTheModule) {
     EXPECT_EQ(ReadBytes(fileName), kFreshFile);
     std::filesystem::remove(fileName, ec);
 }
+
+// --- settings files a careless or hostile user could leave ---
+
+namespace {
+
+class Tessel3DocGuardTest : public Tessel3DocTest {
+protected:
+    // The document reads the file and is closed with changed settings; the file must come out as it
+    // went in, and the reporter must have said so once.
+    void ExpectSurvivesAClose(const std::string& text, const std::string& why) {
+        std::string fileName = m_dir.File("Orvex1.ini");
+        WriteBytes(fileName, text);
+        {
+            std::unique_ptr<CTessel3Doc> doc;
+            ASSERT_NO_THROW(doc = std::make_unique<CTessel3Doc>(fileName));
+            doc->m_strPath = "C:\\changed\\";
+            doc->m_nSort = 2;
+            EXPECT_NO_THROW(doc.reset());
+        }
+        EXPECT_EQ(ReadBytes(fileName), text);
+        const std::vector<std::string> texts = m_reported.Texts();
+        ASSERT_FALSE(texts.empty());
+        EXPECT_EQ(texts.back(),
+                  "\nOrvex: " + fileName + " was not saved: " + why + "; the file is left as it was\n");
+    }
+
+    ReportedMessages m_reported;
+};
+
+} // namespace
+
+TEST_F(Tessel3DocGuardTest, LineOf3000CharactersSurvivesAClose) {
+    ExpectSurvivesAClose("[CurrentPath]\r\nPath=C:\\dwg\\\r\nName=" + std::string(3000, 'n') +
+                             "\r\n\r\n[View]\r\nSort=1\r\n",
+                         "line 3 is longer than 2047 characters");
+}
+
+TEST_F(Tessel3DocGuardTest, BinaryGarbageSurvivesAClose) {
+    std::mt19937 rng(2024);
+    std::string text(20000, '\0');
+    for (char& c : text)
+        c = static_cast<char>(rng() & 0xFF);
+    text = "[View]\r\nSort=1\r\n" + text;
+    std::string fileName = m_dir.File("Orvex1.ini");
+    WriteBytes(fileName, text);
+    {
+        CTessel3Doc doc(fileName);
+        EXPECT_EQ(doc.m_nSort, 1); // what could be read is used
+    }
+    EXPECT_EQ(ReadBytes(fileName), text);
+    ASSERT_EQ(m_reported.Texts().size(), 1u);
+    EXPECT_NE(m_reported.Texts()[0].find(" was not saved: line "), std::string::npos)
+        << m_reported.Texts()[0];
+}
+
+TEST_F(Tessel3DocGuardTest, OverSizeFileGivesDefaultsAndSurvivesAClose) {
+    std::string text = "[View]\r\nSort=2\r\n[Filler]\r\n";
+    for (int i = 0; text.size() <= kMaxIniFileBytes; ++i)
+        text += "f" + std::to_string(i) + "=" + std::string(40, 'x') + "\r\n";
+    std::string fileName = m_dir.File("Orvex1.ini");
+    WriteBytes(fileName, text);
+    {
+        CTessel3Doc doc(fileName);
+        ExpectDefaults(doc);
+        doc.m_nSort = 1;
+    }
+    EXPECT_EQ(ReadBytes(fileName), text);
+    EXPECT_EQ(m_reported.Texts(),
+              (std::vector<std::string>{
+                  "\nOrvex: " + fileName + " is larger than 1 MiB; it was not read\n",
+                  "\nOrvex: " + fileName +
+                      " was not saved: it is larger than 1 MiB; the file is left as it was\n"}));
+}
+
+TEST_F(Tessel3DocGuardTest, ReadOnlyFileIsUsedAndLeftAsItWas) {
+    std::string fileName = m_dir.File("Orvex1.ini");
+    const std::string text = "[View]\r\nSort=2\r\n\r\n";
+    WriteBytes(fileName, text);
+    std::filesystem::permissions(fileName,
+                                 std::filesystem::perms::owner_write | std::filesystem::perms::group_write |
+                                     std::filesystem::perms::others_write,
+                                 std::filesystem::perm_options::remove);
+    {
+        CTessel3Doc doc(fileName);
+        EXPECT_EQ(doc.m_nSort, 2);
+        doc.m_nSort = 0;
+    }
+    EXPECT_EQ(ReadBytes(fileName), text);
+    EXPECT_EQ(m_reported.Texts(),
+              std::vector<std::string>{"\nOrvex: " + fileName +
+                                       " was not saved: it is read-only; the file is left as it was\n"});
+    std::filesystem::permissions(fileName, std::filesystem::perms::owner_write,
+                                 std::filesystem::perm_options::add);
+}
+
+TEST_F(Tessel3DocGuardTest, HugeAndNegativeNumbersStayInsideTheIntRange) {
+    std::string fileName = m_dir.File("Orvex1.ini");
+    WriteBytes(fileName,
+               "[Size]\r\nSplitterSize=99999999999999999999\r\nWindowWidth=-99999999999999999999\r\n"
+               "WindowHeight=-1\r\n\r\n[View]\r\nPictureWidth=2147483648\r\nPictureHeight=-2147483648\r\n"
+               "Sort=-7\r\n\r\n");
+    CTessel3Doc doc(fileName);
+    EXPECT_EQ(doc.m_nSplitterSize, INT_MAX);
+    EXPECT_EQ(doc.m_nWindowWidth, INT_MIN);
+    EXPECT_EQ(doc.m_nWindowHeight, -1);
+    EXPECT_EQ(doc.m_nPictureWidth, INT_MAX);
+    EXPECT_EQ(doc.m_nPictureHeight, INT_MIN);
+    EXPECT_EQ(doc.m_nSort, -7);
+}
+
+TEST_F(Tessel3DocGuardTest, NoSettingsFileNameGivesDefaultsAndSavesNothing) {
+    const auto before = std::filesystem::current_path();
+    {
+        CTessel3Doc doc{std::string()};
+        ExpectDefaults(doc);
+        doc.m_nSort = 1;
+    }
+    EXPECT_TRUE(m_reported.All().empty());
+    EXPECT_EQ(std::filesystem::current_path(), before);
+}
+
+#ifndef _WIN32
+// Natively the settings file lies in the current directory: one too deep for the 260-character name
+// is refused with an alert, and the explorer runs on defaults and writes nothing there.
+TEST_F(Tessel3DocGuardTest, TooLongAFolderGivesDefaultsAnAlertAndNoFile) {
+    std::filesystem::path deep = m_dir.Dir();
+    while (deep.string().size() < 300)
+        deep /= "a-rather-long-folder-name";
+    std::filesystem::create_directories(deep);
+    const auto before = std::filesystem::current_path();
+    std::filesystem::current_path(deep);
+    {
+        CTessel3Doc doc;
+        ExpectDefaults(doc);
+        EXPECT_EQ(doc.m_IniFile.path, "");
+        doc.m_nSort = 2;
+    }
+    std::filesystem::current_path(before);
+    EXPECT_TRUE(std::filesystem::is_empty(deep));
+    const std::vector<ReportedMessage> messages = m_reported.All();
+    ASSERT_EQ(messages.size(), 1u);
+    EXPECT_TRUE(messages[0].alert);
+    EXPECT_EQ(messages[0].text.rfind("\nOrvex: the library's folder is too long for its settings file (", 0),
+              0u)
+        << messages[0].text;
+}
+#endif
