@@ -8,6 +8,8 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
+#include <mutex>
+#include <set>
 #include <unordered_set>
 #include <utility>
 
@@ -29,6 +31,19 @@ std::string NextLine(const std::string& text, std::size_t& pos) {
     std::string line = text.substr(pos, end - pos);
     pos = next;
     return line;
+}
+
+// One explorer run reads a folder's datains.ini several times (the layer label, the result list);
+// one line on the command line per file and size says it.
+void ReportTooLargeOnce(const std::string& fileName, unsigned long long size) {
+    static std::mutex mutex;
+    static std::set<std::pair<std::string, unsigned long long>> reported;
+    {
+        std::lock_guard<std::mutex> lock(mutex);
+        if (!reported.emplace(fileName, size).second)
+            return;
+    }
+    ReportSettingsProblem("\nOrvex: " + fileName + " is larger than 1 MiB; it was not read\n");
 }
 
 } // namespace
@@ -67,7 +82,8 @@ void CIniFile::SetPath(std::string newPath) {
 
 bool CIniFile::ReadFile() {
     std::string text;
-    switch (ReadWholeFile(path, kMaxIniFileBytes, text)) {
+    unsigned long long size = 0;
+    switch (ReadWholeFile(path, kMaxIniFileBytes, text, &size)) {
     case WholeFileRead::Read:
         break;
     case WholeFileRead::Missing:
@@ -75,7 +91,7 @@ bool CIniFile::ReadFile() {
     case WholeFileRead::TooLarge:
         error = "Ini file is larger than 1 MiB.";
         LeaveFileAlone("it is larger than 1 MiB");
-        ReportSettingsProblem("\nOrvex: " + path + " is larger than 1 MiB; it was not read\n");
+        ReportTooLargeOnce(path, size);
         return false;
     case WholeFileRead::CannotOpen:
     case WholeFileRead::Failed:

@@ -16,7 +16,9 @@ enum class WholeFileRead {
 
 // Reads the file into bytes when it holds at most maxBytes. Opened shared for reading, writing and
 // deleting, so a reader never stops a writer; only regular files are read (a pipe would block).
-WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, std::string& bytes);
+// fileSize, when given, receives the size of a file refused as TooLarge.
+WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, std::string& bytes,
+                            unsigned long long* fileSize = nullptr);
 
 // Writes bytes to a temporary file beside fileName and moves it over fileName. On failure returns
 // false with the reason in a few words ("it is read-only", "the disk is full", ...): the file is as it

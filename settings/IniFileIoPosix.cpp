@@ -1,6 +1,7 @@
 // Portable build: POSIX files; rename() replaces the target in one step.
 #include "settings/IniFileIo.h"
 
+#include <algorithm>
 #include <atomic>
 #include <cerrno>
 #include <cstdio>
@@ -41,7 +42,8 @@ std::string TemporaryFileBeside(const std::string& fileName, unsigned long proce
     return fileName + "." + std::to_string(processId) + "-" + std::to_string(callNumber) + ".tmp";
 }
 
-WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, std::string& bytes) {
+WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, std::string& bytes,
+                            unsigned long long* fileSize) {
     struct stat st;
     if (::stat(fileName.c_str(), &st) != 0)
         return WholeFileRead::Missing;
@@ -81,6 +83,8 @@ WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, s
             result = WholeFileRead::TooLarge;
     }
     ::close(fd);
+    if (result == WholeFileRead::TooLarge && fileSize)
+        *fileSize = std::max<unsigned long long>(static_cast<unsigned long long>(st.st_size), bytes.size());
     if (result != WholeFileRead::Read)
         bytes.clear();
     return result;

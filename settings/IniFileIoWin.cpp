@@ -91,7 +91,8 @@ std::string TemporaryFileBeside(const std::string& fileName, unsigned long proce
     return fileName + "." + std::to_string(processId) + "-" + std::to_string(callNumber) + ".tmp";
 }
 
-WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, std::string& bytes) {
+WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, std::string& bytes,
+                            unsigned long long* fileSize) {
     const DWORD attributes = ::GetFileAttributesA(fileName.c_str());
     if (attributes == INVALID_FILE_ATTRIBUTES)
         return WholeFileRead::Missing;
@@ -107,6 +108,8 @@ WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, s
     LARGE_INTEGER size;
     if (!::GetFileSizeEx(file.Get(), &size))
         return WholeFileRead::Failed;
+    if (fileSize)
+        *fileSize = static_cast<unsigned long long>(size.QuadPart);
     if (static_cast<unsigned long long>(size.QuadPart) > maxBytes)
         return WholeFileRead::TooLarge;
 
@@ -129,6 +132,8 @@ WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, s
         done += n;
     }
     if (done > maxBytes) {
+        if (fileSize)
+            *fileSize = done;
         bytes.clear();
         return WholeFileRead::TooLarge;
     }

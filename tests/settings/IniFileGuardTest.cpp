@@ -97,6 +97,22 @@ TEST_F(IniGuardTest, FileOneByteOver1MiBIsRefusedAndSaidOnce) {
                   {"\nOrvex: " + fileName + " is larger than 1 MiB; it was not read\n", false}}));
 }
 
+TEST_F(IniGuardTest, OverSizeFileReadAgainIsSaidOnlyOnce) {
+    std::string fileName = m_dir.File("datains.ini");
+    WriteBytes(fileName, IniOfSize(kMaxIniFileBytes + 100));
+    for (int i = 0; i < 3; ++i) {
+        CIniFile ini(fileName);
+        EXPECT_FALSE(ini.ReadFile());
+    }
+    EXPECT_EQ(m_reported.Texts(),
+              std::vector<std::string>{"\nOrvex: " + fileName + " is larger than 1 MiB; it was not read\n"});
+    // Grown further, it is news again.
+    WriteBytes(fileName, IniOfSize(kMaxIniFileBytes + 200));
+    CIniFile ini(fileName);
+    EXPECT_FALSE(ini.ReadFile());
+    EXPECT_EQ(m_reported.Texts().size(), 2u);
+}
+
 TEST_F(IniGuardTest, ThreeHundredThousandKeysAreRefusedAndTheFileIsNeverWrittenOver) {
     std::string fileName = m_dir.File("datains.ini");
     std::string text = "[Default Parameters]\r\nLayer=Walls\r\nColor=3\r\n";
