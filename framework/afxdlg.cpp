@@ -20,6 +20,8 @@ INT_PTR CALLBACK AfxDlgProc(HWND hwnd, UINT message, WPARAM wParam, LPARAM lPara
         result = pDlg->OnInitDialog() ? TRUE : FALSE;
     } catch (...) {
         AfxReportCurrentException();
+        // A dialog that failed to initialise is not left standing half made: a modal run ends at once.
+        pDlg->EndDialog(-1);
     }
     pDlg->m_current = saved;
     return result;
@@ -51,16 +53,20 @@ INT_PTR CDialog::DoModal() {
     if (m_hWnd || m_bModalRunning)
         return -1;
     HWND owner = OwnerWindow();
+    // Whether the owner takes input is read before the dialog exists: its initialisation may disable the
+    // owner itself (the explorer disables the host's frame), and the owner gets back what it had.
+    const bool ownerWasEnabled = owner && ::IsWindowEnabled(owner);
     m_nModalResult = -1;
     m_bModalRunning = true; // EndDialog inside OnInitDialog must already end the run
     HWND hwnd = ::CreateDialogParamA(AfxGetResourceHandle(), MAKEINTRESOURCEA(m_nIDTemplate), owner,
                                      AfxDlgProc, reinterpret_cast<LPARAM>(this));
     if (!hwnd) {
         m_bModalRunning = false;
+        if (ownerWasEnabled)
+            ::EnableWindow(owner, TRUE);
         return -1;
     }
-    const bool disableOwner = owner && ::IsWindowEnabled(owner);
-    if (disableOwner)
+    if (ownerWasEnabled)
         ::EnableWindow(owner, FALSE);
     if (m_bModalRunning && m_hWnd)
         ::ShowWindow(m_hWnd, SW_SHOWNORMAL);
@@ -108,7 +114,7 @@ INT_PTR CDialog::DoModal() {
     m_bModalRunning = false;
 
     // The owner takes the activation back before the dialog goes away, so it does not flash behind.
-    if (disableOwner)
+    if (ownerWasEnabled)
         ::EnableWindow(owner, TRUE);
     if (m_hWnd) {
         if (owner && ::GetActiveWindow() == m_hWnd)

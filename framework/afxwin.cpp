@@ -216,17 +216,35 @@ void CWnd::Unbind() {
     m_hWnd = nullptr;
 }
 
-LRESULT CWnd::DispatchGuarded(UINT message, WPARAM wParam, LPARAM lParam) {
-    CurrentMessage saved = m_current;
+LRESULT AfxFailureResult(UINT message) {
+    switch (message) {
+    case WM_NCCREATE:
+        return FALSE;
+    case WM_CREATE:
+        return -1;
+    default:
+        return 0;
+    }
+}
+
+LRESULT CWnd::DispatchGuarded(UINT message, WPARAM wParam, LPARAM lParam, bool& objectGone) {
+    const CurrentMessage saved = m_current;
     m_current = {message, wParam, lParam};
+    Dispatch dispatch;
+    dispatch.outer = m_pDispatch;
+    m_pDispatch = &dispatch;
     LRESULT result = 0;
     try {
         result = WindowProc(message, wParam, lParam);
     } catch (...) {
         AfxReportCurrentException();
-        result = 0;
+        result = AfxFailureResult(message);
     }
-    m_current = saved;
+    objectGone = dispatch.objectGone;
+    if (!objectGone) { // else `this` is freed memory: nothing more may be written into it
+        m_pDispatch = dispatch.outer;
+        m_current = saved;
+    }
     return result;
 }
 
@@ -243,8 +261,9 @@ LRESULT CALLBACK AfxWndProc(HWND hwnd, UINT message, WPARAM wParam, LPARAM lPara
     if (!pWnd) // messages before WM_NCCREATE, or a window created without an object
         return ::DefWindowProcA(hwnd, message, wParam, lParam);
 
-    LRESULT result = pWnd->DispatchGuarded(message, wParam, lParam);
-    if (message == WM_NCDESTROY) {
+    bool objectGone = false;
+    LRESULT result = pWnd->DispatchGuarded(message, wParam, lParam, objectGone);
+    if (message == WM_NCDESTROY && !objectGone) {
         pWnd->Unbind();
         try {
             pWnd->PostNcDestroy(); // may delete the object
@@ -258,6 +277,9 @@ LRESULT CALLBACK AfxWndProc(HWND hwnd, UINT message, WPARAM wParam, LPARAM lPara
 // ---- CWnd -------------------------------------------------------------------------------------------
 
 CWnd::~CWnd() {
+    // Messages still being handled for this object (it was deleted from inside one) must not touch it.
+    for (Dispatch* dispatch = m_pDispatch; dispatch; dispatch = dispatch->outer)
+        dispatch->objectGone = true;
     if (m_hWnd && m_bBound) {
         // The derived parts are gone already: the window's last messages get the base handling.
         ::DestroyWindow(m_hWnd);

@@ -276,12 +276,25 @@ private:
     friend class CDialog;
     void Bind(HWND hwnd);
     void Unbind();
-    LRESULT DispatchGuarded(UINT message, WPARAM wParam, LPARAM lParam);
+    // One message being handled by this object. Handlers nest (a message sent while another is handled),
+    // and any of them may destroy the window and with it an object that deletes itself in PostNcDestroy:
+    // the destructor marks every open dispatch, and a marked one touches the object no more.
+    struct Dispatch {
+        Dispatch* outer = nullptr;
+        bool objectGone = false;
+    };
+    // Handles one message; `objectGone` is set when the object was deleted while handling it.
+    LRESULT DispatchGuarded(UINT message, WPARAM wParam, LPARAM lParam, bool& objectGone);
 
     WNDPROC m_pfnSuper = nullptr; // the procedure Default() calls: DefWindowProc or the original one
     bool m_bBound = false;
     CurrentMessage m_current;
+    Dispatch* m_pDispatch = nullptr; // the innermost message being handled, or nullptr
 };
+
+// What a window procedure answers for a message whose handler threw: creation fails (WM_NCCREATE FALSE,
+// WM_CREATE -1); every other message gets 0, the answer of "not handled" for nearly all of them.
+LRESULT AfxFailureResult(UINT message);
 
 LRESULT CALLBACK AfxWndProc(HWND hwnd, UINT message, WPARAM wParam, LPARAM lParam);
 

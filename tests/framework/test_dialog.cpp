@@ -215,14 +215,53 @@ TEST(Dialog, TheFirstWindowThatTakesTheMessageEndsTheWalk) {
     EXPECT_EQ(dlg.edit.keysSeen, 0);
 }
 
-TEST(Dialog, ExceptionInOnInitDialogIsReportedAndTheDialogRuns) {
+TEST(Dialog, ExceptionInOnInitDialogIsReportedAndEndsTheModalRun) {
     ReportCapture capture;
     ReportCapture::Reports().clear();
+    IdleCounter owner;
+    ASSERT_TRUE(owner.CreateEx(0, nullptr, "owner", WS_OVERLAPPEDWINDOW, SomeRect(), nullptr, 0));
+    MainWindowScope scope(&owner);
     TestDialog dlg;
     dlg.throwInInit = true;
-    dlg.onStep = [](TestDialog& d, int) { d.EndDialog(9); };
-    EXPECT_EQ(dlg.DoModal(), 9);
+    int steps = 0;
+    dlg.onStep = [&steps](TestDialog& d, int) {
+        ++steps;
+        d.EndDialog(9);
+    };
+    // A half-initialised dialog is not left waiting for input that nothing asks for.
+    EXPECT_EQ(dlg.DoModal(), -1);
+    EXPECT_EQ(steps, 0);
     EXPECT_EQ(ReportCapture::Reports(), std::vector<std::string>{"init failed"});
+    EXPECT_TRUE(owner.IsWindowEnabled());
+}
+
+TEST(Dialog, AnOwnerDisabledWhileTheDialogInitialisesIsEnabledAfterTheRun) {
+    IdleCounter owner;
+    ASSERT_TRUE(owner.CreateEx(0, nullptr, "owner", WS_OVERLAPPEDWINDOW, SomeRect(), nullptr, 0));
+    MainWindowScope scope(&owner);
+    // What the explorer does in its run dialog's initialisation: it disables the host's frame itself.
+    struct DisablesOwnerInInit : TestDialog {
+        HWND ownerToDisable = nullptr;
+        bool OnInitDialog() override {
+            ::EnableWindow(ownerToDisable, FALSE);
+            return TestDialog::OnInitDialog();
+        }
+    } dlg;
+    dlg.ownerToDisable = owner.m_hWnd;
+    dlg.onStep = [](TestDialog& d, int) { d.EndDialog(1); };
+    EXPECT_EQ(dlg.DoModal(), 1);
+    EXPECT_TRUE(owner.IsWindowEnabled());
+}
+
+TEST(Dialog, AnOwnerDisabledBeforeTheRunStaysDisabled) {
+    IdleCounter owner;
+    ASSERT_TRUE(owner.CreateEx(0, nullptr, "owner", WS_OVERLAPPEDWINDOW, SomeRect(), nullptr, 0));
+    MainWindowScope scope(&owner);
+    owner.EnableWindow(false);
+    TestDialog dlg;
+    dlg.onStep = [](TestDialog& d, int) { d.EndDialog(1); };
+    EXPECT_EQ(dlg.DoModal(), 1);
+    EXPECT_FALSE(owner.IsWindowEnabled());
 }
 
 TEST(Dialog, IdleUpdatesReachTheFrameworksVisibleTopLevelWindows) {

@@ -4,6 +4,8 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cstring>
+#include <new>
 #include <stdexcept>
 #include <type_traits>
 
@@ -112,6 +114,44 @@ private:
     bool* m_deleted;
 };
 
+// A window that lives in storage the test owns: "deleting" it runs the destructor and then fills the
+// storage with a pattern, so anything written into the object after its deletion shows.
+class PoisonedWnd : public CWnd {
+public:
+    static constexpr unsigned char kPoison = 0xDD;
+    static PoisonedWnd* MakeIn(void* storage) { return new (storage) PoisonedWnd(storage); }
+    static bool PoisonIntact(const void* storage) {
+        const auto* bytes = static_cast<const unsigned char*>(storage);
+        return std::all_of(bytes, bytes + sizeof(PoisonedWnd), [](unsigned char b) { return b == kPoison; });
+    }
+
+protected:
+    // WM_CLOSE destroys the window from inside a handler, as a frame's close box or File > Exit do.
+    void OnClose() override { DestroyWindow(); }
+    void PostNcDestroy() override {
+        void* storage = m_storage;
+        this->~PoisonedWnd();
+        std::memset(storage, kPoison, sizeof(PoisonedWnd));
+    }
+
+private:
+    explicit PoisonedWnd(void* storage) : m_storage(storage) {}
+    void* m_storage;
+};
+
+// Handlers of creation that throw.
+class ThrowsOnCreate : public CWnd {
+public:
+    UINT throwOn = WM_CREATE;
+
+protected:
+    LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override {
+        if (message == throwOn)
+            throw std::runtime_error("creation failed");
+        return CWnd::WindowProc(message, wParam, lParam);
+    }
+};
+
 // An edit whose typed characters are turned to upper case before the edit sees them.
 class UpperEdit : public CWnd {
 protected:
@@ -214,6 +254,18 @@ TEST(Binding, PostNcDestroyRunsAfterUnbindingAndMayDeleteTheObject) {
     EXPECT_TRUE(deleted);
 }
 
+TEST(Binding, AnObjectDeletedWhileItHandlesAMessageIsNotWrittenAfterwards) {
+    alignas(PoisonedWnd) static unsigned char storage[sizeof(PoisonedWnd)];
+    PoisonedWnd* w = PoisonedWnd::MakeIn(storage);
+    ASSERT_TRUE(w->CreateEx(0, nullptr, "", WS_POPUP, SomeRect(), nullptr, 0));
+    HWND hwnd = w->m_hWnd;
+    // WM_CLOSE -> DestroyWindow -> WM_NCDESTROY -> PostNcDestroy frees the object, all inside the
+    // handling of WM_CLOSE; the outer handling must return without touching the freed object.
+    ::SendMessageA(hwnd, WM_CLOSE, 0, 0);
+    EXPECT_FALSE(::IsWindow(hwnd));
+    EXPECT_TRUE(PoisonedWnd::PoisonIntact(storage));
+}
+
 TEST(Binding, AttachedWindowsAreNeitherBoundNorDestroyed) {
     HWND foreign =
         ::CreateWindowExA(0, "STATIC", "x", WS_POPUP, 0, 0, 10, 10, nullptr, nullptr, nullptr, nullptr);
@@ -285,6 +337,32 @@ TEST(Exceptions, ThrownInAHandlerAreReportedAndTheWindowGoesOn) {
     EXPECT_TRUE(::IsWindow(w.m_hWnd));
     w.SendMessage(WM_SIZE, 0, MAKELPARAM(9, 8));
     EXPECT_EQ(w.lastCx, 9);
+}
+
+TEST(Exceptions, ThrownInWmCreateFailTheCreation) {
+    ReportCapture capture;
+    ReportCapture::Reports().clear();
+    ThrowsOnCreate w;
+    EXPECT_FALSE(w.CreateEx(0, nullptr, "throws", WS_POPUP, SomeRect(), nullptr, 0));
+    EXPECT_EQ(w.m_hWnd, nullptr);
+    EXPECT_EQ(ReportCapture::Reports(), std::vector<std::string>{"creation failed"});
+}
+
+TEST(Exceptions, ThrownInWmNcCreateFailTheCreation) {
+    ReportCapture capture;
+    ReportCapture::Reports().clear();
+    ThrowsOnCreate w;
+    w.throwOn = WM_NCCREATE;
+    EXPECT_FALSE(w.CreateEx(0, nullptr, "throws", WS_POPUP, SomeRect(), nullptr, 0));
+    EXPECT_EQ(w.m_hWnd, nullptr);
+    EXPECT_EQ(ReportCapture::Reports(), std::vector<std::string>{"creation failed"});
+}
+
+TEST(Exceptions, OtherMessagesAnswerNotHandled) {
+    EXPECT_EQ(AfxFailureResult(WM_CREATE), -1);
+    EXPECT_EQ(AfxFailureResult(WM_NCCREATE), FALSE);
+    EXPECT_EQ(AfxFailureResult(WM_PAINT), 0);
+    EXPECT_EQ(AfxFailureResult(WM_NOTIFY), 0);
 }
 
 TEST(Exceptions, ThrownByAPostedMessageDoNotLeaveTheMessageLoop) {
