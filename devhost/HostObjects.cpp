@@ -3,6 +3,7 @@
 #include "devhost/Output.h"
 
 #include <algorithm>
+#include <atomic>
 
 namespace devhost {
 namespace {
@@ -21,6 +22,18 @@ const AcRxClass* DynamicLinkerClass() {
 HostState& Host() {
     static HostState state;
     return state;
+}
+
+namespace {
+std::atomic<bool> g_callRunning{false};
+} // namespace
+
+void SetCallRunning(bool running) {
+    g_callRunning = running;
+}
+
+bool CallRunning() {
+    return g_callRunning;
 }
 
 std::wstring UpperCase(std::wstring text) {

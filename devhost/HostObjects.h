@@ -100,6 +100,10 @@ struct HostState {
 
 HostState& Host();
 
+// Whether a LISP call is running; unlike HostState::inCall it may be read from the script's thread.
+void SetCallRunning(bool running);
+bool CallRunning();
+
 // Upper case for layer names, lower case for LISP names (both ignore case).
 std::wstring UpperCase(std::wstring text);
 std::wstring LowerCase(std::wstring text);

@@ -1,6 +1,7 @@
 #include "devhost/HostWindows.h"
 
 #include <memory>
+#include <mutex>
 
 namespace devhost {
 
@@ -10,6 +11,14 @@ const wchar_t* const kViewClass = L"DevhostDrawingView";
 namespace {
 
 constexpr int kFirstViewId = 0xE900;
+
+std::mutex g_typedMutex;
+std::wstring g_typed;
+
+void NoteTyped(wchar_t character) {
+    const std::lock_guard<std::mutex> lock(g_typedMutex);
+    g_typed += character;
+}
 
 // A drawing view: a white sheet with the drawing's name, and a focus frame when it has the focus.
 class DrawingView final : public HostWindow {
@@ -35,6 +44,9 @@ protected:
             return 0;
         case WM_LBUTTONDOWN:
             SetFocus(m_hwnd);
+            return 0;
+        case WM_CHAR: // the drawing takes keyboard input: what a user types after a call arrives here
+            NoteTyped(static_cast<wchar_t>(wParam));
             return 0;
         case WM_NCDESTROY: {
             const LRESULT result = HostWindow::HandleMessage(message, wParam, lParam);
@@ -67,6 +79,13 @@ private:
 };
 
 } // namespace
+
+std::wstring TakeTypedText() {
+    const std::lock_guard<std::mutex> lock(g_typedMutex);
+    std::wstring text;
+    text.swap(g_typed);
+    return text;
+}
 
 LRESULT CALLBACK HostWindow::Procedure(HWND hwnd, UINT message, WPARAM wParam, LPARAM lParam) {
     HostWindow* self = nullptr;

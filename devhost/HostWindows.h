@@ -50,4 +50,8 @@ void ShowOnlyView(HWND frame, HWND view);
 
 bool RegisterHostClasses();
 
+// Characters the drawing views received as keyboard input (WM_CHAR), kept for the script's `typed`
+// command, which runs on another thread: it takes them and empties the record.
+std::wstring TakeTypedText();
+
 } // namespace devhost

@@ -144,6 +144,8 @@ const CommandName kCommands[] = {
     {L"exists", ScriptCommand::Kind::Exists, true, false},
     {L"tooltip", ScriptCommand::Kind::Tooltip, false, false},
     {L"focus", ScriptCommand::Kind::Focus, false, false},
+    {L"returned", ScriptCommand::Kind::Returned, false, true},
+    {L"typed", ScriptCommand::Kind::Typed, false, false},
     {L"echo", ScriptCommand::Kind::Echo, false, false},
 };
 

@@ -48,6 +48,8 @@ struct ScriptCommand {
         Exists,
         Tooltip,
         Focus,
+        Returned,
+        Typed,
         Echo
     };
     int line = 0;

@@ -1,6 +1,8 @@
 #include "devhost/ScriptRunner.h"
 
 #include "devhost/Bitmap.h"
+#include "devhost/HostObjects.h"
+#include "devhost/HostWindows.h"
 #include "devhost/Output.h"
 #include "devhost/Text.h"
 
@@ -557,6 +559,20 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
             Fact(L"focus (none)");
         break;
     }
+    case Kind::Returned: {
+        const ULONGLONG deadline = GetTickCount64() + static_cast<ULONGLONG>(command.timeoutMs);
+        while (CallRunning()) {
+            if (GetTickCount64() >= deadline)
+                throw ScriptError{L"the call has not returned within " + std::to_wstring(command.timeoutMs) +
+                                  L" ms"};
+            Sleep(kPollMs);
+        }
+        Fact(L"returned");
+        break;
+    }
+    case Kind::Typed:
+        Fact(L"typed " + EscapeControls(TakeTypedText()));
+        break;
     case Kind::Echo:
         Fact(command.text);
         break;

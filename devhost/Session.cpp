@@ -275,6 +275,7 @@ void Session::Evaluate(const std::wstring& expression) {
     host.functionCode = found->second;
     host.result = CallResult::Void;
     host.inCall = true;
+    SetCallRunning(true);
 
     UINT_PTR timer = 0;
     if (m_options.afterMs >= 0) {
@@ -291,6 +292,7 @@ void Session::Evaluate(const std::wstring& expression) {
     if (timer)
         KillTimer(nullptr, timer);
     host.inCall = false;
+    SetCallRunning(false);
     host.functionCode = RTERROR;
     switch (host.result) {
     case CallResult::Void:

@@ -28,6 +28,17 @@ TEST(Script, CommentsAndBlankLinesAreSkipped) {
     EXPECT_EQ(commands[0].line, 5);
 }
 
+TEST(Script, ReturnedWaitsForTheCallAndTypedTakesNoWindow) {
+    const auto commands = Read(L"returned timeout=30000\ntyped\nreturned\n");
+    ASSERT_EQ(commands.size(), 3u);
+    EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::Returned);
+    EXPECT_EQ(commands[0].timeoutMs, 30000);
+    EXPECT_TRUE(commands[0].window.empty());
+    EXPECT_EQ(commands[1].kind, ScriptCommand::Kind::Typed);
+    EXPECT_EQ(commands[2].timeoutMs, 5000);
+    EXPECT_NE(Error(L"typed class=Edit\n").find(L"line 1"), std::wstring::npos);
+}
+
 TEST(Script, WindowPaths) {
     const auto commands =
         Read(L"click class=#32770 text=\"Pick one\" > id=1001 at=5,-6 with=ctrl+shift timeout=200\n");
