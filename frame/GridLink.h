@@ -21,3 +21,5 @@ void RebuildGrid();
 void GridPictureSize(int& width, int& height);
 // Runs the search edit's search by name prefix.
 void SearchDrawings(const std::string& text);
+// Chooses the drawing of that name, as a search hit would (the drawing of the last run).
+void ChooseSavedDrawing(const std::string& name);

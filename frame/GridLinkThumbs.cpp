@@ -35,6 +35,10 @@ void SearchDrawings(const std::string& text) {
     RunSearch(text);
 }
 
+void ChooseSavedDrawing(const std::string& name) {
+    ChooseDrawing(name);
+}
+
 // ---- what the grid asks of the frame ----
 
 int FrameSortMode() {
@@ -56,6 +60,16 @@ void FrameSetTitle(const std::string& text) {
 void FrameUpdateStatus() {
     if (g_pMainFrame)
         g_pMainFrame->UpdateLayerLabel();
+}
+
+void FrameSetStatusText(const std::string& text) {
+    if (g_pMainFrame && g_pMainFrame->m_hWnd)
+        g_pMainFrame->SetMessageText(text);
+}
+
+void FrameTellUser(const std::string& text) {
+    HWND owner = g_pMainFrame ? g_pMainFrame->m_hWnd : nullptr;
+    ::MessageBoxA(owner, text.c_str(), kExplorerMessageCaption, MB_OK | MB_ICONWARNING);
 }
 
 void FrameFocusFolderTree() {

@@ -39,3 +39,5 @@ void GridPictureSize(int& width, int& height) {
 }
 
 void SearchDrawings(const std::string&) {}
+
+void ChooseSavedDrawing(const std::string&) {}

@@ -16,6 +16,7 @@
 CMainFrame* g_pMainFrame = nullptr;
 
 const char* const kExplorerTitle = "Kelmar Dwg Thumbnail Explorer";
+const char* const kExplorerMessageCaption = "Drawing explorer";
 
 namespace {
 
@@ -52,12 +53,14 @@ std::string ExplorerTitle(const std::string& windowText) {
 
 std::string HelpFilePath() {
     char module[MAX_PATH] = "";
-    ::GetModuleFileNameA(AfxGetInstanceHandle(), module, MAX_PATH);
-    char drive[_MAX_DRIVE], dir[_MAX_DIR], fname[_MAX_FNAME], ext[_MAX_EXT];
-    _splitpath(module, drive, dir, fname, ext);
-    char help[MAX_PATH] = "";
-    _makepath(help, drive, dir, fname, "hlp");
-    return help;
+    const DWORD n = ::GetModuleFileNameA(AfxGetInstanceHandle(), module, MAX_PATH);
+    std::string path(module, n < MAX_PATH ? n : 0);
+    // The extension after the last dot of the file name, not of a folder.
+    const auto dot = path.rfind('.');
+    const auto separator = path.find_last_of("\\/");
+    if (dot != std::string::npos && (separator == std::string::npos || dot > separator))
+        path.erase(dot);
+    return path + ".hlp";
 }
 
 std::string LayerLabelText(const std::string& folder) {

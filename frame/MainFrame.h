@@ -109,6 +109,8 @@ constexpr UINT kPickToolBarId = AFX_IDW_TOOLBAR + 4;
 
 // The product name that replaces "Untitled" in the window title.
 extern const char* const kExplorerTitle;
+// The caption of the explorer's message boxes.
+extern const char* const kExplorerMessageCaption;
 
 // The window title with "Untitled" replaced by the product name.
 std::string ExplorerTitle(const std::string& windowText);

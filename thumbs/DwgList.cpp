@@ -3,7 +3,6 @@
 #include <utility>
 
 #include <algorithm>
-#include <cctype>
 #include <cstring>
 
 CDwgArray DwgList;
@@ -17,8 +16,7 @@ DwgData::DwgData(DwgFindEntry&& found)
 bool AcceptScanEntry(DwgFindEntry& entry, const char* needle) {
     if (entry.isDirectory && (entry.name.empty() || entry.name[0] != '.'))
         return false;
-    for (char& c : entry.name)
-        c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+    FoldNameInPlace(entry.name);
     return std::strstr(entry.name.c_str(), needle) != nullptr;
 }
 
@@ -55,32 +53,28 @@ int ScanEntries(const DwgFindEntry* entries, int count, const char* needle) {
     return 1;
 }
 
-namespace {
-
-inline unsigned char FoldAscii(unsigned char c) {
-    return (c >= 'A' && c <= 'Z') ? c + ('a' - 'A') : c;
+std::string FolderPathProblem(const std::string& folder) {
+    if (folder.empty())
+        return "No folder to read";
+    const bool separator = folder.back() == '\\' || folder.back() == '/';
+    const std::size_t pattern = folder.size() + (separator ? 1 : 2);
+    if (pattern <= kMaxPathChars)
+        return {};
+    const std::size_t longest = kMaxPathChars - (separator ? 1 : 2);
+    return "The folder cannot be read: its path is " + std::to_string(folder.size()) +
+           " characters long, at most " + std::to_string(longest) + " are possible";
 }
 
-// Compares the first n bytes of a and b, folding ASCII letters.
-int CompareFolded(const char* a, const char* b, std::size_t n) {
-    for (std::size_t i = 0; i < n; ++i) {
-        const unsigned char ca = FoldAscii(static_cast<unsigned char>(a[i]));
-        const unsigned char cb = FoldAscii(static_cast<unsigned char>(b[i]));
-        if (ca != cb)
-            return ca < cb ? -1 : 1;
-    }
-    return 0;
+bool FullPathFits(const std::string& folder, const std::string& name) {
+    const bool separator = !folder.empty() && (folder.back() == '\\' || folder.back() == '/');
+    return folder.size() + (separator ? 0 : 1) + name.size() <= kMaxPathChars;
 }
 
-} // namespace
-
-int CompareNoCaseAscii(const std::string& a, const std::string& b) {
-    const std::size_t n = std::min(a.size(), b.size());
-    if (int r = CompareFolded(a.data(), b.data(), n))
-        return r;
-    if (a.size() == b.size())
-        return 0;
-    return a.size() < b.size() ? -1 : 1;
+std::string SkippedFilesMessage(int skipped) {
+    if (skipped <= 0)
+        return {};
+    return std::to_string(skipped) + (skipped == 1 ? " drawing is" : " drawings are") +
+           " not shown: the full path is longer than " + std::to_string(kMaxPathChars) + " characters";
 }
 
 void SortDwgList(int mode) {
@@ -91,11 +85,13 @@ void SortDwgList(int mode) {
     DwgData* first = DwgList.GetData();
     DwgData* last = first + (count - 1);
     switch (mode) {
-    case DwgSortByName:
-        std::sort(first, last, [](const DwgData& a, const DwgData& b) {
-            return CompareNoCaseAscii(a.m_strName, b.m_strName) < 0;
+    case DwgSortByName: {
+        const NameFoldTable& fold = NameFold();
+        std::sort(first, last, [&fold](const DwgData& a, const DwgData& b) {
+            return CompareNamesNoCase(a.m_strName, b.m_strName, fold) < 0;
         });
         break;
+    }
     case DwgSortByDate:
         std::sort(first, last,
                   [](const DwgData& a, const DwgData& b) { return a.m_timeWrite < b.m_timeWrite; });
@@ -129,17 +125,14 @@ DwgPrefixSearch FindByPrefix(const std::string& text) {
         return result;
     result.ran = true;
     DeselectAllFlags();
+    const NameFoldTable& fold = NameFold();
     for (int i = 0; i < count; ++i) {
-        const std::string& name = DwgList[i].m_strName;
-        // A name as long as the text never matches, even when equal to it.
-        if (name.size() > text.size() && CompareFolded(name.data(), text.data(), text.size()) == 0) {
+        if (StartsWithNoCase(DwgList[i].m_strName, text, fold)) {
             result.match = i;
-            DwgList[0].Deselect();
             DwgList[i].Select();
             break;
         }
     }
-    result.nameIndex = result.match >= 0 ? result.match : 0;
     return result;
 }
 

@@ -4,6 +4,7 @@
 #pragma once
 
 #include "framework/CArray.h"
+#include "thumbs/NameFold.h"
 
 #include <cstdint>
 #include <string>
@@ -54,7 +55,7 @@ enum DwgSortMode { DwgSortByName = 0, DwgSortByDate = 1, DwgSortBySize = 2 };
 
 // Decides whether one search entry becomes a record. Directories are passed over unless their name
 // begins with "." (those go through the name test like files; kept on purpose). The name is
-// lower-cased in place by the current C locale, then taken when it contains needle anywhere.
+// lower-cased in place through the code page's fold table, then taken when it contains needle anywhere.
 bool AcceptScanEntry(DwgFindEntry& entry, const char* needle);
 
 // Empties the list (storage freed) and sets its grow step for the appends of a new scan.
@@ -71,10 +72,19 @@ void EndScan();
 // at least one entry, 0 for none; the Windows scan gives the same answers.
 int ScanEntries(const DwgFindEntry* entries, int count, const char* needle);
 
-// --- Sorting -------------------------------------------------------------------------------------
+// Longest path the runtime library's file functions take: MAX_PATH less the terminator.
+constexpr std::size_t kMaxPathChars = 259;
 
-// Byte-wise case-insensitive comparison; only ASCII letters fold. Negative, 0 or positive.
-int CompareNoCaseAscii(const std::string& a, const std::string& b);
+// Why a folder cannot be scanned, or empty when it can: its search pattern (the folder, "\", "*") must
+// fit the runtime's path buffers, so a longer path is refused before anything is copied or searched.
+std::string FolderPathProblem(const std::string& folder);
+// True when the file's full path (folder, "\", name) fits the path buffers: the thumbnails open it by
+// its bare name against the current directory, which cannot reach a longer one.
+bool FullPathFits(const std::string& folder, const std::string& name);
+// What the scan says when it left out files whose full path is too long; empty for none.
+std::string SkippedFilesMessage(int skipped);
+
+// --- Sorting -------------------------------------------------------------------------------------
 
 // Sorts every record but the last one by name (0), date (1) or size (2), ascending; the last record
 // found by the scan stays last. Other modes leave the list as it is.
@@ -89,15 +99,13 @@ bool AnySelected();
 
 // What a search for a name prefix did.
 struct DwgPrefixSearch {
-    bool ran = false;   // false: empty text or empty list, nothing was touched
-    int match = -1;     // index of the first match, -1 when none
-    int nameIndex = -1; // record whose name becomes the current drawing (the match, else record 0)
+    bool ran = false; // false: empty text or empty list, nothing was touched
+    int match = -1;   // index of the first match, -1 when none
 };
 
-// Searches for the first record whose name is strictly longer than text and starts with it, case
-// ignored. When it runs it first clears every flag, then on a match clears record 0's flag and sets
-// the match's. The caller then shows the match, sets the current name from nameIndex, the title and
-// the pick button.
+// Searches for the first record whose name starts with text (a whole name matches too), case ignored
+// through the fold table. When it runs it first clears every flag, then sets the match's. The caller
+// then shows the match and makes it the current drawing, or, without a match, leaves none current.
 DwgPrefixSearch FindByPrefix(const std::string& text);
 // Same search; the index of the match or -1.
 int FindByPrefixIndex(const std::string& text);
@@ -105,6 +113,8 @@ int FindByPrefixIndex(const std::string& text);
 #ifdef _WIN32
 // Scans one folder with the runtime library's file search: makes path the current directory, lists
 // "path\*" and fills DwgList with the entries AcceptScanEntry takes. 1 when the folder was read to its
-// end, 0 when it could not be searched (the list is then empty).
-int ScanFolderPath(const char* path, const char* needle);
+// end, 0 when it could not be searched (the list is then empty). A path too long for the runtime's
+// buffers is refused before it is used, and files whose full path is too long are left out; problem,
+// when given, receives what the user should be told (empty when all went well).
+int ScanFolderPath(const char* path, const char* needle, std::string* problem = nullptr);
 #endif

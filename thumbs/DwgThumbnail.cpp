@@ -5,6 +5,7 @@
 #include "res/resource.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/DwgList.h"
+#include "thumbs/RenameRules.h"
 #include "thumbs/Tessel3View.h"
 #include "thumbs/ThumbsGlue.h"
 #include "thumbs/TooltipText.h"
@@ -43,6 +44,10 @@ void MakeCurrent(const std::string& name) {
 }
 
 } // namespace
+
+std::string CurrentFolder() {
+    return CurrentDirectory();
+}
 
 std::string CurrentFolderWithSlash() {
     return WithSlash(CurrentDirectory());
@@ -120,17 +125,48 @@ void CThumbLabel::OnLeave() {
         ::RedrawWindow(view, nullptr, nullptr, kRedrawNow | RDW_ALLCHILDREN);
 }
 
+namespace {
+
+// The system's text for an error code, without its line end.
+std::string SystemErrorText(DWORD error) {
+    char* text = nullptr;
+    const DWORD n = ::FormatMessageA(FORMAT_MESSAGE_ALLOCATE_BUFFER | FORMAT_MESSAGE_FROM_SYSTEM |
+                                         FORMAT_MESSAGE_IGNORE_INSERTS,
+                                     nullptr, error, 0, reinterpret_cast<char*>(&text), 0, nullptr);
+    std::string result = n && text ? std::string(text, n) : "error " + std::to_string(error);
+    if (text)
+        ::LocalFree(text);
+    while (!result.empty() && (result.back() == '\n' || result.back() == '\r' || result.back() == ' '))
+        result.pop_back();
+    return result;
+}
+
+} // namespace
+
 void CThumbLabel::Commit() {
     m_bRenaming = false;
     std::string folder = g_pTessel3Doc ? g_pTessel3Doc->m_strPath : std::string();
     if (folder.empty())
         folder = CurrentDirectory();
     folder = WithSlash(folder);
-    const std::string oldName = folder + m_strSaved;
-    const std::string newName = folder + GetWindowText();
-    if (!::MoveFileA(oldName.c_str(), newName.c_str())) {
-        SetWindowText(m_strSaved);
+    const std::string oldName = m_strSaved;
+    const std::string newName = GetWindowText();
+    const RenameVerdict verdict = CheckRename(folder, oldName, newName, [&folder](const std::string& name) {
+        return ::GetFileAttributesA((folder + name).c_str()) != INVALID_FILE_ATTRIBUTES;
+    });
+    if (verdict != RenameVerdict::Rename) {
+        // The old name comes back before the user is told why.
+        SetWindowText(oldName);
         RedrawEdge();
+        if (verdict != RenameVerdict::Unchanged)
+            FrameTellUser(RenameRefusalText(verdict, newName));
+        return;
+    }
+    if (!::MoveFileA((folder + oldName).c_str(), (folder + newName).c_str())) {
+        const DWORD error = ::GetLastError();
+        SetWindowText(oldName);
+        RedrawEdge();
+        FrameTellUser("Cannot rename \"" + oldName + "\" to \"" + newName + "\": " + SystemErrorText(error));
         return;
     }
     // The rescan rebuilds the grid, which destroys this label: it runs once this message is done.
@@ -267,6 +303,11 @@ void exCDwgThumbnail::Unselect() {
     RecordAt(m_nListIndex).Deselect();
     if (!m_bNoFrameColour)
         SetFrameColour(m_savedColour);
+}
+
+void exCDwgThumbnail::ShowSelection() {
+    if (m_nListIndex >= 0 && m_nListIndex < DwgList.GetSize() && DwgList[m_nListIndex].IsSelected())
+        HighlightLabel();
 }
 
 void exCDwgThumbnail::SelectThis(bool clearOthers) {

@@ -63,6 +63,8 @@ public:
     bool PreTranslateMessage(MSG* pMsg) override;
     // Drops the label's highlight and the record's selection.
     void Unselect();
+    // Highlights the label when the record is selected (after the selection changed elsewhere).
+    void ShowSelection();
     int ListIndex() const { return m_nListIndex; }
     const std::string& Name() const { return m_strName; }
     CThumbLabel& Label() { return m_wndLabel; }
@@ -101,7 +103,8 @@ private:
     bool m_bToolTipActive = false;
 };
 
-// The current directory with a "\" at its end.
+// The current directory, and the same with a "\" at its end.
+std::string CurrentFolder();
 std::string CurrentFolderWithSlash();
 
 // Loads the thumbnail's context menu into menu and returns its popup (not owned), prepared: "&Paste"

@@ -75,9 +75,67 @@ int RoundHalfUp(double v) {
 }
 } // namespace
 
+namespace {
+int Grown(int side) {
+    return RoundHalfUp(side * 1.25);
+}
+int Shrunk(int side) {
+    return RoundHalfUp(side / 1.25);
+}
+} // namespace
+
+long long LiveThumbnailsFor(const Geometry& g, int clientWidth, int clientHeight) {
+    const int rowPitch = std::max(1, g.RowPitch());
+    const long long columns = ColumnsForWidth(clientWidth, g.cellWidth, g.gap);
+    const long long rows = std::max(0, clientHeight) / rowPitch;
+    return columns * (rows + 2);
+}
+
+PictureSize SmallestPicture() {
+    static const PictureSize smallest = [] {
+        Geometry g; // default size, no label: the most rows a font could give
+        g.labelHeight = 0;
+        for (;;) {
+            Geometry next = g;
+            next.cellHeight = Shrunk(g.cellHeight);
+            next.cellWidth = Shrunk(g.cellWidth);
+            if (g.cellHeight < kMinCellSize || g.cellWidth < kMinCellSize ||
+                LiveThumbnailsFor(next, kReferenceScreenWidth, kReferenceScreenHeight) > kMaxLiveThumbnails)
+                break;
+            g = next;
+        }
+        PictureSize size;
+        size.width = g.cellWidth;
+        size.height = g.cellHeight;
+        return size;
+    }();
+    return smallest;
+}
+
+PictureSize LargestPicture(int maxClientHeight) {
+    PictureSize size;
+    // No screen is a million pixels high; the bound keeps the steps far from overflowing.
+    maxClientHeight = std::min(maxClientHeight, 1 << 20);
+    // A client lower than the default picture still keeps the default.
+    while (Grown(size.height) < maxClientHeight) {
+        size.height = Grown(size.height);
+        size.width = Grown(size.width);
+    }
+    return size;
+}
+
+PictureSize ClampPicture(int width, int height, int maxClientHeight) {
+    const PictureSize smallest = SmallestPicture();
+    const PictureSize largest = LargestPicture(maxClientHeight);
+    PictureSize size;
+    size.width = std::clamp(width, smallest.width, std::max(smallest.width, largest.width));
+    size.height = std::clamp(height, smallest.height, std::max(smallest.height, largest.height));
+    return size;
+}
+
 bool IncreaseCell(int& cellHeight, int& cellWidth, int clientHeight) {
-    const int height = RoundHalfUp(cellHeight * 1.25);
-    const int width = RoundHalfUp(cellWidth * 1.25);
+    const int height = Grown(cellHeight);
+    const int width = Grown(cellWidth);
     if (height >= clientHeight)
         return false;
     cellHeight = height;
@@ -86,11 +144,34 @@ bool IncreaseCell(int& cellHeight, int& cellWidth, int clientHeight) {
 }
 
 bool DecreaseCell(int& cellHeight, int& cellWidth) {
-    if (cellHeight < kMinCellSize || cellWidth < kMinCellSize)
+    const PictureSize smallest = SmallestPicture();
+    const int height = Shrunk(cellHeight);
+    const int width = Shrunk(cellWidth);
+    if (height < smallest.height || width < smallest.width)
         return false;
-    cellHeight = RoundHalfUp(cellHeight / 1.25);
-    cellWidth = RoundHalfUp(cellWidth / 1.25);
+    cellHeight = height;
+    cellWidth = width;
     return true;
+}
+
+bool GrowToLiveLimit(int& cellHeight, int& cellWidth, int labelHeight, int gap, int clientWidth,
+                     int clientHeight) {
+    Geometry g;
+    g.cellHeight = cellHeight;
+    g.cellWidth = cellWidth;
+    g.labelHeight = labelHeight;
+    g.gap = gap;
+    bool grown = false;
+    // Each step is a quarter larger: a few dozen steps outgrow any client.
+    for (int step = 0; step < 64 && LiveThumbnailsFor(g, clientWidth, clientHeight) > kMaxLiveThumbnails;
+         ++step) {
+        g.cellHeight = std::max(Grown(g.cellHeight), g.cellHeight + 1);
+        g.cellWidth = std::max(Grown(g.cellWidth), g.cellWidth + 1);
+        grown = true;
+    }
+    cellHeight = g.cellHeight;
+    cellWidth = g.cellWidth;
+    return grown;
 }
 
 RefitNumbers ComputeRefit(const Geometry& g, int clientRight, int clientBottom, int frameWidth,

@@ -9,6 +9,12 @@ namespace grid {
 constexpr int kScrollCap = 32768;
 // Cell sizes below this cannot be made smaller.
 constexpr int kMinCellSize = 20;
+// The most thumbnails the grid keeps alive at once: each is three windows (picture, label, tooltip), and a
+// process has 10,000 window handles to share with the host it lives in.
+constexpr int kMaxLiveThumbnails = 2000;
+// The largest screen the smallest picture size is made for.
+constexpr int kReferenceScreenWidth = 3840;
+constexpr int kReferenceScreenHeight = 2160;
 // Default geometry of the view.
 constexpr int kDefaultCellHeight = 143;
 constexpr int kDefaultCellWidth = 173;
@@ -65,11 +71,35 @@ struct Cell {
 // Cell of column c in list row r whose top edge is at rowTop.
 Cell CellOf(const Geometry& g, int columns, int poolSize, int row, int column, int rowTop);
 
+// A picture size (the cell without its label).
+struct PictureSize {
+    int width = kDefaultCellWidth;
+    int height = kDefaultCellHeight;
+};
+
+// Thumbnails alive in a client area of this size however many drawings there are: whole columns times
+// (whole rows + 2).
+long long LiveThumbnailsFor(const Geometry& g, int clientWidth, int clientHeight);
+
+// The smallest picture: the last size Decrease reaches from the default before a 3840 x 2160 client would
+// hold more than kMaxLiveThumbnails (counted without labels, so it holds for any font).
+PictureSize SmallestPicture();
+// The largest picture: the last size Increase reaches from the default while its height stays below
+// maxClientHeight (the tallest client the screen allows).
+PictureSize LargestPicture(int maxClientHeight);
+// A stored picture size brought within what Decrease and Increase can reach: each side between the
+// smallest and the largest picture's. Negative and huge values included.
+PictureSize ClampPicture(int width, int height, int maxClientHeight);
+
 // Cell size steps. Both change height and width together and return false when refused.
 // Increase: x1.25 rounded half up, only when the new height stays below the client height.
 bool IncreaseCell(int& cellHeight, int& cellWidth, int clientHeight);
-// Decrease: /1.25 rounded half up, refused when either is already below the minimum.
+// Decrease: /1.25 rounded half up, refused when either side would fall below the smallest picture's.
 bool DecreaseCell(int& cellHeight, int& cellWidth);
+// For a client larger than the reference screen: grows the cell by Increase's steps until the client holds
+// at most kMaxLiveThumbnails. Returns true when it changed the size.
+bool GrowToLiveLimit(int& cellHeight, int& cellWidth, int labelHeight, int gap, int clientWidth,
+                     int clientHeight);
 
 // Numbers of a refit to the client rectangle.
 struct RefitNumbers {

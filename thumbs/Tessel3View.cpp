@@ -24,6 +24,31 @@ private:
     bool m_old;
 };
 
+// Holds the view's drawing while the grid lays its controls out, then paints the view and every control
+// in it at once. A layout destroys and creates every control; painting them as the work ends, rather than
+// leaving it to paint messages that the view's reappearance ought to cause, is what makes each cell show
+// its picture and name after any jump. Nested holds leave the work to the outermost one.
+class RedrawHold {
+public:
+    explicit RedrawHold(HWND view) : m_view(view), m_held(view && ::IsWindowVisible(view)) {
+        if (m_held)
+            ::SendMessageA(m_view, WM_SETREDRAW, FALSE, 0);
+    }
+    ~RedrawHold() {
+        if (!m_held || !::IsWindow(m_view))
+            return;
+        ::SendMessageA(m_view, WM_SETREDRAW, TRUE, 0);
+        ::RedrawWindow(m_view, nullptr, nullptr,
+                       RDW_INVALIDATE | RDW_ERASE | RDW_FRAME | RDW_ALLCHILDREN | RDW_UPDATENOW);
+    }
+    RedrawHold(const RedrawHold&) = delete;
+    RedrawHold& operator=(const RedrawHold&) = delete;
+
+private:
+    HWND m_view;
+    bool m_held;
+};
+
 void PostCancel() {
     if (CWnd* main = AfxGetMainWnd(); main && main->m_hWnd)
         main->PostMessage(WM_APP, 2, 0);
@@ -34,8 +59,12 @@ void PostCancel() {
 CTessel3View::CTessel3View() {
     g_pTessel3View = this;
     if (g_pTessel3Doc && g_pTessel3Doc->m_nPictureHeight != 0 && g_pTessel3Doc->m_nPictureWidth != 0) {
-        m_nCellHeight = g_pTessel3Doc->m_nPictureHeight;
-        m_nCellWidth = g_pTessel3Doc->m_nPictureWidth;
+        // A size from the settings file is only as small or as large as the size commands could make it.
+        const grid::PictureSize size =
+            grid::ClampPicture(g_pTessel3Doc->m_nPictureWidth, g_pTessel3Doc->m_nPictureHeight,
+                               ::GetSystemMetrics(SM_CYVIRTUALSCREEN));
+        m_nCellHeight = size.height;
+        m_nCellWidth = size.width;
     }
     LabelHeight(); // measured once, before the first layout needs it
 }
@@ -96,6 +125,7 @@ void CTessel3View::Rebuild() {
 }
 
 void CTessel3View::ScrollToBegin(bool sort) {
+    RedrawHold hold(m_hWnd);
     m_nColumns = grid::ColumnsForWidth(GetClientRect().Width(), m_nCellWidth, m_nGap);
     m_nOldColumns = m_nColumns; // a later relayout keeps the first drawing where it is
     if (sort)
@@ -108,6 +138,18 @@ void CTessel3View::ScrollToBegin(bool sort) {
 }
 
 void CTessel3View::ShowIndex(int index) {
+    if (index < 0 || index >= DwgList.GetSize())
+        return;
+    // Already in the first row shown: only the selection changes (typing a longer prefix).
+    const int columns = grid::ColumnsForWidth(GetClientRect().Width(), m_nCellWidth, m_nGap);
+    if (columns == m_nColumns && m_nCount == DwgList.GetSize() &&
+        index / std::max(1, m_nColumns) == m_nFirstRow) {
+        if (exCDwgThumbnail* control = ControlOf(index)) {
+            control->ShowSelection();
+            return;
+        }
+    }
+    RedrawHold hold(m_hWnd);
     ScrollToBegin(false);
     m_nFirstRow = index / std::max(1, m_nColumns);
     Relayout();
@@ -181,9 +223,16 @@ void CTessel3View::DestroyPool() {
 }
 
 void CTessel3View::Layout() {
+    RedrawHold hold(m_hWnd);
     DestroyPool();
     m_pool.RemoveAll();
     m_nCount = DwgList.GetSize();
+    {
+        // A client beyond the largest screen would need more controls than the process can spare.
+        const CRect client = GetClientRect();
+        grid::GrowToLiveLimit(m_nCellHeight, m_nCellWidth, LabelHeight(), m_nGap, client.Width(),
+                              client.Height());
+    }
     const grid::Geometry g = Geometry();
 
     // Showing or hiding a scroll bar changes the client area: settle the bars first. A vertical bar that
@@ -266,7 +315,7 @@ void CTessel3View::Refit(bool resizeFrame) {
 }
 
 void CTessel3View::Relayout() {
-    ShowWindow(SW_HIDE);
+    RedrawHold hold(m_hWnd);
     DestroyPool();
     m_pool.RemoveAll();
     const int firstRow = grid::RelayoutFirstRow(m_nOldColumns, m_nFirstRow, m_nColumns, m_nCount);
@@ -276,7 +325,6 @@ void CTessel3View::Relayout() {
     ::SetScrollPos(m_hWnd, SB_VERT, y, TRUE);
     m_nFirstRow = firstRow;
     Layout();
-    ShowWindow(SW_SHOW);
     SetFocus();
 }
 

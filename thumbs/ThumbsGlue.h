@@ -1,7 +1,7 @@
 // What the thumbnail browser asks of the explorer frame, in one place: the sort mode, the pick button,
-// the title, the status, the folder pane and the frame window itself. The explorer links
-// frame/GridLinkThumbs.cpp, which goes through g_pMainFrame; test programs link a stand-in of their own.
-// Every function copes with a missing frame (there is none outside a call of the LISP function).
+// the title, the status, the messages to the user, the folder pane and the frame window itself. The explorer
+// links frame/GridLinkThumbs.cpp, which goes through g_pMainFrame; test programs link a stand-in of their
+// own. Every function copes with a missing frame (there is none outside a call of the LISP function).
 #pragma once
 
 #include <windows.h>
@@ -18,6 +18,10 @@ void FrameEnablePick(bool enable);
 void FrameSetTitle(const std::string& text);
 // Refreshes what the frame shows about the current folder (the layer label).
 void FrameUpdateStatus();
+// Puts a message in the status bar (empty clears it).
+void FrameSetStatusText(const std::string& text);
+// Tells the user something that needs an answer before going on (a message box over the frame).
+void FrameTellUser(const std::string& text);
 // Gives the keyboard focus to the folder tree in the frame's left pane.
 void FrameFocusFolderTree();
 // The frame window the grid lives in (resized by the grid's alignment), or null.

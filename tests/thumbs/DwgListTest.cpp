@@ -167,16 +167,23 @@ TEST_F(DwgListTest, IndexOutsideListThrows) {
     EXPECT_THROW(DwgList[-1], CInvalidArgException);
 }
 
-TEST(CompareNoCaseAscii, FoldsAsciiLettersOnly) {
-    EXPECT_EQ(CompareNoCaseAscii("Plan.DWG", "plan.dwg"), 0);
-    EXPECT_LT(CompareNoCaseAscii("a", "B"), 0);
-    EXPECT_GT(CompareNoCaseAscii("b", "A"), 0);
-    EXPECT_LT(CompareNoCaseAscii("ab", "abc"), 0);
-    EXPECT_GT(CompareNoCaseAscii("abc", "AB"), 0);
-    EXPECT_LT(CompareNoCaseAscii("_", "A"), 0); // letters compare as lower case
-    EXPECT_NE(CompareNoCaseAscii("\xC9", "\xE9"), 0);
-    EXPECT_LT(CompareNoCaseAscii("z", "\xE9"), 0); // bytes compare unsigned
-    EXPECT_EQ(CompareNoCaseAscii("", ""), 0);
+TEST(CompareNamesNoCase, FoldsTheCodePageLetters) {
+    EXPECT_EQ(CompareNamesNoCase("Plan.DWG", "plan.dwg"), 0);
+    EXPECT_LT(CompareNamesNoCase("a", "B"), 0);
+    EXPECT_GT(CompareNamesNoCase("b", "A"), 0);
+    EXPECT_LT(CompareNamesNoCase("ab", "abc"), 0);
+    EXPECT_GT(CompareNamesNoCase("abc", "AB"), 0);
+    EXPECT_LT(CompareNamesNoCase("_", "A"), 0);               // letters compare as lower case
+    EXPECT_EQ(CompareNamesNoCase("\xC9tage", "\xE9TAGE"), 0); // E acute, both cases
+    EXPECT_LT(CompareNamesNoCase("z", "\xE9"), 0);            // bytes compare unsigned
+    EXPECT_NE(CompareNamesNoCase("\xD7", "\xF7"), 0);         // multiplication and division signs
+    EXPECT_EQ(CompareNamesNoCase("", ""), 0);
+}
+
+TEST(AcceptScanEntry, LowersTheCodePageLettersAsTheSearchFoldsThem) {
+    DwgFindEntry e = File("\xC9TAGE-\x8A.DWG");
+    EXPECT_TRUE(AcceptScanEntry(e, ".dwg"));
+    EXPECT_EQ(e.name, "\xE9tage-\x9A.dwg");
 }
 
 TEST_F(DwgListTest, SortByNameKeepsLastRecordLast) {
@@ -245,7 +252,7 @@ TEST_F(DwgListTest, LargeSortOrdersAllButLast) {
             const DwgData& a = DwgList[i - 1];
             const DwgData& b = DwgList[i];
             if (mode == 0)
-                ASSERT_LE(CompareNoCaseAscii(a.m_strName, b.m_strName), 0);
+                ASSERT_LE(CompareNamesNoCase(a.m_strName, b.m_strName), 0);
             else if (mode == 1)
                 ASSERT_LE(a.m_timeWrite, b.m_timeWrite);
             else
@@ -272,17 +279,26 @@ void Append(const std::vector<std::string>& names) {
 }
 
 TEST_F(DwgListTest, FindByPrefixFindsLongerNameIgnoringCase) {
-    Append({"a.dwg", "plan", "plan1.dwg", "plan2.dwg"});
-    EXPECT_EQ(FindByPrefixIndex("plan"), 2);
-    EXPECT_EQ(FindByPrefixIndex("PLAN"), 2);
-    EXPECT_EQ(FindByPrefixIndex("Plan2"), 3);
+    Append({"a.dwg", "plan1.dwg", "plan2.dwg"});
+    EXPECT_EQ(FindByPrefixIndex("plan"), 1);
+    EXPECT_EQ(FindByPrefixIndex("PLAN"), 1);
+    EXPECT_EQ(FindByPrefixIndex("Plan2"), 2);
 }
 
-TEST_F(DwgListTest, FindByPrefixNeverMatchesNameOfSameLength) {
-    Append({"plan", "other.dwg"});
-    EXPECT_EQ(FindByPrefixIndex("plan"), -1);
-    EXPECT_EQ(FindByPrefixIndex("other.dwg"), -1);
-    EXPECT_EQ(FindByPrefixIndex("other.dw"), 1);
+TEST_F(DwgListTest, FindByPrefixMatchesAWholeName) {
+    Append({"plan", "other.dwg", "other.dwg.bak"});
+    EXPECT_EQ(FindByPrefixIndex("plan"), 0);
+    EXPECT_EQ(FindByPrefixIndex("other.dwg"), 1);
+    EXPECT_EQ(FindByPrefixIndex("OTHER.DWG"), 1);
+    EXPECT_EQ(FindByPrefixIndex("other.dwg."), 2);
+    EXPECT_EQ(FindByPrefixIndex("other.dwg.bak2"), -1); // longer than every name
+}
+
+TEST_F(DwgListTest, FindByPrefixFoldsTheCodePageLetters) {
+    Scan({File("a.dwg"), File("\xC9tage.dwg"), File("z.dwg")});
+    EXPECT_EQ(DwgList[1].m_strName, "\xE9tage.dwg"); // the scan lowered it
+    EXPECT_EQ(FindByPrefixIndex("\xC9T"), 1);
+    EXPECT_EQ(FindByPrefixIndex("\xE9t"), 1);
 }
 
 TEST_F(DwgListTest, FindByPrefixClearsFlagsAndMarksMatch) {
@@ -292,21 +308,19 @@ TEST_F(DwgListTest, FindByPrefixClearsFlagsAndMarksMatch) {
     const DwgPrefixSearch found = FindByPrefix("pl");
     EXPECT_TRUE(found.ran);
     EXPECT_EQ(found.match, 2);
-    EXPECT_EQ(found.nameIndex, 2);
     EXPECT_FALSE(DwgList[0].IsSelected());
     EXPECT_FALSE(DwgList[1].IsSelected());
     EXPECT_TRUE(DwgList[2].IsSelected());
     EXPECT_FALSE(DwgList[3].IsSelected());
 }
 
-TEST_F(DwgListTest, FindByPrefixWithoutMatchClearsFlagsAndNamesFirstRecord) {
+TEST_F(DwgListTest, FindByPrefixWithoutMatchSelectsNothing) {
     Scan({File("a.dwg"), File("b.dwg")});
     DwgList[0].Select();
     DwgList[1].Select();
     const DwgPrefixSearch found = FindByPrefix("zz");
     EXPECT_TRUE(found.ran);
     EXPECT_EQ(found.match, -1);
-    EXPECT_EQ(found.nameIndex, 0);
     EXPECT_FALSE(AnySelected());
 }
 
@@ -325,6 +339,38 @@ TEST_F(DwgListTest, EmptyTextOrEmptyListTouchesNothing) {
     const DwgPrefixSearch empty = FindByPrefix("");
     EXPECT_FALSE(empty.ran);
     EXPECT_TRUE(DwgList[1].IsSelected());
+}
+
+TEST(ScanPaths, FolderPathsTooLongForThePathBuffersAreRefused) {
+    EXPECT_EQ(FolderPathProblem("C:\\Drawings"), "");
+    EXPECT_EQ(FolderPathProblem("C:\\"), "");
+    EXPECT_NE(FolderPathProblem(""), "");
+    // The pattern adds "\*": 257 characters are the most a folder may have.
+    const std::string longest = "C:\\" + std::string(254, 'd');
+    ASSERT_EQ(longest.size(), 257u);
+    EXPECT_EQ(FolderPathProblem(longest), "");
+    EXPECT_EQ(FolderPathProblem(longest + "\\"), ""); // a separator of its own takes the place of one
+    for (std::size_t length : {258u, 259u, 260u, 1000u}) {
+        const std::string folder = "C:\\" + std::string(length - 3, 'd');
+        ASSERT_EQ(folder.size(), length);
+        EXPECT_EQ(FolderPathProblem(folder), "The folder cannot be read: its path is " +
+                                                 std::to_string(length) +
+                                                 " characters long, at most 257 are possible")
+            << length;
+    }
+}
+
+TEST(ScanPaths, FullPathOfAFileMustFit) {
+    const std::string folder = "C:\\" + std::string(200, 'd');
+    EXPECT_TRUE(FullPathFits(folder, std::string(55, 'n')));  // 203 + 1 + 55 = 259
+    EXPECT_FALSE(FullPathFits(folder, std::string(56, 'n'))); // 260
+    EXPECT_TRUE(FullPathFits(folder + "\\", std::string(55, 'n')));
+    EXPECT_TRUE(FullPathFits("C:\\", std::string(256, 'n')));
+    EXPECT_FALSE(FullPathFits("C:\\", std::string(257, 'n')));
+    EXPECT_EQ(SkippedFilesMessage(0), "");
+    EXPECT_EQ(SkippedFilesMessage(1), "1 drawing is not shown: the full path is longer than 259 characters");
+    EXPECT_EQ(SkippedFilesMessage(3),
+              "3 drawings are not shown: the full path is longer than 259 characters");
 }
 
 } // namespace

@@ -118,27 +118,124 @@ TEST(GridMath, IncreaseRefusedUnlessNewHeightBelowClient) {
     EXPECT_EQ(h, 179);
 }
 
-TEST(GridMath, DecreaseStopsBelowMinimum) {
-    int h = 20, w = 20;
-    EXPECT_TRUE(DecreaseCell(h, w));
-    EXPECT_EQ(h, 16);
-    EXPECT_EQ(w, 16);
-    EXPECT_FALSE(DecreaseCell(h, w));
-    EXPECT_EQ(h, 16);
-    EXPECT_EQ(w, 16);
+TEST(GridMath, SmallestPictureKeepsTheLargestScreenWithinTheLiveLimit) {
+    // From 143 x 173: 114 x 138, 91 x 110, 73 x 88, 58 x 70; the next, 46 x 56, would put 63 columns of
+    // 48 rows on a 3840 x 2160 client.
+    const PictureSize smallest = SmallestPicture();
+    EXPECT_EQ(smallest.height, 58);
+    EXPECT_EQ(smallest.width, 70);
+    for (int label = 0; label <= 40; ++label) {
+        Geometry g = DefaultGeometry(label);
+        g.cellHeight = smallest.height;
+        g.cellWidth = smallest.width;
+        EXPECT_LE(LiveThumbnailsFor(g, kReferenceScreenWidth, kReferenceScreenHeight), kMaxLiveThumbnails)
+            << label;
+    }
+    Geometry below = DefaultGeometry(0);
+    below.cellHeight = 46;
+    below.cellWidth = 56;
+    EXPECT_GT(LiveThumbnailsFor(below, kReferenceScreenWidth, kReferenceScreenHeight), kMaxLiveThumbnails);
 }
 
-TEST(GridMath, DecreaseRoundsHalfUpAndChecksBothSides) {
+TEST(GridMath, LiveThumbnailsAreWholeColumnsTimesRowsPlusTwo) {
+    Geometry g = DefaultGeometry(20); // pitches 178 x 163
+    EXPECT_EQ(LiveThumbnailsFor(g, 700, 600), 3 * (3 + 2));
+    EXPECT_EQ(LiveThumbnailsFor(g, 10, 10), 1 * (0 + 2));
+    EXPECT_EQ(LiveThumbnailsFor(g, -5, -5), 1 * (0 + 2));
+}
+
+TEST(GridMath, DecreaseStopsAtTheSmallestPicture) {
+    int h = 143, w = 173;
+    int steps = 0;
+    while (DecreaseCell(h, w))
+        ++steps;
+    EXPECT_EQ(steps, 4);
+    EXPECT_EQ(h, 58);
+    EXPECT_EQ(w, 70);
+    EXPECT_FALSE(DecreaseCell(h, w));
+    EXPECT_EQ(h, 58);
+    EXPECT_EQ(w, 70);
+    // Either side reaching below the smallest refuses the step.
+    int h2 = 500, w2 = 80;
+    EXPECT_FALSE(DecreaseCell(h2, w2));
+    EXPECT_EQ(h2, 500);
+}
+
+TEST(GridMath, DecreaseRoundsHalfUp) {
     int h = 179, w = 216;
     EXPECT_TRUE(DecreaseCell(h, w));
     EXPECT_EQ(h, 143); // 143.2
     EXPECT_EQ(w, 173); // 172.8
-    int h2 = 30, w2 = 19;
-    EXPECT_FALSE(DecreaseCell(h2, w2));
-    int h3 = 22, w3 = 23; // 17.6 -> 18, 18.4 -> 18
-    EXPECT_TRUE(DecreaseCell(h3, w3));
-    EXPECT_EQ(h3, 18);
-    EXPECT_EQ(w3, 18);
+    int h2 = 91, w2 = 110;
+    EXPECT_TRUE(DecreaseCell(h2, w2));
+    EXPECT_EQ(h2, 73); // 72.8
+    EXPECT_EQ(w2, 88);
+}
+
+TEST(GridMath, LargestPictureIsTheLastIncreaseBelowTheClientHeight) {
+    const PictureSize on2160 = LargestPicture(2160);
+    EXPECT_EQ(on2160.height, 2091);
+    EXPECT_EQ(on2160.width, 2523);
+    const PictureSize on1000 = LargestPicture(1000);
+    EXPECT_EQ(on1000.height, 856);
+    EXPECT_EQ(on1000.width, 1033);
+    // Each is reached by Increase on a client that tall.
+    int h = 143, w = 173;
+    while (IncreaseCell(h, w, 1000)) {
+    }
+    EXPECT_EQ(h, on1000.height);
+    EXPECT_EQ(w, on1000.width);
+    const PictureSize tiny = LargestPicture(100);
+    EXPECT_EQ(tiny.height, kDefaultCellHeight);
+    const PictureSize absurd = LargestPicture(2147483647);
+    EXPECT_GT(absurd.height, 100000);
+}
+
+TEST(GridMath, StoredPictureSizesAreClampedToWhatTheCommandsReach) {
+    const PictureSize kept = ClampPicture(200, 150, 1000);
+    EXPECT_EQ(kept.width, 200);
+    EXPECT_EQ(kept.height, 150);
+    const PictureSize tiny = ClampPicture(1, 1, 1000);
+    EXPECT_EQ(tiny.width, 70);
+    EXPECT_EQ(tiny.height, 58);
+    const PictureSize negative = ClampPicture(-500, -2147483647 - 1, 1000);
+    EXPECT_EQ(negative.width, 70);
+    EXPECT_EQ(negative.height, 58);
+    const PictureSize huge = ClampPicture(2147483647, 100000, 1000);
+    EXPECT_EQ(huge.width, 1033);
+    EXPECT_EQ(huge.height, 856);
+    const PictureSize mixed = ClampPicture(10, 5000, 1000);
+    EXPECT_EQ(mixed.width, 70);
+    EXPECT_EQ(mixed.height, 856);
+    // Whatever was stored, a 3840 x 2160 client keeps within the limit.
+    for (const PictureSize& size : {tiny, negative, mixed}) {
+        Geometry g = DefaultGeometry(0);
+        g.cellWidth = size.width;
+        g.cellHeight = size.height;
+        EXPECT_LE(LiveThumbnailsFor(g, kReferenceScreenWidth, kReferenceScreenHeight), kMaxLiveThumbnails);
+    }
+}
+
+TEST(GridMath, AClientBeyondTheLargestScreenGrowsTheCells) {
+    int h = 58, w = 70;
+    EXPECT_FALSE(GrowToLiveLimit(h, w, 20, 5, kReferenceScreenWidth, kReferenceScreenHeight));
+    EXPECT_EQ(h, 58);
+    // Two 4K screens side by side and stacked.
+    EXPECT_TRUE(GrowToLiveLimit(h, w, 20, 5, 2 * kReferenceScreenWidth, 2 * kReferenceScreenHeight));
+    Geometry g = DefaultGeometry(20);
+    g.cellHeight = h;
+    g.cellWidth = w;
+    EXPECT_LE(LiveThumbnailsFor(g, 2 * kReferenceScreenWidth, 2 * kReferenceScreenHeight),
+              kMaxLiveThumbnails);
+    EXPECT_GT(h, 58);
+    // Even a client of 32767 x 32767 and cells of one pixel end within the limit.
+    int h2 = 1, w2 = 1;
+    EXPECT_TRUE(GrowToLiveLimit(h2, w2, 0, 0, 32767, 32767));
+    g = DefaultGeometry(0);
+    g.gap = 0;
+    g.cellHeight = h2;
+    g.cellWidth = w2;
+    EXPECT_LE(LiveThumbnailsFor(g, 32767, 32767), kMaxLiveThumbnails);
 }
 
 TEST(GridMath, RefitToWholeColumnsAndRows) {

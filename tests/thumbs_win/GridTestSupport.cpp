@@ -27,6 +27,12 @@ void FrameSetTitle(const std::string& text) {
 void FrameUpdateStatus() {
     ++Frame().statusUpdates;
 }
+void FrameSetStatusText(const std::string& text) {
+    Frame().status = text;
+}
+void FrameTellUser(const std::string& text) {
+    Frame().toldUser.push_back(text);
+}
 void FrameFocusFolderTree() {
     ++Frame().treeFocusRequests;
 }
@@ -236,7 +242,7 @@ std::vector<std::string>& Reports() {
     return reports;
 }
 
-GridBench::GridBench(int clientWidth, int clientHeight) {
+GridBench::GridBench(int clientWidth, int clientHeight, const std::string& settingsText) {
     // A caught error must not wait in a message box.
     AfxSetErrorReporter(&RecordReport);
     Reports().clear();
@@ -248,6 +254,12 @@ GridBench::GridBench(int clientWidth, int clientHeight) {
     ::GetTempPathA(MAX_PATH, temp);
     m_settings = std::string(temp) + "orvex-grid-test.ini";
     ::DeleteFileA(m_settings.c_str());
+    if (!settingsText.empty()) {
+        if (FILE* f = std::fopen(m_settings.c_str(), "wb")) {
+            std::fwrite(settingsText.data(), 1, settingsText.size(), f);
+            std::fclose(f);
+        }
+    }
     m_doc = std::make_unique<CTessel3Doc>(m_settings);
     m_frame.CreateFrame(clientWidth, clientHeight);
     Frame().frame = m_frame.m_hWnd;

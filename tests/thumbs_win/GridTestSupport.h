@@ -18,6 +18,8 @@ struct FrameRecord {
     int pickCalls = 0;
     std::string title;
     int statusUpdates = 0;
+    std::string status;                // the status bar's message
+    std::vector<std::string> toldUser; // message boxes the user would have seen
     int treeFocusRequests = 0;
     HWND frame = nullptr;
 };
@@ -80,7 +82,8 @@ CRect RectInView(HWND control, HWND view);
 // The document, the frame and the view of one test.
 class GridBench {
 public:
-    explicit GridBench(int clientWidth = 700, int clientHeight = 600);
+    // settingsText: the explorer's settings file as the document reads it (none when empty).
+    explicit GridBench(int clientWidth = 700, int clientHeight = 600, const std::string& settingsText = "");
     ~GridBench();
     GridBench(const GridBench&) = delete;
     GridBench& operator=(const GridBench&) = delete;

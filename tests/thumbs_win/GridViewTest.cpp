@@ -249,7 +249,8 @@ TEST(GridSize, IncreaseDecreaseAndTheirLimits) {
     // Down to the smallest size, then no further.
     for (int i = 0; i < 20; ++i)
         view.Decrease();
-    EXPECT_LT(std::min(view.GetPictureHeight(), view.GetPictureWidth()), grid::kMinCellSize);
+    EXPECT_EQ(view.GetPictureHeight(), grid::SmallestPicture().height);
+    EXPECT_EQ(view.GetPictureWidth(), grid::SmallestPicture().width);
     const int h = view.GetPictureHeight(), w = view.GetPictureWidth();
     view.Decrease();
     EXPECT_EQ(view.GetPictureHeight(), h);
@@ -260,6 +261,61 @@ TEST(GridSize, IncreaseDecreaseAndTheirLimits) {
         view.Increase();
     EXPECT_LT(view.GetPictureHeight(), view.GetClientRect().Height());
     EXPECT_GE(view.GetPictureHeight() * 5 / 4, view.GetClientRect().Height());
+}
+
+std::string PictureSettings(const std::string& width, const std::string& height) {
+    return "[View]\r\nPictureWidth=" + width + "\r\nPictureHeight=" + height + "\r\n";
+}
+
+TEST(GridSize, StoredPictureSizesAreClampedToWhatTheCommandsReach) {
+    const int screenHeight = ::GetSystemMetrics(SM_CYVIRTUALSCREEN);
+    const grid::PictureSize largest = grid::LargestPicture(screenHeight);
+    const struct {
+        const char* width;
+        const char* height;
+        int expectedWidth;
+        int expectedHeight;
+    } cases[] = {
+        {"200", "150", 200, 150},
+        {"1", "1", grid::SmallestPicture().width, grid::SmallestPicture().height},
+        {"-40", "-7", grid::SmallestPicture().width, grid::SmallestPicture().height},
+        {"2147483647", "99999999", largest.width, largest.height},
+        {"-2147483648", "5000000", grid::SmallestPicture().width, largest.height},
+        {"0", "1", grid::kDefaultCellWidth, grid::kDefaultCellHeight}, // one side 0: the default
+    };
+    for (const auto& c : cases) {
+        GridBench bench(700, 600, PictureSettings(c.width, c.height));
+        EXPECT_EQ(bench.view().GetPictureWidth(), c.expectedWidth) << c.width << " x " << c.height;
+        EXPECT_EQ(bench.view().GetPictureHeight(), c.expectedHeight) << c.width << " x " << c.height;
+        FillList(500);
+        bench.view().Rebuild();
+        Pump();
+        EXPECT_LE(LiveThumbnails(bench.view().m_hWnd), grid::kMaxLiveThumbnails);
+    }
+}
+
+TEST(GridSize, NoWindowSizeHoldsMoreThanTheLiveLimit) {
+    // The smallest pictures in a client as large as two 4K screens each way: the cells grow instead.
+    // A top-level window is kept within the screen; the view, a child, is not.
+    GridBench bench(700, 600, PictureSettings("1", "1"));
+    CTessel3View& view = bench.view();
+    view.MoveWindow(0, 0, 2 * grid::kReferenceScreenWidth, 2 * grid::kReferenceScreenHeight);
+    const CRect client = view.GetClientRect();
+    ASSERT_GT(client.Width(), grid::kReferenceScreenWidth) << "the window could not be made that large";
+    FillList(20000);
+    view.Rebuild();
+    Pump();
+    const int live = LiveThumbnails(view.m_hWnd);
+    EXPECT_LE(live, grid::kMaxLiveThumbnails);
+    EXPECT_LE(view.GetPoolSize(), grid::kMaxLiveThumbnails);
+    EXPECT_GT(live, grid::kMaxLiveThumbnails / 4) << "the client is still filled";
+    EXPECT_GT(view.GetPictureHeight(), grid::SmallestPicture().height);
+    // Decrease does not get below what the client allows either.
+    view.Decrease();
+    Pump();
+    EXPECT_LE(LiveThumbnails(view.m_hWnd), grid::kMaxLiveThumbnails);
+    std::printf("client %d x %d: %d live thumbnails of %d x %d\n", client.Width(), client.Height(), live,
+                view.GetPictureWidth(), view.GetPictureHeight());
 }
 
 TEST(GridSize, AlignFitsTheFrameToWholeColumnsAndRows) {

@@ -299,6 +299,38 @@ TEST_F(RenameTest, FailedRenameRestoresTheOldName) {
     EXPECT_EQ(label.GetWindowText(), "a.dwg");
     EXPECT_TRUE(m_folder.Exists("a.dwg"));
     EXPECT_TRUE(label.GetStyle() & ES_READONLY);
+    ASSERT_EQ(Frame().toldUser.size(), 1u);
+    EXPECT_EQ(Frame().toldUser[0], "Cannot rename to \"b.dwg\": a file of that name already exists.");
+}
+
+TEST_F(RenameTest, BadNamesAreRefusedWithAMessageAndTheOldNameBack) {
+    const char* bad[] = {"a\\b.dwg", "a/b.dwg", "c:b.dwg",   "a*.dwg", "a?.dwg",   "a\"b.dwg", "a<b.dwg",
+                         "a>b.dwg",  "a|b.dwg", "a\x01.dwg", "plan",   "plan.txt", "B.DWG",    "con.dwg"};
+    for (const char* name : bad) {
+        Frame().toldUser.clear();
+        CThumbLabel& label = LabelOf("a.dwg");
+        label.BeginRename();
+        label.SetWindowText(name);
+        Key(label, VK_RETURN);
+        EXPECT_EQ(label.GetWindowText(), "a.dwg") << name;
+        EXPECT_FALSE(label.IsRenaming()) << name;
+        ASSERT_EQ(Frame().toldUser.size(), 1u) << name;
+        EXPECT_NE(Frame().toldUser[0].find(std::string("\"") + name + "\""), std::string::npos)
+            << Frame().toldUser[0];
+        EXPECT_TRUE(m_folder.Exists("a.dwg")) << name;
+        EXPECT_TRUE(m_folder.Exists("b.dwg")) << name;
+    }
+    EXPECT_EQ(DwgList.GetSize(), 2);
+}
+
+TEST_F(RenameTest, TheSameNameRenamesNothingAndSaysNothing) {
+    CThumbLabel& label = LabelOf("a.dwg");
+    label.BeginRename();
+    label.SetWindowText("A.DWG");
+    Key(label, VK_RETURN);
+    EXPECT_EQ(label.GetWindowText(), "a.dwg");
+    EXPECT_TRUE(Frame().toldUser.empty());
+    EXPECT_TRUE(m_folder.Exists("a.dwg"));
 }
 
 // ---- search -------------------------------------------------------------------------------------------
@@ -326,14 +358,62 @@ TEST(Search, FindsThePrefixSelectsShowsAndKeepsTheFocus) {
     EXPECT_EQ(Frame().title, CurrentDir() + "\\d02500.dwg");
     EXPECT_TRUE(Frame().pickEnabled);
 
-    // No match: record 0 becomes the current drawing, nothing selected.
-    RunSearch("zz");
-    EXPECT_FALSE(AnySelected());
-    EXPECT_EQ(g_pTessel3Doc->m_strName, "d00000.dwg");
-    // A name exactly as long as the text never matches.
+    // A whole name matches.
     RunSearch("d00007.dwg");
-    EXPECT_FALSE(DwgList[7].IsSelected());
+    EXPECT_TRUE(DwgList[7].IsSelected());
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "d00007.dwg");
+    EXPECT_EQ(bench.view().GetFirstRow(), 7 / bench.view().GetColumns());
     edit.DestroyWindow();
+}
+
+TEST(Search, NoMatchChoosesNothingAndSaysSo) {
+    GridBench bench(700, 600);
+    FillList(300);
+    bench.view().Rebuild();
+    Pump();
+    RunSearch("d00150");
+    ASSERT_TRUE(DwgList[150].IsSelected());
+    ASSERT_TRUE(Frame().pickEnabled);
+    const int firstRow = bench.view().GetFirstRow();
+
+    RunSearch("xyz");
+    EXPECT_FALSE(AnySelected());
+    EXPECT_FALSE(LabelHighlighted(bench.view().ControlOf(150)));
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "");
+    EXPECT_FALSE(Frame().pickEnabled);
+    EXPECT_EQ(Frame().title, CurrentDir());
+    EXPECT_EQ(Frame().status, "No drawing starts with \"xyz\"");
+    EXPECT_EQ(bench.view().GetFirstRow(), firstRow) << "the grid stays where it was";
+
+    // A match again takes the message away.
+    RunSearch("D00002");
+    EXPECT_TRUE(DwgList[2].IsSelected());
+    EXPECT_EQ(Frame().status, "");
+    EXPECT_TRUE(Frame().pickEnabled);
+}
+
+TEST(Search, ChoosingADrawingByItsWholeName) {
+    GridBench bench(700, 600);
+    BeginScan();
+    for (const char* name : {"plan-a.dwg", "plan.dwg", "zeta.dwg"}) {
+        DwgFindEntry e;
+        e.name = name;
+        AppendScanEntry(e);
+    }
+    EndScan();
+    bench.view().Rebuild();
+    Pump();
+    RunSearch("plan");
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "plan-a.dwg");
+    EXPECT_TRUE(ChooseDrawing("PLAN.dwg"));
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "plan.dwg");
+    EXPECT_TRUE(DwgList[1].IsSelected());
+    EXPECT_FALSE(DwgList[0].IsSelected());
+    EXPECT_TRUE(LabelHighlighted(bench.view().ControlOf(1)));
+    EXPECT_FALSE(LabelHighlighted(bench.view().ControlOf(0)));
+    EXPECT_TRUE(Frame().pickEnabled);
+    EXPECT_FALSE(ChooseDrawing("gone.dwg"));
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "plan.dwg");
 }
 
 TEST(Search, EmptyTextOrListChangesNothing) {

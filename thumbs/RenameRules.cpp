@@ -1,0 +1,86 @@
+#include "thumbs/RenameRules.h"
+
+#include "thumbs/DwgList.h"
+#include "thumbs/NameFold.h"
+
+#include <cstring>
+
+namespace {
+
+bool HasBadCharacter(const std::string& name) {
+    for (const char c : name) {
+        const auto byte = static_cast<unsigned char>(c);
+        if (byte < 0x20 || byte == 0x7F || std::strchr("\\/:*?\"<>|", c) != nullptr)
+            return true;
+    }
+    return false;
+}
+
+// The part before the first dot, trailing blanks dropped: what Windows compares with its device names.
+bool IsDeviceName(const std::string& name) {
+    std::string stem = name.substr(0, name.find('.'));
+    while (!stem.empty() && stem.back() == ' ')
+        stem.pop_back();
+    std::string upper;
+    for (const char c : stem)
+        upper += (c >= 'a' && c <= 'z') ? static_cast<char>(c - ('a' - 'A')) : c;
+    static const char* const kDevices[] = {"CON", "PRN", "AUX", "NUL"};
+    for (const char* device : kDevices)
+        if (upper == device)
+            return true;
+    return upper.size() == 4 && (upper.compare(0, 3, "COM") == 0 || upper.compare(0, 3, "LPT") == 0) &&
+           upper[3] >= '1' && upper[3] <= '9';
+}
+
+bool IsDrawingName(const std::string& name) {
+    static const std::string extension = ".dwg";
+    if (name.size() <= extension.size())
+        return false;
+    return CompareNamesNoCase(name.substr(name.size() - extension.size()), extension) == 0;
+}
+
+} // namespace
+
+RenameVerdict CheckRename(const std::string& folder, const std::string& oldName, const std::string& newName,
+                          const std::function<bool(const std::string&)>& exists) {
+    if (newName.empty())
+        return RenameVerdict::Empty;
+    if (newName == oldName || CompareNamesNoCase(newName, oldName) == 0)
+        return RenameVerdict::Unchanged;
+    if (HasBadCharacter(newName))
+        return RenameVerdict::BadCharacter;
+    if (!IsDrawingName(newName))
+        return RenameVerdict::NotDrawing;
+    if (IsDeviceName(newName))
+        return RenameVerdict::DeviceName;
+    // A file system keeps at most 255 characters in one name.
+    if (newName.size() > 255 || !FullPathFits(folder, newName))
+        return RenameVerdict::TooLong;
+    if (exists && exists(newName))
+        return RenameVerdict::Exists;
+    return RenameVerdict::Rename;
+}
+
+std::string RenameRefusalText(RenameVerdict verdict, const std::string& newName) {
+    const std::string quoted = "\"" + newName + "\"";
+    switch (verdict) {
+    case RenameVerdict::Empty:
+        return "A drawing needs a name.";
+    case RenameVerdict::BadCharacter:
+        return "Cannot rename to " + quoted +
+               ": a name cannot contain \\ / : * ? \" < > | or control characters.";
+    case RenameVerdict::DeviceName:
+        return "Cannot rename to " + quoted + ": the name is reserved for a device.";
+    case RenameVerdict::NotDrawing:
+        return "Cannot rename to " + quoted + ": a drawing's name ends in .dwg.";
+    case RenameVerdict::TooLong:
+        return "Cannot rename to " + quoted + ": the full path would be longer than " +
+               std::to_string(kMaxPathChars) + " characters.";
+    case RenameVerdict::Exists:
+        return "Cannot rename to " + quoted + ": a file of that name already exists.";
+    case RenameVerdict::Rename:
+    case RenameVerdict::Unchanged:
+        break;
+    }
+    return {};
+}
