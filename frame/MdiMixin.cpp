@@ -11,31 +11,54 @@
 #include "res/resource.h"
 
 #include <algorithm>
+#include <climits>
 #include <cstdlib>
 
 namespace {
 
 // Shows the folder the explorer starts in: scans it into the drawing list, makes it the current folder
-// and lays the grid out.
+// and lays the grid out. A folder the scan refuses is said in the status bar.
 void ShowStartFolder(CMainFrame& frame, CTessel3Doc& doc) {
     const std::string folder = StartFolder(g_szStartPath, doc.m_strPath);
     if (folder.empty())
         return;
-    ScanFolderPath(folder.c_str(), ".dwg");
+    std::string problem;
+    ScanFolderPath(folder.c_str(), ".dwg", &problem);
     doc.m_strPath = folder;
     RebuildGrid();
     frame.UpdateLayerLabel();
+    if (!problem.empty())
+        frame.SetMessageText(problem);
+}
+
+RECT VirtualScreen() {
+    const int x = ::GetSystemMetrics(SM_XVIRTUALSCREEN), y = ::GetSystemMetrics(SM_YVIRTUALSCREEN);
+    return RECT{x, y, x + ::GetSystemMetrics(SM_CXVIRTUALSCREEN), y + ::GetSystemMetrics(SM_CYVIRTUALSCREEN)};
+}
+
+bool OnAMonitor(const RECT& rc) {
+    return ::MonitorFromRect(&rc, MONITOR_DEFAULTTONULL) != nullptr;
+}
+
+// The position of the last separator of a path ("\", "/" or the drive's ":"), or npos.
+std::string::size_type LastSeparator(const std::string& path) {
+    return path.find_last_of("\\/:");
 }
 
 } // namespace
 
 FramePlacement PlaceFrame(const RECT& dialog, int width, int height) {
     FramePlacement place;
-    const int left = dialog.left, top = dialog.top, right = dialog.right, bottom = dialog.bottom;
-    place.x = (left + right) / 2 - width / 2;
+    // In 64 bits: stored sizes are whatever the settings file says.
+    const long long left = dialog.left, top = dialog.top, right = dialog.right, bottom = dialog.bottom;
+    long long x = (left + right) / 2 - width / 2;
     // The dialog's height is added to the frame's before halving; the frame opens that much higher.
-    place.y = std::max(0, (top + bottom) / 2 - (height - top + bottom) / 2);
-    place.x = std::max(place.x, 0);
+    long long y = std::max(0LL, (top + bottom) / 2 - (height - top + bottom) / 2);
+    x = std::max(x, 0LL);
+    place.x = static_cast<int>(std::min<long long>(x, INT_MAX));
+    place.y = static_cast<int>(std::min<long long>(y, INT_MAX));
+    place.width = width;
+    place.height = height;
     if (place.x == 0 && place.y == 0)
         place.maximised = true;
     else
@@ -43,12 +66,32 @@ FramePlacement PlaceFrame(const RECT& dialog, int width, int height) {
     return place;
 }
 
+bool StoredSizeUsable(int width, int height, const RECT& virtualScreen) {
+    return width > 0 && height > 0 && width <= virtualScreen.right - virtualScreen.left &&
+           height <= virtualScreen.bottom - virtualScreen.top;
+}
+
+FramePlacement PlaceFrameOnDesktop(const RECT& dialog, int width, int height, const RECT& virtualScreen,
+                                   const std::function<bool(const RECT&)>& onMonitor) {
+    const FramePlacement firstRun = PlaceFrame(dialog, 0, 0);
+    if (!StoredSizeUsable(width, height, virtualScreen))
+        return firstRun;
+    const FramePlacement place = PlaceFrame(dialog, width, height);
+    if (!place.move)
+        return place;
+    // The caption's left end (system menu and title) must be on a screen, or the frame cannot be moved.
+    const RECT caption{place.x, place.y, place.x + std::min(width, 120), place.y + std::min(height, 30)};
+    if (onMonitor && !onMonitor(caption))
+        return firstRun;
+    return place;
+}
+
 std::string StartFolder(const std::string& startPath, const std::string& savedPath) {
     std::string folder;
     if (!startPath.empty()) {
-        char drive[_MAX_DRIVE] = "", dir[_MAX_DIR] = "";
-        _splitpath(startPath.c_str(), drive, dir, nullptr, nullptr);
-        folder = std::string(drive) + dir;
+        // Drive and folders: everything up to the last separator (no fixed buffer for a long path).
+        const auto end = LastSeparator(startPath);
+        folder = end == std::string::npos ? std::string() : startPath.substr(0, end + 1);
     } else {
         folder = savedPath;
     }
@@ -60,9 +103,13 @@ std::string StartFolder(const std::string& startPath, const std::string& savedPa
 }
 
 std::string SearchTextOf(const std::string& drawingName) {
-    char fname[_MAX_FNAME] = "";
-    _splitpath(drawingName.c_str(), nullptr, nullptr, fname, nullptr);
-    return fname;
+    // The name stored in the settings file can be of any length: no fixed buffer.
+    const auto separator = LastSeparator(drawingName);
+    std::string name = separator == std::string::npos ? drawingName : drawingName.substr(separator + 1);
+    const auto dot = name.rfind('.');
+    if (dot != std::string::npos)
+        name.erase(dot);
+    return name;
 }
 
 bool CMdiMixin::SetUp(UINT frameResourceId) {
@@ -95,14 +142,15 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog) {
     if (!HasFolderTree())
         ShowStartFolder(*frame, *doc);
 
-    // 6. Placement from the dialog's rectangle and the stored size.
+    // 6. Placement from the dialog's rectangle and the stored size, on a monitor of this desktop.
     const CRect rcDialog = dialog->GetWindowRect();
-    const FramePlacement place = PlaceFrame(rcDialog, doc->m_nWindowWidth, doc->m_nWindowHeight);
+    const FramePlacement place = PlaceFrameOnDesktop(rcDialog, doc->m_nWindowWidth, doc->m_nWindowHeight,
+                                                     VirtualScreen(), &OnAMonitor);
     if (place.maximised) {
         frame->ShowWindow(SW_SHOWMAXIMIZED);
     } else {
         if (place.move)
-            frame->MoveWindow(place.x, place.y, doc->m_nWindowWidth, doc->m_nWindowHeight);
+            frame->MoveWindow(place.x, place.y, place.width, place.height);
         frame->ShowWindow(SW_SHOWNORMAL);
     }
 
@@ -113,10 +161,15 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog) {
     frame->UpdateWindow();
     frame->EnablePick(false);
 
-    // 9. The drawing of the last run starts the search; the name is chosen anew.
-    CEditSearch& search = frame->GetSearchEdit();
-    if (search.m_hWnd && !doc->m_strName.empty())
-        search.SetWindowText(SearchTextOf(doc->m_strName));
+    // 9. The drawing of the last run is chosen again: its name starts the search, and the drawing itself is
+    // selected (the search may have found another name first). It stays the current drawing, so accept
+    // takes it; when the folder no longer holds it, nothing is chosen.
+    const std::string saved = doc->m_strName;
     doc->m_strName.clear();
+    CEditSearch& search = frame->GetSearchEdit();
+    if (search.m_hWnd && !saved.empty()) {
+        search.SetWindowText(SearchTextOf(saved));
+        ChooseSavedDrawing(saved);
+    }
     return true;
 }

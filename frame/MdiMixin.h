@@ -4,6 +4,7 @@
 
 #include "framework/afxwin.h"
 
+#include <functional>
 #include <string>
 
 class CMdiMixin : public CWinApp {
@@ -27,11 +28,21 @@ private:
 // Where the frame is put for the run dialog's screen rectangle and the stored frame size.
 struct FramePlacement {
     bool maximised = false;
-    bool move = false; // move to x, y with the stored size
+    bool move = false; // move to x, y with width x height
     int x = 0;
     int y = 0;
+    int width = 0;
+    int height = 0;
 };
 FramePlacement PlaceFrame(const RECT& dialog, int width, int height);
+
+// A stored frame size the desktop can show: both sides positive and none larger than the virtual screen.
+bool StoredSizeUsable(int width, int height, const RECT& virtualScreen);
+// The placement on this desktop: a stored size it cannot show, or a frame whose caption would lie on no
+// monitor (onMonitor says whether a screen rectangle touches one), is placed as on a first run, as if no
+// size had been stored.
+FramePlacement PlaceFrameOnDesktop(const RECT& dialog, int width, int height, const RECT& virtualScreen,
+                                   const std::function<bool(const RECT&)>& onMonitor);
 
 // The folder the grid shows first: the folder part of the start path, else the saved current folder.
 std::string StartFolder(const std::string& startPath, const std::string& savedPath);

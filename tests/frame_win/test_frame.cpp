@@ -368,6 +368,59 @@ TEST_F(ExplorerFrame, NoStoredSizeWithTheDialogAtTheTopLeftOpensMaximised) {
     EXPECT_EQ(Run(dialog), 2);
 }
 
+namespace {
+
+// The frame's rectangle of a run with a stored size, the dialog at (300, 200) as 200 x 100.
+CRect FrameRectForStoredSize(const std::string& width, const std::string& height, bool& zoomed) {
+    std::ofstream(ExplorerSettingsPath(), std::ios::binary)
+        << "[Size]\r\nWindowWidth=" << width << "\r\nWindowHeight=" << height << "\r\n";
+    RunDialog dialog;
+    CRect rc;
+    dialog.beforeCreate = [&] { ::MoveWindow(dialog.m_hWnd, 300, 200, 200, 100, FALSE); };
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        rc = frame.GetWindowRect();
+        zoomed = ::IsZoomed(frame.m_hWnd) != FALSE;
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(dialog.DoModal(), 2);
+    Pump();
+    delete g_pTessel3Doc;
+    g_pTessel3Doc = nullptr;
+    return rc;
+}
+
+} // namespace
+
+TEST_F(ExplorerFrame, StoredSizesTheDesktopCannotShowGiveTheFirstRunPlacement) {
+    bool zoomed = false;
+    const CRect firstRun = FrameRectForStoredSize("0", "0", zoomed);
+    ASSERT_GT(firstRun.Width(), 0);
+    const RECT screen{::GetSystemMetrics(SM_XVIRTUALSCREEN), ::GetSystemMetrics(SM_YVIRTUALSCREEN),
+                      ::GetSystemMetrics(SM_XVIRTUALSCREEN) + ::GetSystemMetrics(SM_CXVIRTUALSCREEN),
+                      ::GetSystemMetrics(SM_YVIRTUALSCREEN) + ::GetSystemMetrics(SM_CYVIRTUALSCREEN)};
+    const struct {
+        const char* width;
+        const char* height;
+    } cases[] = {
+        {"-500", "300"},       // a negative side
+        {"400", "-3000"},      // would open far below the screen
+        {"-2147483648", "-1"}, // the most negative
+        {"100000", "300"},     // wider than the screen
+        {"2147483647", "2147483647"},
+    };
+    for (const auto& c : cases) {
+        const CRect rc = FrameRectForStoredSize(c.width, c.height, zoomed);
+        EXPECT_EQ(rc, firstRun) << c.width << " x " << c.height;
+        EXPECT_FALSE(zoomed) << c.width << " x " << c.height;
+        CRect onScreen;
+        EXPECT_TRUE(::IntersectRect(&onScreen, &rc, &screen)) << c.width << " x " << c.height;
+    }
+    // A size the screen can show keeps its place.
+    const CRect kept = FrameRectForStoredSize("400", "300", zoomed);
+    EXPECT_EQ(kept.Width(), 400);
+    EXPECT_EQ(kept.Height(), 300);
+}
+
 TEST_F(ExplorerFrame, SortCommandsSetTheModeAndCheckTheirItems) {
     WriteSettings("[View]\r\nSort=2\r\n");
     RunDialog dialog;
@@ -443,18 +496,29 @@ TEST_F(ExplorerFrame, AcceptNeedsAChosenDrawing) {
     EXPECT_EQ(Run(dialog), 1);
 }
 
-TEST_F(ExplorerFrame, SavedDrawingNameStartsTheSearchAndIsCleared) {
+TEST_F(ExplorerFrame, SavedDrawingNameStartsTheSearch) {
     WriteSettings("[CurrentPath]\r\nName=plan-b.dwg\r\n");
     RunDialog dialog;
-    std::string text, name = "unset";
+    std::string text;
     dialog.steps.push_back([&](CMainFrame& frame) {
         text = frame.GetSearchEdit().GetWindowText();
-        name = g_pTessel3Doc ? g_pTessel3Doc->m_strName : "no document";
         frame.PostMessage(WM_CLOSE);
     });
     EXPECT_EQ(Run(dialog), 2);
     EXPECT_EQ(text, "plan-b");
-    EXPECT_EQ(name, "");
+}
+
+TEST_F(ExplorerFrame, SavedDrawingNameOfAnyLengthStartsTheSearch) {
+    const std::string stem(1500, 'p'); // far beyond a file-name buffer, within an ini line
+    WriteSettings("[CurrentPath]\r\nName=C:\\x\\" + stem + ".dwg\r\n");
+    RunDialog dialog;
+    std::string text;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        text = frame.GetSearchEdit().GetWindowText();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(text, stem);
 }
 
 TEST_F(ExplorerFrame, HostFrameIsDisabledWhileTheExplorerIsOpen) {
@@ -531,6 +595,115 @@ TEST_F(ExplorerFrame, TypingAPrefixChoosesTheDrawingAndAcceptTakesIt) {
     EXPECT_EQ(g_pTessel3Doc->m_strPath, folder);
     EXPECT_EQ(g_pTessel3Doc->m_strName, "abc.dwg");
     RemoveFolder(folder, files);
+}
+
+TEST_F(ExplorerFrame, SavedDrawingIsChosenAgainAndTheAcceptButtonTakesIt) {
+    // "plan" starts plan-a.dwg first; the saved drawing is plan.dwg.
+    const auto files = {"plan-a.dwg", "plan.dwg", "zeta.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-saved", files);
+    WriteSettings("[CurrentPath]\r\nPath=" + folder + "\r\nName=plan.dwg\r\n");
+    RunDialog dialog;
+    std::string text, title;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        text = frame.GetSearchEdit().GetWindowText();
+        title = frame.GetWindowText();
+        ASSERT_NE(g_pTessel3Doc, nullptr);
+        EXPECT_EQ(g_pTessel3Doc->m_strName, "plan.dwg");
+        EXPECT_TRUE(frame.IsPickEnabled());
+        EXPECT_TRUE(frame.GetPickToolBar().GetToolBarCtrl().IsButtonEnabled(ID_ACCEPT));
+    });
+    dialog.steps.push_back([](CMainFrame& frame) {
+        // Still chosen after the idle updates ran.
+        EXPECT_TRUE(frame.GetPickToolBar().GetToolBarCtrl().IsButtonEnabled(ID_ACCEPT));
+        frame.GetPickToolBar().PostMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, BN_CLICKED),
+                                           reinterpret_cast<LPARAM>(frame.GetPickToolBar().m_hWnd));
+    });
+    EXPECT_EQ(Run(dialog), 1);
+    EXPECT_EQ(text, "plan");
+    EXPECT_EQ(title, folder + "\\plan.dwg");
+    ASSERT_NE(g_pTessel3Doc, nullptr);
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "plan.dwg");
+    RemoveFolder(folder, files);
+}
+
+TEST_F(ExplorerFrame, SavedDrawingStaysChosenForTheAcceptMessage) {
+    const auto files = {"abc.dwg", "plan.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-saved-msg", files);
+    WriteSettings("[CurrentPath]\r\nPath=" + folder + "\r\nName=plan.dwg\r\n");
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame&) { CMainFrame::PostResult(kExplorerAccept); });
+    EXPECT_EQ(Run(dialog), 1);
+    ASSERT_NE(g_pTessel3Doc, nullptr);
+    EXPECT_EQ(g_pTessel3Doc->m_strName, "plan.dwg");
+    RemoveFolder(folder, files);
+}
+
+TEST_F(ExplorerFrame, ASavedDrawingNoLongerThereChoosesNothing) {
+    const auto files = {"abc.dwg", "xyz.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-saved-gone", files);
+    WriteSettings("[CurrentPath]\r\nPath=" + folder + "\r\nName=plan.dwg\r\n");
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        ASSERT_NE(g_pTessel3Doc, nullptr);
+        EXPECT_EQ(g_pTessel3Doc->m_strName, "");
+        EXPECT_FALSE(frame.IsPickEnabled());
+        EXPECT_FALSE(frame.GetPickToolBar().GetToolBarCtrl().IsButtonEnabled(ID_ACCEPT));
+        // The accept button does nothing without a drawing.
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0);
+    });
+    dialog.steps.push_back([](CMainFrame& frame) { frame.PostMessage(WM_CLOSE); });
+    EXPECT_EQ(Run(dialog), 2);
+    RemoveFolder(folder, files);
+}
+
+TEST_F(ExplorerFrame, TypingWhatNoNameStartsWithChoosesNothingAndSaysSo) {
+    const auto files = {"abc.dwg", "xyz.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-nomatch", files);
+    std::snprintf(g_szStartPath, kPathChars, "%s\\", folder.c_str());
+    RunDialog dialog;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        CEditSearch& edit = frame.GetSearchEdit();
+        edit.SetFocus();
+        edit.PostMessage(WM_CHAR, 'x', 1);
+    });
+    dialog.steps.push_back([](CMainFrame& frame) {
+        ASSERT_NE(g_pTessel3Doc, nullptr);
+        EXPECT_EQ(g_pTessel3Doc->m_strName, "xyz.dwg");
+        EXPECT_TRUE(frame.IsPickEnabled());
+        frame.GetSearchEdit().PostMessage(WM_CHAR, 'q', 1);
+    });
+    std::string title, status;
+    bool pick = true, button = true;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        EXPECT_EQ(g_pTessel3Doc->m_strName, "");
+        pick = frame.IsPickEnabled();
+        button = frame.GetPickToolBar().GetToolBarCtrl().IsButtonEnabled(ID_ACCEPT);
+        title = frame.GetWindowText();
+        status = frame.GetStatusBar().GetPaneText(0);
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0); // does nothing
+    });
+    dialog.steps.push_back([](CMainFrame& frame) { frame.PostMessage(WM_CLOSE); });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_FALSE(pick);
+    EXPECT_FALSE(button);
+    EXPECT_EQ(title, folder);
+    EXPECT_EQ(status, "No drawing starts with \"xq\"");
+    RemoveFolder(folder, files);
+}
+
+TEST_F(ExplorerFrame, AFolderPathTooLongForTheScanIsSaidInTheStatusBar) {
+    const std::string folder = "C:\\" + std::string(1000, 'd');
+    WriteSettings("[CurrentPath]\r\nPath=" + folder + "\r\n");
+    RunDialog dialog;
+    std::string status;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        status = frame.GetStatusBar().GetPaneText(0);
+        EXPECT_EQ(frame.GetGridView()->GetRows(), 0);
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(status,
+              "The folder cannot be read: its path is 1003 characters long, at most 257 are possible");
 }
 
 TEST_F(ExplorerFrame, GridCommandsAreForwardedToTheGrid) {

@@ -37,6 +37,56 @@ TEST(FramePlacement, NoStoredSizeShowsWithoutMoving) {
     EXPECT_FALSE(place.move);
 }
 
+TEST(FramePlacement, StoredSizeMustFitTheDesktop) {
+    const RECT screen{0, 0, 1600, 1000};
+    EXPECT_TRUE(StoredSizeUsable(400, 300, screen));
+    EXPECT_TRUE(StoredSizeUsable(1600, 1000, screen));
+    EXPECT_FALSE(StoredSizeUsable(1601, 300, screen));
+    EXPECT_FALSE(StoredSizeUsable(400, 1001, screen));
+    EXPECT_FALSE(StoredSizeUsable(0, 300, screen));
+    EXPECT_FALSE(StoredSizeUsable(-400, 300, screen));
+    EXPECT_FALSE(StoredSizeUsable(400, -1, screen));
+    EXPECT_FALSE(StoredSizeUsable(2147483647, 2147483647, screen));
+    EXPECT_FALSE(StoredSizeUsable(-2147483647 - 1, 300, screen));
+}
+
+TEST(FramePlacement, OnTheDesktopACaptionOnNoMonitorGivesTheFirstRunPlacement) {
+    const RECT screen{0, 0, 1600, 1000};
+    const RECT dialog{300, 200, 500, 300};
+    auto everywhere = [](const RECT&) { return true; };
+    auto nowhere = [](const RECT&) { return false; };
+    const FramePlacement kept = PlaceFrameOnDesktop(dialog, 400, 300, screen, everywhere);
+    EXPECT_TRUE(kept.move);
+    EXPECT_EQ(kept.x, 200);
+    EXPECT_EQ(kept.width, 400);
+    EXPECT_EQ(kept.height, 300);
+    const FramePlacement firstRun = PlaceFrame(dialog, 0, 0);
+    for (const FramePlacement& place :
+         {PlaceFrameOnDesktop(dialog, 400, 300, screen, nowhere),
+          PlaceFrameOnDesktop(dialog, -400, 300, screen, everywhere),
+          PlaceFrameOnDesktop(dialog, 400, 3000, screen, everywhere),
+          PlaceFrameOnDesktop(dialog, 2147483647, 2147483647, screen, everywhere)}) {
+        EXPECT_EQ(place.move, firstRun.move);
+        EXPECT_EQ(place.maximised, firstRun.maximised);
+        EXPECT_EQ(place.x, firstRun.x);
+        EXPECT_EQ(place.y, firstRun.y);
+    }
+    // The caption asked about is the frame's top left.
+    RECT asked{};
+    PlaceFrameOnDesktop(dialog, 400, 300, screen, [&asked](const RECT& rc) { return asked = rc, true; });
+    EXPECT_EQ(asked.left, 200);
+    EXPECT_EQ(asked.top, kept.y);
+    EXPECT_GT(asked.right, asked.left);
+    EXPECT_GT(asked.bottom, asked.top);
+}
+
+TEST(FramePlacement, HugeValuesDoNotOverflow) {
+    const FramePlacement place =
+        PlaceFrame(RECT{2000000000, 2000000000, 2100000000, 2100000000}, -2147483647 - 1, -2147483647 - 1);
+    EXPECT_GE(place.x, 0);
+    EXPECT_GE(place.y, 0);
+}
+
 TEST(StartFolder, FolderPartOfTheStartPath) {
     EXPECT_EQ(StartFolder("C:\\Work\\Plans\\a.dwg", "D:\\Saved"), "C:\\Work\\Plans");
     EXPECT_EQ(StartFolder("C:\\Work\\Plans\\", ""), "C:\\Work\\Plans");
@@ -52,6 +102,17 @@ TEST(StartFolder, SavedFolderWithoutStartPath) {
 TEST(SearchText, FileNamePartOnly) {
     EXPECT_EQ(SearchTextOf("plan-a.dwg"), "plan-a");
     EXPECT_EQ(SearchTextOf("C:\\Work\\b.x.dwg"), "b.x");
+    EXPECT_EQ(SearchTextOf("C:plan"), "plan");
+    EXPECT_EQ(SearchTextOf("D:/a.b/plan"), "plan");
+    // Longer than any file-name buffer: taken whole.
+    EXPECT_EQ(SearchTextOf("C:\\" + std::string(3000, 'n') + ".dwg"), std::string(3000, 'n'));
+}
+
+TEST(StartFolder, LongPathsAreTakenWhole) {
+    const std::string folder = "C:\\" + std::string(258, 'd');
+    EXPECT_EQ(StartFolder(folder + "\\a.dwg", ""), folder);
+    EXPECT_EQ(StartFolder("C:a.dwg", ""), "C:");
+    EXPECT_EQ(StartFolder("a.dwg", "D:\\Saved"), "");
 }
 
 TEST(Title, UntitledBecomesTheProductName) {
