@@ -7,7 +7,8 @@ namespace devhost {
 const wchar_t* const kUsage =
     L"usage: devhost.exe [--arx PATH] [--order entry-first|module-first] [--drawings N]\n"
     L"                   [--layer NAME=ACI]... [--alert-box] [--after-ms MS --post accept|cancel]\n"
-    L"                   [--eval EXPR]... [--script FILE] [--verbose] [--timing]\n";
+    L"                   [--eval EXPR]... [--script FILE] [--verbose] [--timing]\n"
+    L"                   [--check-heaps] [--refuse-window CLASS-PREFIX]\n";
 
 namespace {
 
@@ -113,6 +114,15 @@ bool ParseOptions(const std::vector<std::wstring>& args, Options& options, std::
             options.verbose = true;
         } else if (option == L"--timing") {
             options.timing = true;
+        } else if (option == L"--check-heaps") {
+            options.checkHeaps = true;
+        } else if (option == L"--refuse-window") {
+            if (!value(options.refuseWindow))
+                return false;
+            if (options.refuseWindow.empty()) {
+                error = L"--refuse-window needs the beginning of a window class name";
+                return false;
+            }
         } else if (option == L"--help" || option == L"-h" || option == L"/?") {
             options.help = true;
         } else {

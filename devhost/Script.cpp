@@ -146,6 +146,7 @@ const CommandName kCommands[] = {
     {L"focus", ScriptCommand::Kind::Focus, false, false},
     {L"returned", ScriptCommand::Kind::Returned, false, true},
     {L"typed", ScriptCommand::Kind::Typed, false, false},
+    {L"double-click-time", ScriptCommand::Kind::DoubleClickTime, false, false},
     {L"echo", ScriptCommand::Kind::Echo, false, false},
 };
 

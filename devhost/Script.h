@@ -50,6 +50,7 @@ struct ScriptCommand {
         Focus,
         Returned,
         Typed,
+        DoubleClickTime,
         Echo
     };
     int line = 0;

@@ -570,6 +570,9 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
         Fact(L"returned");
         break;
     }
+    case Kind::DoubleClickTime:
+        Fact(L"double-click-time " + std::to_wstring(GetDoubleClickTime()));
+        break;
     case Kind::Typed:
         Fact(L"typed " + EscapeControls(TakeTypedText()));
         break;

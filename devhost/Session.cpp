@@ -12,7 +12,9 @@
 
 #include <windows.h>
 
+#include <cwchar>
 #include <memory>
+#include <vector>
 
 namespace devhost {
 namespace {
@@ -146,6 +148,46 @@ bool Session::LoadScript() {
     return true;
 }
 
+namespace {
+
+std::wstring g_refusedClassPrefix;
+
+// Refuses the creation of top-level windows of the named classes, as a system out of window handles
+// or memory would: the library must cope with a window that cannot be made.
+LRESULT CALLBACK RefuseWindowHook(int code, WPARAM wParam, LPARAM lParam) {
+    if (code == HCBT_CREATEWND) {
+        const auto* create = reinterpret_cast<const CBT_CREATEWNDW*>(lParam);
+        wchar_t className[256] = L"";
+        GetClassNameW(reinterpret_cast<HWND>(wParam), className, 256);
+        const std::size_t n = g_refusedClassPrefix.size();
+        if (!(create->lpcs->style & WS_CHILD) && std::wcslen(className) >= n &&
+            CompareStringOrdinal(className, static_cast<int>(n), g_refusedClassPrefix.c_str(), static_cast<int>(n),
+                                 TRUE) == CSTR_EQUAL) {
+            WriteLine(L"[host] refused to create a window of class " + std::wstring(className));
+            return 1;
+        }
+    }
+    return CallNextHookEx(nullptr, code, wParam, lParam);
+}
+
+} // namespace
+
+// Validates every heap of the process; with Wine's heap checks on (WINEDEBUG=warn+heap) that includes the
+// fill of freed blocks, so a write into a freed object shows here.
+static void CheckHeaps() {
+    std::vector<HANDLE> heaps(64);
+    DWORD count = GetProcessHeaps(static_cast<DWORD>(heaps.size()), heaps.data());
+    if (count > heaps.size()) {
+        heaps.resize(count);
+        count = GetProcessHeaps(count, heaps.data());
+    }
+    int damaged = 0;
+    for (DWORD i = 0; i < count && i < heaps.size(); ++i)
+        if (!HeapValidate(heaps[i], 0, nullptr))
+            ++damaged;
+    WriteLine(damaged ? L"[host] heap damaged (" + std::to_wstring(damaged) + L" heaps)" : L"[host] heaps valid");
+}
+
 bool Session::CreateWindows() {
     if (!RegisterHostClasses() || !m_frame.Create()) {
         WriteError(L"cannot create the host's windows: " + SystemMessage(GetLastError()));
@@ -153,6 +195,10 @@ bool Session::CreateWindows() {
     }
     Host().frame = m_frame.Handle();
     PumpMessages();
+    if (!m_options.refuseWindow.empty()) {
+        g_refusedClassPrefix = m_options.refuseWindow;
+        SetWindowsHookExW(WH_CBT, &RefuseWindowHook, nullptr, GetCurrentThreadId());
+    }
     return true;
 }
 
@@ -288,6 +334,8 @@ void Session::Evaluate(const std::wstring& expression) {
 
     m_entryPoint(AcRx::kInvkSubrMsg, host.appId);
     TimingCallEnded();
+    if (m_options.checkHeaps)
+        CheckHeaps();
 
     if (timer)
         KillTimer(nullptr, timer);

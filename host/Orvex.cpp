@@ -141,9 +141,20 @@ int OrvexWith(PickerPlatform& platform) {
             acutPrintf(L"\nOrvex: the start folder's shell path is too long; starting at the last folder\n");
     }
 
+    // However the run ends, even by an exception, the document goes (it saves the settings) and the
+    // host's drawing view takes the keyboard again.
+    struct EndOfRun {
+        PickerPlatform& platform;
+        ~EndOfRun() {
+            platform.DestroyDocument();
+            platform.FocusHostView();
+        }
+    } endOfRun{platform};
+
     const int result = platform.RunDialog();
     CTessel3Doc* doc = platform.Document();
-    if (result == 1 && doc) {
+    // Accept with no drawing chosen is a cancel: a folder is never returned as the picked drawing.
+    if (result == 1 && doc && !doc->m_strName.empty()) {
         const std::string picked = PickedPath(*doc);
         ads_list_user list;
         list + picked.c_str();
@@ -153,8 +164,5 @@ int OrvexWith(PickerPlatform& platform) {
     } else {
         acedRetNil();
     }
-
-    platform.DestroyDocument();
-    platform.FocusHostView();
     return 1;
 }

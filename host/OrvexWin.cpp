@@ -42,6 +42,29 @@ std::string SpecialFolderName(IShellFolder* desktop, int csidl) {
     return text;
 }
 
+// What a run changes of the host and the desktop, put back when it ends however it ends: the host's
+// main frame takes input exactly as before (the explorer disables it while it is open), and the
+// desktop's double-click time is the user's own again (the thumbnails run with 300 ms).
+class HostInputRestorer {
+public:
+    HostInputRestorer()
+        : m_frame(acedGetAcadFrame()), m_frameWasEnabled(m_frame && ::IsWindowEnabled(m_frame)),
+          m_doubleClickTime(::GetDoubleClickTime()) {}
+    ~HostInputRestorer() {
+        if (::GetDoubleClickTime() != m_doubleClickTime)
+            ::SetDoubleClickTime(m_doubleClickTime);
+        if (m_frame && ::IsWindow(m_frame) && (::IsWindowEnabled(m_frame) != FALSE) != m_frameWasEnabled)
+            ::EnableWindow(m_frame, m_frameWasEnabled);
+    }
+    HostInputRestorer(const HostInputRestorer&) = delete;
+    HostInputRestorer& operator=(const HostInputRestorer&) = delete;
+
+private:
+    HWND m_frame;
+    bool m_frameWasEnabled;
+    UINT m_doubleClickTime;
+};
+
 class WindowsPickerPlatform : public PickerPlatform {
 public:
     std::string StartShellPath(const std::string& path) override {
@@ -73,6 +96,7 @@ public:
     }
 
     int RunDialog() override {
+        HostInputRestorer restorer;
         CDialogRun dialog;
         return static_cast<int>(dialog.DoModal());
     }

@@ -58,6 +58,9 @@ TEST(Options, EveryOption) {
     EXPECT_TRUE(options.timing);
     EXPECT_EQ(Parse({L"--order", L"module-first"}).order, Options::Order::ModuleFirst);
     EXPECT_EQ(Parse({L"--after-ms", L"0", L"--post", L"accept"}).post, Options::Post::Accept);
+    EXPECT_EQ(Parse({L"--refuse-window", L"Orvex1:"}).refuseWindow, L"Orvex1:");
+    EXPECT_TRUE(Parse({L"--check-heaps"}).checkHeaps);
+    EXPECT_FALSE(Parse({}).checkHeaps);
 }
 
 TEST(Options, BadUsage) {
@@ -71,6 +74,7 @@ TEST(Options, BadUsage) {
     EXPECT_EQ(Error({L"--layer", L"A=257"}), L"--layer takes NAME=ACI with ACI from 0 to 256, not A=257");
     EXPECT_EQ(Error({L"--after-ms", L"10"}), L"--after-ms and --post go together");
     EXPECT_EQ(Error({L"--post", L"accept"}), L"--after-ms and --post go together");
+    EXPECT_EQ(Error({L"--refuse-window", L""}), L"--refuse-window needs the beginning of a window class name");
     EXPECT_EQ(Error({L"--after-ms", L"10", L"--post", L"maybe"}),
               L"--post takes accept or cancel, not maybe");
 }

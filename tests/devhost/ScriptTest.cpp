@@ -29,8 +29,9 @@ TEST(Script, CommentsAndBlankLinesAreSkipped) {
 }
 
 TEST(Script, ReturnedWaitsForTheCallAndTypedTakesNoWindow) {
-    const auto commands = Read(L"returned timeout=30000\ntyped\nreturned\n");
-    ASSERT_EQ(commands.size(), 3u);
+    const auto commands = Read(L"returned timeout=30000\ntyped\nreturned\ndouble-click-time\n");
+    ASSERT_EQ(commands.size(), 4u);
+    EXPECT_EQ(commands[3].kind, ScriptCommand::Kind::DoubleClickTime);
     EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::Returned);
     EXPECT_EQ(commands[0].timeoutMs, 30000);
     EXPECT_TRUE(commands[0].window.empty());

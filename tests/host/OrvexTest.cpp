@@ -7,6 +7,7 @@
 #include <filesystem>
 #include <fstream>
 #include <memory>
+#include <stdexcept>
 
 namespace fs = std::filesystem;
 
@@ -185,6 +186,30 @@ TEST_F(OrvexTest, PickReturnsLayerColorAndCommandOfTheFolder) {
     EXPECT_EQ(OrvexWith(platform), 1);
     fs::current_path(previous);
     EXPECT_EQ(host.result, "(\"folder\\a.dwg\" (\"Walls\" \"3\" \"(princ)\"))");
+}
+
+TEST_F(OrvexTest, AcceptWithNoDrawingChosenReturnsNilNotTheFolder) {
+    FiveArguments();
+    platform.dialogResult = 1;
+    platform.pickFolder = dir.string();
+    platform.pickName = "";
+    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(host.result, "nil");
+    EXPECT_EQ(platform.steps, (std::vector<std::string>{"dialog", "destroy", "focus"}));
+}
+
+TEST_F(OrvexTest, AnExceptionOutOfTheRunStillDestroysTheDocumentAndGivesTheFocusBack) {
+    struct ThrowingPlatform : FakePlatform {
+        int RunDialog() override {
+            FakePlatform::RunDialog();
+            throw std::runtime_error("run failed");
+        }
+    } throwing;
+    throwing.settingsFile = platform.settingsFile;
+    FiveArguments();
+    EXPECT_THROW(OrvexWith(throwing), std::runtime_error);
+    EXPECT_EQ(throwing.steps, (std::vector<std::string>{"dialog", "destroy", "focus"}));
+    EXPECT_EQ(host.liveNodes, 0);
 }
 
 TEST_F(OrvexTest, PickedPathAddsTheSeparatorToTheDocumentItself) {
