@@ -25,15 +25,20 @@ HostState& Host() {
 }
 
 namespace {
-std::atomic<bool> g_callRunning{false};
+std::atomic<int> g_callsPending{0};
 } // namespace
 
-void SetCallRunning(bool running) {
-    g_callRunning = running;
+void SetCallsPending(int count) {
+    g_callsPending = count;
 }
 
-bool CallRunning() {
-    return g_callRunning;
+void CallReturned() {
+    if (g_callsPending > 0)
+        --g_callsPending;
+}
+
+int CallsPending() {
+    return g_callsPending;
 }
 
 std::wstring UpperCase(std::wstring text) {

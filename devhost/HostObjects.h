@@ -100,9 +100,11 @@ struct HostState {
 
 HostState& Host();
 
-// Whether a LISP call is running; unlike HostState::inCall it may be read from the script's thread.
-void SetCallRunning(bool running);
-bool CallRunning();
+// How many LISP calls of the command line have not returned yet; unlike HostState::inCall it may be read
+// from the script's thread.
+void SetCallsPending(int count);
+void CallReturned();
+int CallsPending();
 
 // Upper case for layer names, lower case for LISP names (both ignore case).
 std::wstring UpperCase(std::wstring text);

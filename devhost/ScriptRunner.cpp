@@ -561,9 +561,9 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
     }
     case Kind::Returned: {
         const ULONGLONG deadline = GetTickCount64() + static_cast<ULONGLONG>(command.timeoutMs);
-        while (CallRunning()) {
+        while (CallsPending() > 0) {
             if (GetTickCount64() >= deadline)
-                throw ScriptError{L"the call has not returned within " + std::to_wstring(command.timeoutMs) +
+                throw ScriptError{L"the calls have not returned within " + std::to_wstring(command.timeoutMs) +
                                   L" ms"};
             Sleep(kPollMs);
         }

@@ -321,7 +321,6 @@ void Session::Evaluate(const std::wstring& expression) {
     host.functionCode = found->second;
     host.result = CallResult::Void;
     host.inCall = true;
-    SetCallRunning(true);
 
     UINT_PTR timer = 0;
     if (m_options.afterMs >= 0) {
@@ -340,7 +339,6 @@ void Session::Evaluate(const std::wstring& expression) {
     if (timer)
         KillTimer(nullptr, timer);
     host.inCall = false;
-    SetCallRunning(false);
     host.functionCode = RTERROR;
     switch (host.result) {
     case CallResult::Void:
@@ -353,6 +351,7 @@ void Session::Evaluate(const std::wstring& expression) {
         WriteLine(L"=> " + PrintChain(host.resultList));
         break;
     }
+    CallReturned(); // after the value is printed: a script that waits for it reads it there
     // The argument nodes the library did not release are still the host's.
     for (const resbuf* node : host.liveArgNodes) {
         resbuf* own = const_cast<resbuf*>(node);
@@ -391,8 +390,10 @@ int Session::Run() {
     }
     OpenDocuments();
 
+    SetCallsPending(static_cast<int>(m_options.evals.size()));
     for (const std::wstring& expression : m_options.evals)
         Evaluate(expression);
+    SetCallsPending(0);
     StartScript(); // a script runs even without a LISP call, on the host's own windows
     if (m_script && m_script->Started()) {
         WaitPumping(m_script->Thread());

@@ -22,10 +22,32 @@ winpath() { printf 'Z:%s' "$1" | tr '/' '\\'; }
 # The same, escaped as LISP prints it.
 lisppath() { winpath "$1" | sed 's/\\/\\\\/g'; }
 
+# The path of this machine for a Windows path of drive Z:.
+unixpath() { local p=${1#Z:}; printf '%s' "$p" | tr '\\' '/'; }
+
 # devhost ARGS... -> its standard output without carriage returns, in $OUT; exit code in $RC.
+# Every call is followed by the host checks: a script that does not end in them (or no script at all) gets
+# them appended, their lines are checked with expect_host_usable and taken out of $OUT, so that tests
+# compare only what the call printed.
 devhost() {
-  OUT=$("$WINE_RUN" "$DEVHOST" --arx "$(winpath "$ARX")" "$@" 2>"$WORK/stderr" | tr -d '\r')
+  local args=() script="" added=no
+  while [ $# -gt 0 ]; do
+    if [ "$1" == --script ] && [ $# -gt 1 ]; then script=$(unixpath "$2"); shift 2; else args+=("$1"); shift; fi
+  done
+  if [ -z "$script" ] || ! grep -q '^returned' "$script"; then
+    { [ -n "$script" ] && cat "$script"; echo 'echo host-checks'; printf '%s\n' "${HOST_CHECKS[@]}"; } \
+      >"$WORK/with-host-checks.txt"
+    script="$WORK/with-host-checks.txt"; added=yes
+  fi
+  OUT=$("$WINE_RUN" "$DEVHOST" --arx "$(winpath "$ARX")" --script "$(winpath "$script")" "${args[@]}" \
+        2>"$WORK/stderr" | tr -d '\r')
   RC=${PIPESTATUS[0]}
+  if [ "$added" == yes ]; then
+    calls=$((${calls:-0} + 1))
+    expect_host_usable "call $calls (${args[*]: -1})"
+    OUT=$(printf '%s\n' "$OUT" | awk '/^\[script\] host-checks$/ {h = 1; next} !(h && /^\[script\] /)')
+    [ "$RC" -eq 4 ] && ! printf '%s\n' "$OUT" | grep -q '^\[script\] error' && RC=0 # a failed host check only
+  fi
 }
 
 pass() { checks=$((checks + 1)); echo "ok: $1"; }
