@@ -17,18 +17,17 @@
 namespace {
 
 // Shows the folder the explorer starts in: scans it into the drawing list, makes it the current folder
-// and lays the grid out. A folder the scan refuses is said in the status bar.
-void ShowStartFolder(CMainFrame& frame, CTessel3Doc& doc) {
+// and lays the grid out. Returns what the scan has to say (a refused folder, files left out), or empty.
+std::string ShowStartFolder(CMainFrame& frame, CTessel3Doc& doc) {
     const std::string folder = StartFolder(g_szStartPath, doc.m_strPath);
     if (folder.empty())
-        return;
+        return {};
     std::string problem;
     ScanFolderPath(folder.c_str(), ".dwg", &problem);
     doc.m_strPath = folder;
     RebuildGrid();
     frame.UpdateLayerLabel();
-    if (!problem.empty())
-        frame.SetMessageText(problem);
+    return problem;
 }
 
 RECT VirtualScreen() {
@@ -139,8 +138,9 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog) {
     m_pMainWnd = dialog;
     frame->InitialUpdateFrame(doc, false);
     // Without the folder tree to pick it, the grid shows the start folder.
+    std::string scanProblem;
     if (!HasFolderTree())
-        ShowStartFolder(*frame, *doc);
+        scanProblem = ShowStartFolder(*frame, *doc);
 
     // 6. Placement from the dialog's rectangle and the stored size, on a monitor of this desktop.
     const CRect rcDialog = dialog->GetWindowRect();
@@ -171,5 +171,8 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog) {
         search.SetWindowText(SearchTextOf(saved));
         ChooseSavedDrawing(saved);
     }
+    // Said last: the search above has its own message for the status bar.
+    if (!scanProblem.empty())
+        frame->SetMessageText(scanProblem);
     return true;
 }

@@ -41,6 +41,7 @@ void MakeCurrent(const std::string& name) {
         g_pTessel3Doc->m_strName = name;
     FrameSetTitle(CurrentDirectory() + "\\" + name);
     FrameEnablePick(true);
+    FrameSetStatusText(std::string()); // a search's "no drawing starts with" is over
 }
 
 } // namespace

@@ -201,8 +201,11 @@ void CTessel3View::Refresh() {
     }
     if (folder.size() > 3 && folder.back() == '\\') // "C:\" keeps its separator
         folder.pop_back();
-    ScanFolderPath(folder.c_str(), ".dwg");
+    std::string problem;
+    ScanFolderPath(folder.c_str(), ".dwg", &problem);
     Rebuild();
+    if (!problem.empty())
+        FrameSetStatusText(problem);
 }
 
 exCDwgThumbnail* CTessel3View::ControlOf(int index) {
