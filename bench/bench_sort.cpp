@@ -67,7 +67,7 @@ int main() {
     std::printf("%-44s %12s\n", "order", "ms");
     std::printf("%-44s %12s\n", "--------------------------------------------", "------------");
 
-    const char* modes[] = {"SortDwgList by name (byte-wise, ASCII fold)", "SortDwgList by date",
+    const char* modes[] = {"SortDwgList by name (byte-wise, code-page fold)", "SortDwgList by date",
                            "SortDwgList by size"};
     for (int mode = 0; mode < 3; ++mode) {
         std::vector<double> runs;
