@@ -57,6 +57,10 @@ type "$prefix"
 sleep 500
 screenshot $frame $(win docs/explorer-search.png)
 double-click text="$pick" at=60,-50
+# The call has returned: the host takes input again.
+returned timeout=30000
+enabled class=DevhostFrame
+focus
 SCRIPT
 tools/wine-run build/windows/bin/devhost.exe --script "$(win "$script")" --eval "$call" | tr -d '\r'
 echo "Screenshots: docs/explorer.png, docs/explorer-tooltip.png, docs/explorer-search.png"
