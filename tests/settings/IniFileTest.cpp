@@ -1,6 +1,6 @@
 #include "settings/IniFile.h"
 
-#include "TempDir.h"
+#include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
 
@@ -14,6 +14,8 @@
 #include <sys/stat.h>
 #include <unistd.h>
 #endif
+
+using namespace testsupport; // TempFolder and the whole-file helpers
 
 namespace {
 
@@ -47,7 +49,7 @@ protected:
         return *m_read;
     }
 
-    TempDir m_dir;
+    TempFolder m_dir;
     std::unique_ptr<CIniFile> m_read;
 };
 

@@ -3,7 +3,7 @@
 #include "settings/SettingsPath.h"
 
 #include "ReportedMessages.h"
-#include "TempDir.h"
+#include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
 
@@ -13,6 +13,8 @@
 #include <random>
 #include <string>
 #include <vector>
+
+using namespace testsupport; // TempFolder and the whole-file helpers
 
 namespace {
 
@@ -46,7 +48,7 @@ void ExpectDefaults(const CTessel3Doc& doc) {
 
 class Tessel3DocTest : public ::testing::Test {
 protected:
-    TempDir m_dir;
+    TempFolder m_dir;
 };
 
 } // namespace

@@ -1,6 +1,7 @@
 #include "GridTestSupport.h"
 
 #include "host/HostApi.h"
+#include "tests/support/TempFolder.h"
 #include "thumbs/ThumbsGlue.h"
 
 #include <gtest/gtest.h>
@@ -250,9 +251,8 @@ GridBench::GridBench(int clientWidth, int clientHeight, const std::string& setti
     Main().results.clear();
     Frame() = FrameRecord{};
     Paints() = PaintRecord{};
-    char temp[MAX_PATH];
-    ::GetTempPathA(MAX_PATH, temp);
-    m_settings = std::string(temp) + "orvex-grid-test.ini";
+    static const testsupport::TempFolder scratch("orvex-grid"); // one for the program, removed at its end
+    m_settings = scratch.File("orvex-grid-test.ini");
     ::DeleteFileA(m_settings.c_str());
     if (!settingsText.empty()) {
         if (FILE* f = std::fopen(m_settings.c_str(), "wb")) {

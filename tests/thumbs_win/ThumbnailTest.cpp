@@ -3,6 +3,7 @@
 #include "GridTestSupport.h"
 
 #include "res/resource.h"
+#include "tests/support/TempFolder.h"
 #include "thumbs/ThumbSearch.h"
 
 #include <gtest/gtest.h>
@@ -177,51 +178,15 @@ TEST(ThumbnailTooltip, NameSizeAndLocalDateInOneNarrowTip) {
 
 // ---- rename -------------------------------------------------------------------------------------------
 
-class TempFolder {
-public:
-    TempFolder() {
-        char base[MAX_PATH];
-        ::GetTempPathA(MAX_PATH, base);
-        m_path = std::string(base) + "orvex-rename-" + std::to_string(::GetCurrentProcessId());
-        ::CreateDirectoryA(m_path.c_str(), nullptr);
-    }
-    ~TempFolder() {
-        char base[MAX_PATH];
-        ::GetTempPathA(MAX_PATH, base);
-        ::SetCurrentDirectoryA(base);
-        WIN32_FIND_DATAA fd;
-        HANDLE h = ::FindFirstFileA((m_path + "\\*").c_str(), &fd);
-        if (h != INVALID_HANDLE_VALUE) {
-            do {
-                ::DeleteFileA((m_path + "\\" + fd.cFileName).c_str());
-            } while (::FindNextFileA(h, &fd));
-            ::FindClose(h);
-        }
-        ::RemoveDirectoryA(m_path.c_str());
-    }
-    TempFolder(const TempFolder&) = delete;
-    TempFolder& operator=(const TempFolder&) = delete;
-    void File(const std::string& name) {
-        HANDLE h = ::CreateFileA((m_path + "\\" + name).c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS,
-                                 FILE_ATTRIBUTE_NORMAL, nullptr);
-        ::CloseHandle(h);
-    }
-    bool Exists(const std::string& name) const {
-        return ::GetFileAttributesA((m_path + "\\" + name).c_str()) != INVALID_FILE_ATTRIBUTES;
-    }
-    const std::string& path() const { return m_path; }
-
-private:
-    std::string m_path;
-};
+using testsupport::TempFolder;
 
 class RenameTest : public ::testing::Test {
 protected:
     void SetUp() override {
-        m_folder.File("a.dwg");
-        m_folder.File("b.dwg");
-        ASSERT_EQ(ScanFolderPath(m_folder.path().c_str(), ".dwg"), 1);
-        g_pTessel3Doc->m_strPath = m_folder.path();
+        m_folder.Write("a.dwg", "");
+        m_folder.Write("b.dwg", "");
+        ASSERT_EQ(ScanFolderPath(m_folder.Dir().c_str(), ".dwg"), 1);
+        g_pTessel3Doc->m_strPath = m_folder.Dir();
         Frame().sortMode = 0;
         m_bench.view().Rebuild();
         Pump();
