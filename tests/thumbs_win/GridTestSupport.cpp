@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include <cstdio>
+#include <stdexcept>
 
 // ---- the frame's side of the glue, recorded ---------------------------------------------------------
 
@@ -264,6 +265,12 @@ GridBench::GridBench(int clientWidth, int clientHeight, const std::string& setti
     m_frame.CreateFrame(clientWidth, clientHeight);
     Frame().frame = m_frame.m_hWnd;
     Pump();
+}
+
+CTessel3View& GridBench::view() {
+    if (!m_frame.view)
+        throw std::runtime_error("the test frame has no grid view");
+    return *m_frame.view;
 }
 
 GridBench::~GridBench() {

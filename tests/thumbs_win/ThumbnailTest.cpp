@@ -28,6 +28,10 @@ void Click(exCDwgThumbnail* control, WPARAM flags, UINT message = WM_LBUTTONDOWN
 }
 
 bool LabelHighlighted(exCDwgThumbnail* control) {
+    if (!control) {
+        ADD_FAILURE() << "no thumbnail control";
+        return false;
+    }
     int start = 0, end = 0;
     control->Label().GetSel(start, end);
     return start == 0 && end == control->Label().GetWindowTextLength() && end > 0;
@@ -41,6 +45,7 @@ TEST(ThumbnailClick, PlainClickSelectsOnlyThisOne) {
     DwgList[3].Select();
     DwgList[7].Select();
     exCDwgThumbnail* control = bench.view().ControlOf(5);
+    ASSERT_NE(control, nullptr);
     Click(control, MK_LBUTTON);
     for (int i = 0; i < 12; ++i)
         EXPECT_EQ(DwgList[i].IsSelected(), i == 5) << i;
@@ -69,6 +74,7 @@ TEST(ThumbnailClick, CtrlClickTogglesOnlyThisOne) {
     EXPECT_FALSE(Frame().pickEnabled);
     EXPECT_EQ(g_pTessel3Doc->m_strName, "");
     EXPECT_EQ(Frame().title, CurrentDir());
+    ASSERT_NE(bench.view().ControlOf(1), nullptr);
     EXPECT_EQ(::GetFocus(), bench.view().ControlOf(1)->m_hWnd);
 }
 
@@ -108,6 +114,7 @@ TEST(ThumbnailClick, RightClickSelectsWithoutClearingOthers) {
     Pump();
     DwgList[0].Select();
     exCDwgThumbnail* control = bench.view().ControlOf(2);
+    ASSERT_NE(control, nullptr);
     // The context menu waits for the user: a timer keeps dismissing it until it is gone.
     struct Dismiss {
         static void CALLBACK Tick(HWND, UINT, UINT_PTR, DWORD) { ::EndMenu(); }
@@ -193,8 +200,11 @@ protected:
     }
     CThumbLabel& LabelOf(const std::string& name) {
         for (int i = 0; i < DwgList.GetSize(); ++i) {
-            if (DwgList[i].m_strName == name)
-                return m_bench.view().ControlOf(i)->Label();
+            if (DwgList[i].m_strName != name)
+                continue;
+            if (exCDwgThumbnail* control = m_bench.view().ControlOf(i))
+                return control->Label();
+            throw std::runtime_error("no control shows " + name);
         }
         throw std::runtime_error("no such drawing");
     }
@@ -229,7 +239,7 @@ TEST_F(RenameTest, DoubleClickOnTheLabelBeginsEnterCommits) {
     // The folder was scanned again and the grid rebuilt.
     ASSERT_EQ(DwgList.GetSize(), 2);
     EXPECT_EQ(DwgList[0].m_strName == "c.dwg" || DwgList[1].m_strName == "c.dwg", true);
-    EXPECT_NO_THROW(LabelOf("c.dwg"));
+    EXPECT_EQ(LabelOf("c.dwg").GetWindowText(), "c.dwg");
 }
 
 TEST_F(RenameTest, EscapeRestoresTheOldName) {
@@ -438,6 +448,7 @@ std::string MenuKeys::keys;
 HWND MenuKeys::target = nullptr;
 
 void RightClickAndType(exCDwgThumbnail* control, const std::string& keys) {
+    ASSERT_NE(control, nullptr);
     MenuKeys::keys = keys;
     MenuKeys::target = control->m_hWnd;
     const UINT_PTR timer = ::SetTimer(nullptr, 0, 150, &MenuKeys::Tick);
@@ -462,6 +473,7 @@ TEST(ThumbnailMenu, RenameEntryStartsTheRename) {
     bench.view().Rebuild();
     Pump();
     exCDwgThumbnail* control = bench.view().ControlOf(2);
+    ASSERT_NE(control, nullptr);
     RightClickAndType(control, "r");
     EXPECT_TRUE(control->Label().IsRenaming());
     EXPECT_FALSE(control->Label().GetStyle() & ES_READONLY);
@@ -508,6 +520,7 @@ TEST(ThumbnailRename, SunkenEdgeAroundTheLabelOnlyWhileRenaming) {
     FillList(6);
     bench.view().Rebuild();
     Pump();
+    ASSERT_NE(bench.view().ControlOf(4), nullptr);
     CThumbLabel& label = bench.view().ControlOf(4)->Label();
     const CRect edge = label.EdgeRect();
     const COLORREF background = Nearest(bench.view(), ::GetSysColor(COLOR_SCROLLBAR));
@@ -540,6 +553,7 @@ TEST(ThumbnailTooltip, ActiveOnceTheMouseMovesOverThePicture) {
     ::PostMessageA(control->m_hWnd, WM_MOUSEMOVE, 0, MAKELPARAM(20, 20));
     Pump();
     EXPECT_TRUE(control->ToolTipActive());
+    ASSERT_NE(bench.view().ControlOf(0), nullptr);
     EXPECT_FALSE(bench.view().ControlOf(0)->ToolTipActive());
 }
 
