@@ -1,5 +1,4 @@
 // devhost.exe: the development host. See devhost/README.md for the command line and the output.
-#include "devhost/HostPrintf.h"
 #include "devhost/Options.h"
 #include "devhost/Output.h"
 #include "devhost/Session.h"
@@ -11,17 +10,6 @@
 #include <vector>
 
 namespace {
-
-// %hs text is in the ANSI code page, as the library's narrow text is.
-std::wstring FromAnsi(const char* text) {
-    const int length = MultiByteToWideChar(CP_ACP, 0, text, -1, nullptr, 0);
-    if (length <= 0)
-        return std::wstring();
-    std::wstring wide(static_cast<std::size_t>(length), L'\0');
-    MultiByteToWideChar(CP_ACP, 0, text, -1, wide.data(), length);
-    wide.resize(static_cast<std::size_t>(length) - 1);
-    return wide;
-}
 
 std::vector<std::wstring> Arguments() {
     std::vector<std::wstring> args;
@@ -39,7 +27,6 @@ std::vector<std::wstring> Arguments() {
 
 int main() {
     try {
-        devhost::SetNarrowConverter(&FromAnsi);
         INITCOMMONCONTROLSEX controls{sizeof controls, ICC_WIN95_CLASSES | ICC_STANDARD_CLASSES};
         InitCommonControlsEx(&controls);
 

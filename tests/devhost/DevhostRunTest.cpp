@@ -2,6 +2,7 @@
 // command line (standard output) and its exit code.
 #include "devhost/Bitmap.h"
 #include "devhost/Text.h"
+#include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
 #include <windows.h>
@@ -148,9 +149,8 @@ Lines WithCalls(const Lines& calls) {
 }
 
 std::wstring TempFile(const std::wstring& name) {
-    wchar_t directory[MAX_PATH] = {};
-    GetTempPathW(MAX_PATH, directory);
-    return std::wstring(directory) + L"devhost-test-" + std::to_wstring(GetCurrentProcessId()) + L"-" + name;
+    static const testsupport::TempFolder scratch("devhost-test"); // one for the program, removed at its end
+    return (scratch.Path() / name).wstring();
 }
 
 void WriteFileText(const std::wstring& path, const std::string& text) {

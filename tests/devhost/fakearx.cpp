@@ -90,7 +90,7 @@ void Nothing() {
 void Void() {}
 
 void Talk() {
-    Host().acutPrintf(L"\nhello %s %d %.2f %hs", L"wide", 42, 1.5, "narrow");
+    Host().acutPrintf(L"\nhello %ls %d %ls", L"wide", 42, L"1.50 narrow");
     Host().acedAlert(L"\nline1\nline2\t\\end");
     Host().acdbFail(L"oops\n");
 }

@@ -1,26 +1,15 @@
 #include "FakeHost.h"
 #include "host/EntryPoint.h"
 #include "host/Orvex.h"
+#include "tests/support/CancellingPicker.h"
 
 #include <gtest/gtest.h>
 
 namespace {
 
-struct CountingPlatform : PickerPlatform {
-    int runs = 0;
-    std::string StartShellPath(const std::string&) override { return {}; }
-    int RunDialog() override {
-        ++runs;
-        return 2;
-    }
-    CTessel3Doc* Document() override { return nullptr; }
-    void DestroyDocument() override {}
-    void FocusHostView() override {}
-};
-
 struct EntryPointTest : ::testing::Test {
     FakeHost host;
-    CountingPlatform platform;
+    testsupport::CancellingPicker platform;
     void SetUp() override { SetPickerPlatform(&platform); }
     void TearDown() override { SetPickerPlatform(nullptr); }
     void* appId = reinterpret_cast<void*>(std::uintptr_t{42});

@@ -1,5 +1,7 @@
 #include "FakeHost.h"
 
+#include "devhost/ResultBuffers.h"
+
 #include <cstdarg>
 #include <cstdio>
 #include <cstdlib>
@@ -24,64 +26,44 @@ bool Allocate() {
     return true;
 }
 
+int CountNodes(const resbuf* rb) {
+    int count = 0;
+    for (; rb; rb = rb->rbnext)
+        ++count;
+    return count;
+}
+
+// The nodes and strings are devhost's, so the library meets the same heap rules as in the real host;
+// the fake adds the counting and the refused allocations.
 resbuf* NewNode(int type) {
     if (!Allocate())
         return nullptr;
-    auto* rb = static_cast<resbuf*>(std::calloc(1, sizeof(resbuf)));
-    rb->restype = static_cast<short>(type);
-    ++FakeHost::current->liveNodes;
+    resbuf* rb = devhost::NewNode(type);
+    if (rb)
+        ++FakeHost::current->liveNodes;
     return rb;
 }
 
 int RelRb(resbuf* rb) {
-    while (rb) {
-        resbuf* next = rb->rbnext;
-        if (rb->restype == RTSTR)
-            std::free(rb->resval.rstring);
-        std::free(rb);
-        --FakeHost::current->liveNodes;
-        rb = next;
-    }
+    FakeHost::current->liveNodes -= CountNodes(rb);
+    devhost::FreeChain(rb);
     return RTNORM;
-}
-
-wchar_t* CopyText(const wchar_t* text) {
-    std::size_t bytes = (std::wcslen(text) + 1) * sizeof(wchar_t);
-    auto* copy = static_cast<wchar_t*>(std::malloc(bytes));
-    std::memcpy(copy, text, bytes);
-    return copy;
 }
 
 resbuf* BuildList(int type, ...) {
     va_list ap;
     va_start(ap, type);
-    resbuf* head = nullptr;
-    resbuf** link = &head;
-    while (type != 0) {
-        resbuf* rb = NewNode(type);
-        if (!rb) {
-            RelRb(head);
-            va_end(ap);
+    resbuf* head = devhost::BuildChainV(type, ap);
+    va_end(ap);
+    // A refused allocation anywhere in the chain refuses the whole list, as the host does.
+    const int nodes = CountNodes(head);
+    for (int i = 0; i < nodes; ++i) {
+        if (!Allocate()) {
+            devhost::FreeChain(head);
             return nullptr;
         }
-        switch (type) {
-        case RTSTR:
-            rb->resval.rstring = CopyText(va_arg(ap, const wchar_t*));
-            break;
-        case RTSHORT:
-            rb->resval.rint = static_cast<short>(va_arg(ap, int));
-            break;
-        case RTREAL:
-            rb->resval.rreal = va_arg(ap, double);
-            break;
-        default:
-            break; // RTLB, RTLE, RTNIL carry no value
-        }
-        *link = rb;
-        link = &rb->rbnext;
-        type = va_arg(ap, int);
     }
-    va_end(ap);
+    FakeHost::current->liveNodes += nodes;
     return head;
 }
 
@@ -206,31 +188,33 @@ std::string FakeHost::printed() const {
     return all;
 }
 
-void FakeHost::AddShort(short v) {
-    resbuf* rb = NewNode(RTSHORT);
-    rb->resval.rint = v;
+namespace {
+
+void Append(resbuf*& args, resbuf* node) {
     resbuf** link = &args;
     while (*link)
         link = &(*link)->rbnext;
-    *link = rb;
+    *link = node;
+}
+
+} // namespace
+
+void FakeHost::AddShort(short v) {
+    resbuf* rb = NewNode(RTSHORT);
+    rb->resval.rint = v;
+    Append(args, rb);
 }
 
 void FakeHost::AddString(const std::wstring& s) {
     resbuf* rb = NewNode(RTSTR);
-    rb->resval.rstring = CopyText(s.c_str());
-    resbuf** link = &args;
-    while (*link)
-        link = &(*link)->rbnext;
-    *link = rb;
+    rb->resval.rstring = devhost::DuplicateString(s.c_str());
+    Append(args, rb);
 }
 
 void FakeHost::AddReal(double v) {
     resbuf* rb = NewNode(RTREAL);
     rb->resval.rreal = v;
-    resbuf** link = &args;
-    while (*link)
-        link = &(*link)->rbnext;
-    *link = rb;
+    Append(args, rb);
 }
 
 std::string PrintChain(const resbuf* rb) {

@@ -1,6 +1,7 @@
 #include "FakeHost.h"
 #include "host/Orvex.h"
 #include "settings/Tessel3Doc.h"
+#include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
 
@@ -44,17 +45,10 @@ struct FakePlatform : PickerPlatform {
 struct OrvexTest : ::testing::Test {
     FakeHost host;
     FakePlatform platform;
-    fs::path dir;
+    testsupport::TempFolder folder;
+    const fs::path dir = folder.Path();
 
-    void SetUp() override {
-        dir = fs::temp_directory_path() /
-              ("orvex-test-" + std::to_string(::testing::UnitTest::GetInstance()->random_seed()) +
-               ::testing::UnitTest::GetInstance()->current_test_info()->name());
-        fs::remove_all(dir);
-        fs::create_directories(dir);
-        platform.settingsFile = dir / "Orvex1.ini";
-    }
-    void TearDown() override { fs::remove_all(dir); }
+    void SetUp() override { platform.settingsFile = dir / "Orvex1.ini"; }
 
     void FiveArguments(const std::wstring& path = L"", const std::wstring& ok = L"",
                        const std::wstring& cancel = L"") {

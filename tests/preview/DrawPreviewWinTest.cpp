@@ -4,6 +4,7 @@
 #include "thumbs/preview/DwgPreview.h"
 
 #include "SyntheticDwg.h"
+#include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
 
@@ -85,9 +86,8 @@ std::wstring Wide(const std::string& s) {
 }
 
 std::string TempFile(const char* name) {
-    char dir[MAX_PATH];
-    GetTempPathA(MAX_PATH, dir);
-    return std::string(dir) + name;
+    static const testsupport::TempFolder scratch("orvex-draw"); // one for the program, removed at its end
+    return scratch.File(name);
 }
 
 void WriteAll(const std::string& path, const std::vector<unsigned char>& bytes) {

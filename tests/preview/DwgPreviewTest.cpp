@@ -1,6 +1,7 @@
 #include "thumbs/preview/DwgPreview.h"
 
 #include "SyntheticDwg.h"
+#include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
 
@@ -39,12 +40,8 @@ void WriteAll(const std::string& path, const std::vector<unsigned char>& bytes) 
 }
 
 std::string TempDir() {
-    const char* tmp = std::getenv("TMPDIR");
-#ifdef _WIN32
-    if (tmp == nullptr)
-        tmp = std::getenv("TEMP");
-#endif
-    return tmp != nullptr ? tmp : "/tmp";
+    static const testsupport::TempFolder scratch("orvex-preview"); // one for the program, removed at its end
+    return scratch.Dir();
 }
 
 void MakeDir(const std::string& path) {

@@ -5,7 +5,7 @@
 
 #include "ReportedMessages.h"
 #include "TaggedStore.h"
-#include "TempDir.h"
+#include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
 
@@ -27,6 +27,8 @@
 #include <unistd.h>
 #endif
 
+using namespace testsupport; // TempFolder and the whole-file helpers
+
 namespace {
 
 // A file of exactly `size` bytes: section S with 100-byte value lines k0000000=vvv...
@@ -43,14 +45,6 @@ std::string IniOfSize(std::size_t size) {
     return text;
 }
 
-std::vector<std::string> FilesIn(const std::string& dir) {
-    std::vector<std::string> files;
-    for (const auto& entry : std::filesystem::directory_iterator(dir))
-        files.push_back(entry.path().filename().string());
-    std::sort(files.begin(), files.end());
-    return files;
-}
-
 void MakeReadOnly(const std::string& fileName, bool readOnly) {
     using std::filesystem::perms;
     std::filesystem::permissions(fileName, perms::owner_write | perms::group_write | perms::others_write,
@@ -64,7 +58,7 @@ std::string NotSaved(const std::string& fileName, const std::string& why) {
 
 class IniGuardTest : public ::testing::Test {
 protected:
-    TempDir m_dir;
+    TempFolder m_dir;
     ReportedMessages m_reported;
 };
 
@@ -434,7 +428,7 @@ TEST_F(IniGuardTest, PipeInPlaceOfTheFileDoesNotHang) {
 namespace {
 
 // The bytes WriteFile makes of the tagged store.
-std::string TaggedBytes(const TempDir& dir, const std::string& tag) {
+std::string TaggedBytes(const TempFolder& dir, const std::string& tag) {
     CIniFile ini(dir.File("expected-" + tag + ".ini"));
     FillTaggedStore(ini, tag);
     EXPECT_TRUE(ini.WriteFile());

@@ -1,7 +1,7 @@
 #include "settings/SettingsPath.h"
 
 #include "ReportedMessages.h"
-#include "TempDir.h"
+#include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
 
@@ -123,7 +123,7 @@ TEST(SettingsPathTest, UnknownModuleNameIsRefused) {
 #ifndef _WIN32
 TEST(SettingsPathTest, NativelyTooLongACurrentDirectoryGivesNoName) {
     ReportedMessages reported;
-    TempDir dir;
+    testsupport::TempFolder dir;
     std::filesystem::path deep = dir.Dir();
     while (deep.string().size() < 300)
         deep /= "a-rather-long-folder-name";

@@ -6,7 +6,7 @@
 
 #include "ReportedMessages.h"
 #include "TaggedStore.h"
-#include "TempDir.h"
+#include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
 
@@ -17,6 +17,8 @@
 #include <memory>
 #include <string>
 #include <vector>
+
+using namespace testsupport; // TempFolder and the whole-file helpers
 
 namespace {
 
@@ -64,7 +66,7 @@ private:
 // Another process holds a file open without sharing until Release (or the object goes).
 class FileHolder {
 public:
-    FileHolder(const TempDir& signals, const std::string& fileName)
+    FileHolder(const TempFolder& signals, const std::string& fileName)
         : m_ready(signals.File("ready")), m_release(signals.File("release")),
           m_helper("hold \"" + fileName + "\" \"" + m_ready + "\" \"" + m_release + "\" 60000") {
         for (int i = 0; i < 1000 && !FileExists(m_ready); ++i)
@@ -84,22 +86,14 @@ private:
     Helper m_helper;
 };
 
-std::vector<std::string> FilesIn(const std::string& dir) {
-    std::vector<std::string> files;
-    for (const auto& entry : std::filesystem::directory_iterator(dir))
-        files.push_back(entry.path().filename().string());
-    std::sort(files.begin(), files.end());
-    return files;
-}
-
 std::string NotSaved(const std::string& fileName, const std::string& why) {
     return "\nOrvex: " + fileName + " was not saved: " + why + "; the file is left as it was\n";
 }
 
 class SettingsWinTest : public ::testing::Test {
 protected:
-    TempDir m_dir;
-    TempDir m_signals; // the holder's ready and release files, apart from the settings file
+    TempFolder m_dir;
+    TempFolder m_signals; // the holder's ready and release files, apart from the settings file
     ReportedMessages m_reported;
 };
 

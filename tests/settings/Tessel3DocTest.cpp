@@ -3,7 +3,7 @@
 #include "settings/SettingsPath.h"
 
 #include "ReportedMessages.h"
-#include "TempDir.h"
+#include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
 
@@ -13,6 +13,8 @@
 #include <random>
 #include <string>
 #include <vector>
+
+using namespace testsupport; // TempFolder and the whole-file helpers
 
 namespace {
 
@@ -46,7 +48,7 @@ void ExpectDefaults(const CTessel3Doc& doc) {
 
 class Tessel3DocTest : public ::testing::Test {
 protected:
-    TempDir m_dir;
+    TempFolder m_dir;
 };
 
 } // namespace
@@ -169,7 +171,7 @@ TEST_F(Tessel3DocTest, DirectoryInPlaceOfTheFileIsPassedOver) {
         ASSERT_NO_THROW(doc = std::make_unique<CTessel3Doc>(fileName));
         ExpectDefaults(*doc);
         doc->m_nSort = 1;
-        EXPECT_NO_THROW(doc.reset());
+        doc.reset(); // the close writes, or passes over the file: what it did is checked below
     }
     EXPECT_TRUE(std::filesystem::is_directory(fileName));
 }
@@ -181,7 +183,7 @@ TEST_F(Tessel3DocTest, UnwritableFileIsPassedOver) {
         ASSERT_NO_THROW(doc = std::make_unique<CTessel3Doc>(fileName));
         ExpectDefaults(*doc);
         doc->m_strPath = "C:\\x\\";
-        EXPECT_NO_THROW(doc.reset());
+        doc.reset(); // the close writes, or passes over the file: what it did is checked below
     }
     EXPECT_FALSE(FileExists(fileName));
 }
@@ -249,7 +251,7 @@ protected:
             ASSERT_NO_THROW(doc = std::make_unique<CTessel3Doc>(fileName));
             doc->m_strPath = "C:\\changed\\";
             doc->m_nSort = 2;
-            EXPECT_NO_THROW(doc.reset());
+            doc.reset(); // the close writes, or passes over the file: what it did is checked below
         }
         EXPECT_EQ(ReadBytes(fileName), text);
         const std::vector<std::string> texts = m_reported.Texts();

@@ -1,11 +1,13 @@
 #include "GridTestSupport.h"
 
 #include "host/HostApi.h"
+#include "tests/support/TempFolder.h"
 #include "thumbs/ThumbsGlue.h"
 
 #include <gtest/gtest.h>
 
 #include <cstdio>
+#include <stdexcept>
 
 // ---- the frame's side of the glue, recorded ---------------------------------------------------------
 
@@ -250,9 +252,8 @@ GridBench::GridBench(int clientWidth, int clientHeight, const std::string& setti
     Main().results.clear();
     Frame() = FrameRecord{};
     Paints() = PaintRecord{};
-    char temp[MAX_PATH];
-    ::GetTempPathA(MAX_PATH, temp);
-    m_settings = std::string(temp) + "orvex-grid-test.ini";
+    static const testsupport::TempFolder scratch("orvex-grid"); // one for the program, removed at its end
+    m_settings = scratch.File("orvex-grid-test.ini");
     ::DeleteFileA(m_settings.c_str());
     if (!settingsText.empty()) {
         if (FILE* f = std::fopen(m_settings.c_str(), "wb")) {
@@ -264,6 +265,12 @@ GridBench::GridBench(int clientWidth, int clientHeight, const std::string& setti
     m_frame.CreateFrame(clientWidth, clientHeight);
     Frame().frame = m_frame.m_hWnd;
     Pump();
+}
+
+CTessel3View& GridBench::view() {
+    if (!m_frame.view)
+        throw std::runtime_error("the test frame has no grid view");
+    return *m_frame.view;
 }
 
 GridBench::~GridBench() {

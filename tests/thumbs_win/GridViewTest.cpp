@@ -390,6 +390,7 @@ TEST(GridSort, RebuildSortsByTheFrameModeKeepingTheLastRecord) {
     EXPECT_EQ(DwgList[1].m_strName, "c.dwg");
     EXPECT_EQ(DwgList[2].m_strName, "d.dwg");
     EXPECT_EQ(DwgList[3].m_strName, "b.dwg");
+    ASSERT_NE(bench.view().ControlOf(0), nullptr);
     EXPECT_EQ(bench.view().ControlOf(0)->Label().GetWindowText(), "a.dwg");
 }
 

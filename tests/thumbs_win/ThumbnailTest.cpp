@@ -3,6 +3,7 @@
 #include "GridTestSupport.h"
 
 #include "res/resource.h"
+#include "tests/support/TempFolder.h"
 #include "thumbs/ThumbSearch.h"
 
 #include <gtest/gtest.h>
@@ -27,6 +28,10 @@ void Click(exCDwgThumbnail* control, WPARAM flags, UINT message = WM_LBUTTONDOWN
 }
 
 bool LabelHighlighted(exCDwgThumbnail* control) {
+    if (!control) {
+        ADD_FAILURE() << "no thumbnail control";
+        return false;
+    }
     int start = 0, end = 0;
     control->Label().GetSel(start, end);
     return start == 0 && end == control->Label().GetWindowTextLength() && end > 0;
@@ -40,6 +45,7 @@ TEST(ThumbnailClick, PlainClickSelectsOnlyThisOne) {
     DwgList[3].Select();
     DwgList[7].Select();
     exCDwgThumbnail* control = bench.view().ControlOf(5);
+    ASSERT_NE(control, nullptr);
     Click(control, MK_LBUTTON);
     for (int i = 0; i < 12; ++i)
         EXPECT_EQ(DwgList[i].IsSelected(), i == 5) << i;
@@ -68,6 +74,7 @@ TEST(ThumbnailClick, CtrlClickTogglesOnlyThisOne) {
     EXPECT_FALSE(Frame().pickEnabled);
     EXPECT_EQ(g_pTessel3Doc->m_strName, "");
     EXPECT_EQ(Frame().title, CurrentDir());
+    ASSERT_NE(bench.view().ControlOf(1), nullptr);
     EXPECT_EQ(::GetFocus(), bench.view().ControlOf(1)->m_hWnd);
 }
 
@@ -107,6 +114,7 @@ TEST(ThumbnailClick, RightClickSelectsWithoutClearingOthers) {
     Pump();
     DwgList[0].Select();
     exCDwgThumbnail* control = bench.view().ControlOf(2);
+    ASSERT_NE(control, nullptr);
     // The context menu waits for the user: a timer keeps dismissing it until it is gone.
     struct Dismiss {
         static void CALLBACK Tick(HWND, UINT, UINT_PTR, DWORD) { ::EndMenu(); }
@@ -177,59 +185,26 @@ TEST(ThumbnailTooltip, NameSizeAndLocalDateInOneNarrowTip) {
 
 // ---- rename -------------------------------------------------------------------------------------------
 
-class TempFolder {
-public:
-    TempFolder() {
-        char base[MAX_PATH];
-        ::GetTempPathA(MAX_PATH, base);
-        m_path = std::string(base) + "orvex-rename-" + std::to_string(::GetCurrentProcessId());
-        ::CreateDirectoryA(m_path.c_str(), nullptr);
-    }
-    ~TempFolder() {
-        char base[MAX_PATH];
-        ::GetTempPathA(MAX_PATH, base);
-        ::SetCurrentDirectoryA(base);
-        WIN32_FIND_DATAA fd;
-        HANDLE h = ::FindFirstFileA((m_path + "\\*").c_str(), &fd);
-        if (h != INVALID_HANDLE_VALUE) {
-            do {
-                ::DeleteFileA((m_path + "\\" + fd.cFileName).c_str());
-            } while (::FindNextFileA(h, &fd));
-            ::FindClose(h);
-        }
-        ::RemoveDirectoryA(m_path.c_str());
-    }
-    TempFolder(const TempFolder&) = delete;
-    TempFolder& operator=(const TempFolder&) = delete;
-    void File(const std::string& name) {
-        HANDLE h = ::CreateFileA((m_path + "\\" + name).c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS,
-                                 FILE_ATTRIBUTE_NORMAL, nullptr);
-        ::CloseHandle(h);
-    }
-    bool Exists(const std::string& name) const {
-        return ::GetFileAttributesA((m_path + "\\" + name).c_str()) != INVALID_FILE_ATTRIBUTES;
-    }
-    const std::string& path() const { return m_path; }
-
-private:
-    std::string m_path;
-};
+using testsupport::TempFolder;
 
 class RenameTest : public ::testing::Test {
 protected:
     void SetUp() override {
-        m_folder.File("a.dwg");
-        m_folder.File("b.dwg");
-        ASSERT_EQ(ScanFolderPath(m_folder.path().c_str(), ".dwg"), 1);
-        g_pTessel3Doc->m_strPath = m_folder.path();
+        m_folder.Write("a.dwg", "");
+        m_folder.Write("b.dwg", "");
+        ASSERT_EQ(ScanFolderPath(m_folder.Dir().c_str(), ".dwg"), 1);
+        g_pTessel3Doc->m_strPath = m_folder.Dir();
         Frame().sortMode = 0;
         m_bench.view().Rebuild();
         Pump();
     }
     CThumbLabel& LabelOf(const std::string& name) {
         for (int i = 0; i < DwgList.GetSize(); ++i) {
-            if (DwgList[i].m_strName == name)
-                return m_bench.view().ControlOf(i)->Label();
+            if (DwgList[i].m_strName != name)
+                continue;
+            if (exCDwgThumbnail* control = m_bench.view().ControlOf(i))
+                return control->Label();
+            throw std::runtime_error("no control shows " + name);
         }
         throw std::runtime_error("no such drawing");
     }
@@ -264,7 +239,7 @@ TEST_F(RenameTest, DoubleClickOnTheLabelBeginsEnterCommits) {
     // The folder was scanned again and the grid rebuilt.
     ASSERT_EQ(DwgList.GetSize(), 2);
     EXPECT_EQ(DwgList[0].m_strName == "c.dwg" || DwgList[1].m_strName == "c.dwg", true);
-    EXPECT_NO_THROW(LabelOf("c.dwg"));
+    EXPECT_EQ(LabelOf("c.dwg").GetWindowText(), "c.dwg");
 }
 
 TEST_F(RenameTest, EscapeRestoresTheOldName) {
@@ -473,6 +448,7 @@ std::string MenuKeys::keys;
 HWND MenuKeys::target = nullptr;
 
 void RightClickAndType(exCDwgThumbnail* control, const std::string& keys) {
+    ASSERT_NE(control, nullptr);
     MenuKeys::keys = keys;
     MenuKeys::target = control->m_hWnd;
     const UINT_PTR timer = ::SetTimer(nullptr, 0, 150, &MenuKeys::Tick);
@@ -497,6 +473,7 @@ TEST(ThumbnailMenu, RenameEntryStartsTheRename) {
     bench.view().Rebuild();
     Pump();
     exCDwgThumbnail* control = bench.view().ControlOf(2);
+    ASSERT_NE(control, nullptr);
     RightClickAndType(control, "r");
     EXPECT_TRUE(control->Label().IsRenaming());
     EXPECT_FALSE(control->Label().GetStyle() & ES_READONLY);
@@ -543,6 +520,7 @@ TEST(ThumbnailRename, SunkenEdgeAroundTheLabelOnlyWhileRenaming) {
     FillList(6);
     bench.view().Rebuild();
     Pump();
+    ASSERT_NE(bench.view().ControlOf(4), nullptr);
     CThumbLabel& label = bench.view().ControlOf(4)->Label();
     const CRect edge = label.EdgeRect();
     const COLORREF background = Nearest(bench.view(), ::GetSysColor(COLOR_SCROLLBAR));
@@ -575,6 +553,7 @@ TEST(ThumbnailTooltip, ActiveOnceTheMouseMovesOverThePicture) {
     ::PostMessageA(control->m_hWnd, WM_MOUSEMOVE, 0, MAKELPARAM(20, 20));
     Pump();
     EXPECT_TRUE(control->ToolTipActive());
+    ASSERT_NE(bench.view().ControlOf(0), nullptr);
     EXPECT_FALSE(bench.view().ControlOf(0)->ToolTipActive());
 }
 

@@ -1,0 +1,22 @@
+// A picker platform that cancels at once and counts its runs, for tests that call the LISP function or
+// run the explorer's dialog themselves. Windows test programs also get it as the default platform: the
+// library's own one lives in Orvex1.arx beside the run dialog, which the tests do not link.
+#pragma once
+
+#include "host/Orvex.h"
+
+#include <string>
+
+namespace testsupport {
+
+struct CancellingPicker : PickerPlatform {
+    int runs = 0; // how many times the dialog was asked for
+
+    std::string StartShellPath(const std::string&) override { return {}; }
+    int RunDialog() override;
+    CTessel3Doc* Document() override { return nullptr; }
+    void DestroyDocument() override {}
+    void FocusHostView() override {}
+};
+
+} // namespace testsupport
