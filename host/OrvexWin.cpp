@@ -104,8 +104,7 @@ public:
     CTessel3Doc* Document() override { return g_pTessel3Doc; }
 
     void DestroyDocument() override {
-        delete g_pTessel3Doc; // saves the explorer's settings
-        g_pTessel3Doc = nullptr;
+        delete g_pTessel3Doc; // saves the explorer's settings and clears the pointer
     }
 
     void FocusHostView() override {
