@@ -498,25 +498,24 @@ void CTessel3View::OnKeyDown(UINT nChar, UINT repeat, UINT flags) {
 }
 
 bool CTessel3View::OnCmdMsg(UINT id, int code) {
-    switch (id) {
-    case ID_VIEW_BEGIN:
-        ScrollToBegin(true);
-        return true;
-    case ID_VIEW_INCREASE:
-        Increase();
-        return true;
-    case ID_VIEW_DECREASE:
-        Decrease();
-        return true;
-    case ID_VIEW_ALIGNE:
-        Align();
-        return true;
-    case ID_SELECT_ALL:
-        SelectAll();
-        return true;
-    default:
-        return CScrollView::OnCmdMsg(id, code);
+    // The grid's commands, as the frame passes them on: each is one operation of the view.
+    static const struct {
+        UINT id;
+        void (*run)(CTessel3View&);
+    } kCommands[] = {
+        {ID_VIEW_BEGIN, [](CTessel3View& view) { view.ScrollToBegin(true); }},
+        {ID_VIEW_INCREASE, [](CTessel3View& view) { view.Increase(); }},
+        {ID_VIEW_DECREASE, [](CTessel3View& view) { view.Decrease(); }},
+        {ID_VIEW_ALIGNE, [](CTessel3View& view) { view.Align(); }},
+        {ID_SELECT_ALL, [](CTessel3View& view) { view.SelectAll(); }},
+    };
+    for (const auto& command : kCommands) {
+        if (command.id == id) {
+            command.run(*this);
+            return true;
+        }
     }
+    return CScrollView::OnCmdMsg(id, code);
 }
 
 void CTessel3View::OnSize(UINT type, int cx, int cy) {
