@@ -218,12 +218,14 @@ bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {
     if (!m_wndSplitter.CreateStatic(this, 1, 2))
         return false;
     const int leftWidth = m_pDoc ? m_pDoc->m_nSplitterSize : 100;
+    const auto makeFolderPane = [this] { return MakeFolderPane(); };
+    const auto makeGridView = [this] { return MakeGridView(); };
     // A view that could not be made has already gone: forget it.
-    if (!m_wndSplitter.CreateView(0, 0, [this] { return MakeFolderPane(); }, CSize(leftWidth, 0), context)) {
+    if (!m_wndSplitter.CreateView(0, 0, makeFolderPane, CSize(leftWidth, 0), context)) {
         m_pFolderPane = nullptr;
         return false;
     }
-    if (!m_wndSplitter.CreateView(0, 1, [this] { return MakeGridView(); }, CSize(0, 0), context)) {
+    if (!m_wndSplitter.CreateView(0, 1, makeGridView, CSize(0, 0), context)) {
         m_pGridView = nullptr;
         return false;
     }

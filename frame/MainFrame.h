@@ -106,9 +106,9 @@ private:
     int m_nSort = 0;
     bool m_bPickEnabled = true;
     ExplorerCall m_call;
-    CTessel3Doc* m_pDoc = nullptr;            // of the creation context; outlives the frame
-    CTessel3View* m_pGridView = nullptr;      // the right pane
-    CLeftPaneView* m_pFolderPane = nullptr;   // the left pane
+    CTessel3Doc* m_pDoc = nullptr;          // of the creation context; outlives the frame
+    CTessel3View* m_pGridView = nullptr;    // the right pane
+    CLeftPaneView* m_pFolderPane = nullptr; // the left pane
 };
 
 // Id of the bottom toolbar's window (the top one has the standard toolbar id).

@@ -168,7 +168,8 @@ void CThumbLabel::Commit() {
         SetWindowText(oldName);
         RedrawEdge();
         if (view)
-            view->TellUser("Cannot rename \"" + oldName + "\" to \"" + newName + "\": " + SystemErrorText(error));
+            view->TellUser("Cannot rename \"" + oldName + "\" to \"" + newName +
+                           "\": " + SystemErrorText(error));
         return;
     }
     // The rescan rebuilds the grid, which destroys this label: it runs once this message is done.

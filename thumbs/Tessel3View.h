@@ -28,13 +28,13 @@ public:
     ~CTessel3View() override;
 
     // Set by the owner when it creates the view.
-    std::function<int()> onSortMode;                          // 0 by name, 1 by date, 2 by size
-    std::function<void(bool)> onEnablePick;                   // the accept button and its label
-    std::function<void(const std::string&)> onSetTitle;       // the owner's window text
-    std::function<void()> onFolderShown;                      // a folder was scanned and laid out
-    std::function<void(const std::string&)> onStatusText;     // the status bar's message (empty clears)
-    std::function<void(const std::string&)> onTellUser;       // something the user must read
-    std::function<void()> onFocusFolderTree;                  // Tab leaves the grid for the folder tree
+    std::function<int()> onSortMode;                      // 0 by name, 1 by date, 2 by size
+    std::function<void(bool)> onEnablePick;               // the accept button and its label
+    std::function<void(const std::string&)> onSetTitle;   // the owner's window text
+    std::function<void()> onFolderShown;                  // a folder was scanned and laid out
+    std::function<void(const std::string&)> onStatusText; // the status bar's message (empty clears)
+    std::function<void(const std::string&)> onTellUser;   // something the user must read
+    std::function<void()> onFocusFolderTree;              // Tab leaves the grid for the folder tree
 
     // The document of the creation context (the explorer's settings and current drawing), or nullptr.
     CTessel3Doc* Document() const;
