@@ -5,6 +5,7 @@
 #include "devhost/HostWindows.h"
 #include "devhost/Output.h"
 #include "devhost/Text.h"
+#include "thumbs/AppMessages.h"
 
 #include <wincodec.h>
 
@@ -472,7 +473,7 @@ void ScriptRunner::Run() {
                       EscapeControls(error.message));
             // Do not leave the LISP call waiting for input that will not come.
             if (HWND dialog = FindRunDialog(m_uiThreadId))
-                PostMessageW(dialog, WM_APP, 2, 0);
+                PostMessageW(dialog, WM_ORVEX_RESULT, kAppCancel, 0);
             return;
         }
     }

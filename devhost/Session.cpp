@@ -9,6 +9,7 @@
 #include "devhost/ScriptRunner.h"
 #include "devhost/Text.h"
 #include "devhost/Timing.h"
+#include "thumbs/AppMessages.h"
 
 #include <windows.h>
 
@@ -79,11 +80,11 @@ void CALLBACK PostTimer(HWND, UINT, UINT_PTR timer, DWORD) {
     if (g_posted)
         return;
     if (HWND dialog = FindRunDialog(GetCurrentThreadId())) {
-        PostMessageW(dialog, WM_APP, g_postValue, 0);
+        PostMessageW(dialog, WM_ORVEX_RESULT, g_postValue, 0);
         g_posted = true;
         KillTimer(nullptr, timer);
         if (Host().options.verbose)
-            WriteLine(g_postValue == 1 ? L"[host] posted accept" : L"[host] posted cancel");
+            WriteLine(g_postValue == kAppAccept ? L"[host] posted accept" : L"[host] posted cancel");
         return;
     }
     SetTimer(nullptr, timer, kPostRetryMs, &PostTimer); // not there yet: look again shortly
@@ -324,7 +325,7 @@ void Session::Evaluate(const std::wstring& expression) {
 
     UINT_PTR timer = 0;
     if (m_options.afterMs >= 0) {
-        g_postValue = m_options.post == Options::Post::Accept ? 1 : 2;
+        g_postValue = m_options.post == Options::Post::Accept ? kAppAccept : kAppCancel;
         g_posted = false;
         timer = SetTimer(nullptr, 0, static_cast<UINT>(m_options.afterMs), &PostTimer);
     }

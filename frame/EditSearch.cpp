@@ -1,13 +1,14 @@
 // The search edit of the top toolbar.
 #include "frame/MainFrame.h"
 
-#include "frame/GridLink.h"
+#include "thumbs/AppMessages.h"
 
 bool CEditSearch::OnCommandReflect(UINT code) {
     if (code != EN_CHANGE)
         return false;
     // Search as you type: the grid selects and shows the first drawing whose name starts with the text.
-    SearchDrawings(GetWindowText());
+    if (onSearch)
+        onSearch(GetWindowText());
     return true;
 }
 
@@ -15,7 +16,7 @@ LRESULT CEditSearch::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
     switch (message) {
     case WM_KEYDOWN:
         if (wParam == VK_ESCAPE) {
-            CMainFrame::PostResult(kExplorerCancel);
+            PostAppResult(kAppCancel);
             return 0;
         }
         break;

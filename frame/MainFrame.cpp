@@ -1,19 +1,19 @@
 #include "frame/MainFrame.h"
 
 #include "frame/AboutDlgArx.h"
-#include "frame/GridLink.h"
-#include "frame/FolderPaneLink.h"
+#include "frame/LeftPaneView.h"
 #include "settings/IniFile.h"
 #include "settings/Tessel3Doc.h"
-#include "host/Orvex.h"
+#include "thumbs/AppMessages.h"
+#include "thumbs/Tessel3View.h"
 
 #include "res/resource.h"
 
 #include <shellapi.h>
 
+#include <algorithm>
 #include <cstdlib>
-
-CMainFrame* g_pMainFrame = nullptr;
+#include <iterator>
 
 const char* const kExplorerTitle = "Kelmar Dwg Thumbnail Explorer";
 const char* const kExplorerMessageCaption = "Drawing explorer";
@@ -25,6 +25,14 @@ const UINT kIndicators[] = {ID_SEPARATOR, ID_INDICATOR_CAPS, ID_INDICATOR_NUM, I
 constexpr int kSearchEditWidth = 125;
 constexpr int kLayerLabelExtra = 1000;
 constexpr UINT kLabelStyle = WS_CHILD | WS_VISIBLE | SS_LEFT | SS_CENTERIMAGE | SS_NOPREFIX;
+
+// The commands the grid carries out; the frame passes them on.
+const UINT kGridCommands[] = {ID_VIEW_BEGIN, ID_VIEW_INCREASE, ID_VIEW_DECREASE, ID_VIEW_ALIGNE, ID_FILE_OPEN,
+                              ID_EDIT_COPY,  ID_EDIT_CUT,      ID_EDIT_PASTE,    ID_SELECT_ALL};
+
+bool IsGridCommand(UINT id) {
+    return std::find(std::begin(kGridCommands), std::end(kGridCommands), id) != std::end(kGridCommands);
+}
 
 // The sort mode a sort command sets, or -1.
 int SortModeOf(UINT id) {
@@ -74,16 +82,7 @@ std::string LayerLabelText(const std::string& folder) {
     return " Layer name: " + layer;
 }
 
-CMainFrame::CMainFrame() {
-    g_pMainFrame = this;
-    if (g_pTessel3Doc)
-        m_nSort = g_pTessel3Doc->m_nSort;
-}
-
-CMainFrame::~CMainFrame() {
-    if (g_pMainFrame == this)
-        g_pMainFrame = nullptr;
-}
+CMainFrame::CMainFrame(const ExplorerCall& call) : m_call(call) {}
 
 HFONT CMainFrame::LabelFont() {
     return static_cast<HFONT>(::GetStockObject(DEFAULT_GUI_FONT));
@@ -180,20 +179,65 @@ bool CMainFrame::CreateCaptionLabel(CToolBar& bar, UINT button, const char* capt
 }
 
 bool CMainFrame::CreatePickToolBar() {
-    return CreateCaptionLabel(m_wndToolBar2, ID_ACCEPT, g_szAcceptCaption, m_wndAcceptLabel) &&
-           CreateCaptionLabel(m_wndToolBar2, ID_CANCEL_PICK, g_szCancelCaption, m_wndCancelLabel);
+    return CreateCaptionLabel(m_wndToolBar2, ID_ACCEPT, m_call.acceptCaption.c_str(), m_wndAcceptLabel) &&
+           CreateCaptionLabel(m_wndToolBar2, ID_CANCEL_PICK, m_call.cancelCaption.c_str(), m_wndCancelLabel);
+}
+
+CView* CMainFrame::MakeFolderPane() {
+    m_pFolderPane = new CLeftPaneView;
+    return m_pFolderPane;
+}
+
+CView* CMainFrame::MakeGridView() {
+    auto* grid = new CTessel3View;
+    grid->onSortMode = [this] { return m_nSort; };
+    grid->onEnablePick = [this](bool enable) { EnablePick(enable); };
+    grid->onSetTitle = [this](const std::string& text) { SetTitleText(text); };
+    grid->onFolderShown = [this] { UpdateLayerLabel(); };
+    grid->onStatusText = [this](const std::string& text) {
+        if (m_hWnd)
+            SetMessageText(text);
+    };
+    grid->onTellUser = [this](const std::string& text) { TellUser(text); };
+    grid->onFocusFolderTree = [this] {
+        if (m_pFolderPane)
+            m_pFolderPane->FocusFolderTree();
+    };
+    m_pGridView = grid;
+    return grid;
 }
 
 bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {
+    m_pDoc = context ? dynamic_cast<CTessel3Doc*>(context->m_pCurrentDoc) : nullptr;
+    if (m_pDoc)
+        m_nSort = m_pDoc->m_nSort;
+    m_wndSearch.onSearch = [this](const std::string& text) {
+        if (m_pGridView)
+            m_pGridView->RunSearch(text);
+    };
     if (!m_wndSplitter.CreateStatic(this, 1, 2))
         return false;
-    const int leftWidth = g_pTessel3Doc ? g_pTessel3Doc->m_nSplitterSize : 100;
-    return m_wndSplitter.CreateView(0, 0, &NewFolderPaneView, CSize(leftWidth, 0), context) &&
-           m_wndSplitter.CreateView(0, 1, &NewGridView, CSize(0, 0), context);
+    const int leftWidth = m_pDoc ? m_pDoc->m_nSplitterSize : 100;
+    const auto makeFolderPane = [this] { return MakeFolderPane(); };
+    const auto makeGridView = [this] { return MakeGridView(); };
+    // A view that could not be made has already gone: forget it.
+    if (!m_wndSplitter.CreateView(0, 0, makeFolderPane, CSize(leftWidth, 0), context)) {
+        m_pFolderPane = nullptr;
+        return false;
+    }
+    if (!m_wndSplitter.CreateView(0, 1, makeGridView, CSize(0, 0), context)) {
+        m_pGridView = nullptr;
+        return false;
+    }
+    return true;
+}
+
+void CMainFrame::TellUser(const std::string& text) {
+    ::MessageBoxA(m_hWnd, text.c_str(), kExplorerMessageCaption, MB_OK | MB_ICONWARNING);
 }
 
 void CMainFrame::OnDestroy() {
-    if (CTessel3Doc* doc = g_pTessel3Doc) {
+    if (CTessel3Doc* doc = m_pDoc) {
         const CRect rc = GetWindowRect();
         doc->m_nWindowWidth = rc.Width();
         doc->m_nWindowHeight = rc.Height();
@@ -202,27 +246,18 @@ void CMainFrame::OnDestroy() {
             m_wndSplitter.GetColumnInfo(0, current, minimum);
             doc->m_nSplitterSize = current;
         }
-        if (GridView()) {
-            int width = 0, height = 0;
-            GridPictureSize(width, height);
-            doc->m_nPictureWidth = width;
-            doc->m_nPictureHeight = height;
+        if (m_pGridView) {
+            doc->m_nPictureWidth = m_pGridView->GetPictureWidth();
+            doc->m_nPictureHeight = m_pGridView->GetPictureHeight();
         }
         doc->m_nSort = m_nSort;
     }
     CFrameWnd::OnDestroy();
+    // The views go with their windows, after this one's.
+    m_pGridView = nullptr;
+    m_pFolderPane = nullptr;
     // After an accept the dialog has already ended on it and never sees this cancel.
-    PostResult(kExplorerCancel);
-}
-
-void CMainFrame::PostResult(int result) {
-    CWinApp* app = AfxGetApp();
-    if (app && app->m_pMainWnd && app->m_pMainWnd->m_hWnd)
-        app->m_pMainWnd->PostMessage(WM_EXPLORER_RESULT, static_cast<WPARAM>(result));
-}
-
-CTessel3View* CMainFrame::GetGridView() const {
-    return GridView();
+    PostAppResult(kAppCancel);
 }
 
 void CMainFrame::EnablePick(bool enable) {
@@ -238,9 +273,9 @@ void CMainFrame::SetTitleText(const std::string& text) {
 }
 
 void CMainFrame::UpdateLayerLabel() {
-    if (!m_wndLayerLabel.m_hWnd || !g_pTessel3Doc)
+    if (!m_wndLayerLabel.m_hWnd || !m_pDoc)
         return;
-    m_wndLayerLabel.SetWindowText(LayerLabelText(g_pTessel3Doc->m_strPath));
+    m_wndLayerLabel.SetWindowText(LayerLabelText(m_pDoc->m_strPath));
 }
 
 void CMainFrame::OnUpdateFrameTitle(bool addToTitle) {
@@ -252,8 +287,8 @@ void CMainFrame::OnUpdateFrameTitle(bool addToTitle) {
 }
 
 bool CMainFrame::ForwardToGrid(UINT id) {
-    if (CWnd* grid = GridViewWindow())
-        grid->SendMessage(WM_COMMAND, MAKEWPARAM(id, 0), 0);
+    if (m_pGridView && m_pGridView->m_hWnd)
+        m_pGridView->SendMessage(WM_COMMAND, MAKEWPARAM(id, 0), 0);
     return true;
 }
 
@@ -273,28 +308,20 @@ bool CMainFrame::OnCmdMsg(UINT id, int code) {
         SetSortMode(mode);
         return true;
     }
-    switch (id) {
-    case ID_VIEW_BEGIN:
-    case ID_VIEW_INCREASE:
-    case ID_VIEW_DECREASE:
-    case ID_VIEW_ALIGNE:
-    case ID_FILE_OPEN:
-    case ID_EDIT_COPY:
-    case ID_EDIT_CUT:
-    case ID_EDIT_PASTE:
-    case ID_SELECT_ALL:
+    if (IsGridCommand(id))
         return ForwardToGrid(id);
+    switch (id) {
     case ID_CLEAR:
         if (HWND focus = ::GetFocus())
             ::SendMessageA(focus, WM_CLEAR, 0, 0);
         return true;
     case ID_ACCEPT:
         // Only a chosen drawing can be taken.
-        if (g_pTessel3Doc && !g_pTessel3Doc->m_strName.empty())
-            PostResult(kExplorerAccept);
+        if (m_pDoc && !m_pDoc->m_strName.empty())
+            PostAppResult(kAppAccept);
         return true;
     case ID_CANCEL_PICK:
-        PostResult(kExplorerCancel);
+        PostAppResult(kAppCancel);
         return true;
     case ID_APP_ABOUT: {
         CAboutDlgArx about(this);

@@ -2,23 +2,33 @@
 // the accept and cancel buttons, status bar, and a splitter with the folder pane on the left and the
 // thumbnail grid on the right. One frame exists during one call of the LISP function.
 //
-// What the rest of the explorer may call is the public part below; the grid view, the thumbnails and
-// the search edit reach the frame through g_pMainFrame (null when there is none).
+// Wiring. The frame makes its two views (through the splitter, with the creation context that carries
+// the document) and sets their handlers: the grid tells the frame about the pick, the title, the status
+// and the folder; Tab in the grid focuses the folder pane; the search edit runs the grid's search.
 //
 // Ownership. The frame is created with new and deletes itself when its window is destroyed; its bars,
-// labels, search edit and splitter are members, their windows children of the frame.
+// labels, search edit and splitter are members, their windows children of the frame. The views delete
+// themselves with their windows; the frame forgets them when it is destroyed.
 #pragma once
 
+#include "frame/ExplorerCall.h"
 #include "framework/afxframe.h"
 #include "framework/afxbars.h"
 #include "framework/afxsplit.h"
 
+#include <functional>
 #include <string>
 
+class CLeftPaneView;
+class CTessel3Doc;
 class CTessel3View;
 
 // The toolbar's search edit: every change of its text runs the search by name prefix.
 class CEditSearch : public CEdit {
+public:
+    // Set by the frame: runs the search for the edit's new text.
+    std::function<void(const std::string&)> onSearch;
+
 protected:
     bool OnCommandReflect(UINT code) override; // EN_CHANGE
     LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
@@ -27,15 +37,9 @@ protected:
 // A toolbar edit without behaviour of its own.
 class CEditEx : public CEdit {};
 
-// Message the explorer posts to the application's main window (the run dialog): wParam 1 accept, 2 cancel.
-constexpr UINT WM_EXPLORER_RESULT = 0x8000;
-constexpr int kExplorerAccept = 1;
-constexpr int kExplorerCancel = 2;
-
 class CMainFrame : public CFrameWnd {
 public:
-    CMainFrame();
-    ~CMainFrame() override;
+    explicit CMainFrame(const ExplorerCall& call);
 
     // Sort mode: 0 by name, 1 by date, 2 by size.
     int GetSortMode() const { return m_nSort; }
@@ -50,10 +54,8 @@ public:
     // Re-reads the layer of the current folder's "datains.ini" into the top toolbar's label.
     void UpdateLayerLabel();
 
-    // Posts the accept (1) or cancel (2) message to the application's main window (the run dialog).
-    static void PostResult(int result);
-
-    CTessel3View* GetGridView() const;
+    // The grid view, nullptr before the frame has made it and once the frame is destroyed.
+    CTessel3View* GetGridView() const { return m_pGridView; }
     CEditSearch& GetSearchEdit() { return m_wndSearch; }
 
     // The frame's parts, for the hosting code and its tests.
@@ -85,9 +87,12 @@ private:
                             CStatic& label);
     bool CreateSearchEdit();
     bool CreateCaptionLabel(CToolBar& bar, UINT button, const char* caption, CStatic& label);
+    CView* MakeGridView();
+    CView* MakeFolderPane();
     bool ForwardToGrid(UINT id);
     void SetSortMode(int mode);
     void ShowHelp();
+    void TellUser(const std::string& text);
 
     CSplitterWnd m_wndSplitter;
     CEditSearch m_wndSearch;
@@ -100,9 +105,11 @@ private:
     CToolBar m_wndToolBar2;
     int m_nSort = 0;
     bool m_bPickEnabled = true;
+    ExplorerCall m_call;
+    CTessel3Doc* m_pDoc = nullptr;          // of the creation context; outlives the frame
+    CTessel3View* m_pGridView = nullptr;    // the right pane
+    CLeftPaneView* m_pFolderPane = nullptr; // the left pane
 };
-
-extern CMainFrame* g_pMainFrame;
 
 // Id of the bottom toolbar's window (the top one has the standard toolbar id).
 constexpr UINT kPickToolBarId = AFX_IDW_TOOLBAR + 4;

@@ -1,12 +1,9 @@
 #include "frame/MdiMixin.h"
 
-#include "frame/FolderPaneLink.h"
-#include "frame/GridLink.h"
 #include "frame/MainFrame.h"
-#include "host/HostApi.h"
-#include "host/Orvex.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/DwgList.h"
+#include "thumbs/Tessel3View.h"
 
 #include "res/resource.h"
 
@@ -18,14 +15,15 @@ namespace {
 
 // Shows the folder the explorer starts in: scans it into the drawing list, makes it the current folder
 // and lays the grid out. Returns what the scan has to say (a refused folder, files left out), or empty.
-std::string ShowStartFolder(CMainFrame& frame, CTessel3Doc& doc) {
-    const std::string folder = StartFolder(g_szStartPath, doc.m_strPath);
+std::string ShowStartFolder(CMainFrame& frame, CTessel3Doc& doc, const std::string& startPath) {
+    const std::string folder = StartFolder(startPath, doc.m_strPath);
     if (folder.empty())
         return {};
     std::string problem;
     ScanFolderPath(folder.c_str(), ".dwg", &problem);
     doc.m_strPath = folder;
-    RebuildGrid();
+    if (CTessel3View* grid = frame.GetGridView(); grid && grid->m_hWnd)
+        grid->Rebuild();
     frame.UpdateLayerLabel();
     return problem;
 }
@@ -116,31 +114,36 @@ bool CMdiMixin::SetUp(UINT frameResourceId) {
     return true;
 }
 
-bool CMdiMixin::CreateAndShow(CDialog* dialog) {
+CMainFrame* CMdiMixin::ExplorerFrame() const {
+    return dynamic_cast<CMainFrame*>(CWnd::FromHandle(m_hExplorerFrame));
+}
+
+bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // 1. The document reads the explorer's settings; it lives until the LISP function ends the run.
     auto* doc = new CTessel3Doc();
-    // 2. The frame deletes itself when its window is destroyed.
-    auto* frame = new CMainFrame();
+    // 2. The frame deletes itself when its window is destroyed; its views are given the document.
+    auto* frame = new CMainFrame(call);
+    CCreateContext context;
+    context.m_pCurrentDoc = doc;
     // 3. The host takes no input while the explorer is open.
-    HWND hostFrame = acedGetAcadFrame();
+    HWND hostFrame = call.hostFrame;
     if (hostFrame)
         ::EnableWindow(hostFrame, FALSE);
     // 4. The object is kept through a failed creation (its window may have come and gone) and freed here.
     frame->m_bAutoDelete = false;
-    if (!frame->LoadFrame(m_nIDFrameResource, WS_OVERLAPPEDWINDOW | FWS_ADDTOTITLE, dialog, nullptr)) {
+    if (!frame->LoadFrame(m_nIDFrameResource, WS_OVERLAPPEDWINDOW | FWS_ADDTOTITLE, dialog, &context)) {
         if (hostFrame)
             ::EnableWindow(hostFrame, TRUE);
         delete frame;
         return false;
     }
     frame->m_bAutoDelete = true;
+    m_hExplorerFrame = frame->m_hWnd;
     // 5. The posted accept and cancel messages go to the dialog.
     m_pMainWnd = dialog;
     frame->InitialUpdateFrame(doc, false);
-    // Without the folder tree to pick it, the grid shows the start folder.
-    std::string scanProblem;
-    if (!HasFolderTree())
-        scanProblem = ShowStartFolder(*frame, *doc);
+    // The grid shows the start folder.
+    const std::string scanProblem = ShowStartFolder(*frame, *doc, call.startPath);
 
     // 6. Placement from the dialog's rectangle and the stored size, on a monitor of this desktop.
     const CRect rcDialog = dialog->GetWindowRect();
@@ -154,14 +157,11 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog) {
         frame->ShowWindow(SW_SHOWNORMAL);
     }
 
-    // 7. The folder tree shows its current folder again and takes the focus.
-    ReselectFolderTree();
-
-    // 8. Nothing is chosen yet.
+    // 7. Nothing is chosen yet.
     frame->UpdateWindow();
     frame->EnablePick(false);
 
-    // 9. The drawing of the last run is chosen again: its name starts the search, and the drawing itself is
+    // 8. The drawing of the last run is chosen again: its name starts the search, and the drawing itself is
     // selected (the search may have found another name first). It stays the current drawing, so accept
     // takes it; when the folder no longer holds it, nothing is chosen.
     const std::string saved = doc->m_strName;
@@ -169,7 +169,8 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog) {
     CEditSearch& search = frame->GetSearchEdit();
     if (search.m_hWnd && !saved.empty()) {
         search.SetWindowText(SearchTextOf(saved));
-        ChooseSavedDrawing(saved);
+        if (CTessel3View* grid = frame->GetGridView())
+            grid->ChooseDrawing(saved);
     }
     // Said last: the search above has its own message for the status bar.
     if (!scanProblem.empty())

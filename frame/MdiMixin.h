@@ -2,10 +2,13 @@
 // then asked by the run dialog to create and show the explorer for one call of the LISP function.
 #pragma once
 
+#include "frame/ExplorerCall.h"
 #include "framework/afxwin.h"
 
 #include <functional>
 #include <string>
+
+class CMainFrame;
 
 class CMdiMixin : public CWinApp {
 public:
@@ -15,14 +18,17 @@ public:
     bool SetUp(UINT frameResourceId);
 
     // Creates the explorer document and the frame for `dialog`, the run dialog whose modal loop hosts
-    // them. Returns true when the explorer stands. The host's main frame stays disabled until the
-    // dialog's modal run ends (the run enables its owner again).
-    bool CreateAndShow(CDialog* dialog);
+    // them, with the arguments of the call. Returns true when the explorer stands. The host's main frame
+    // stays disabled until the dialog's modal run ends (the run enables its owner again).
+    bool CreateAndShow(CDialog* dialog, const ExplorerCall& call);
 
     UINT FrameResourceId() const { return m_nIDFrameResource; }
+    // The explorer frame while its window exists, else nullptr.
+    CMainFrame* ExplorerFrame() const;
 
 private:
     UINT m_nIDFrameResource = 0;
+    HWND m_hExplorerFrame = nullptr; // looked up again each time: the frame deletes itself with its window
 };
 
 // Where the frame is put for the run dialog's screen rectangle and the stored frame size.

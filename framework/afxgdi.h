@@ -1,10 +1,9 @@
 // Geometry helpers and device-context / GDI object wrappers.
 //
-// Ownership: CBrush, CPen, CFont, CBitmap and CMenu-like holders own their handle and delete it in the
-// destructor; they can be moved, never copied (a copy would delete the handle twice). CDC is a non-owning
-// view of an HDC; CPaintDC, CClientDC and CWindowDC own the DC they obtained and give it back; CMemDC is
-// a back buffer that is copied onto its target when it goes out of scope. CSelectObject puts the old
-// object back into the DC when it goes out of scope.
+// Ownership: CBitmap owns its handle and deletes it in the destructor; it can be moved, never copied (a
+// copy would delete the handle twice). CDC is a non-owning view of an HDC; CPaintDC and CClientDC own the
+// DC they obtained and give it back. CSelectObject puts the old object back into the DC when it goes out
+// of scope.
 #pragma once
 
 #include <windows.h>
@@ -129,28 +128,6 @@ private:
     H m_handle = nullptr;
 };
 
-class CBrush : public CGdiObjectT<HBRUSH> {
-public:
-    CBrush() = default;
-    explicit CBrush(COLORREF color) { CreateSolidBrush(color); }
-    bool CreateSolidBrush(COLORREF color) { return Take(::CreateSolidBrush(color)); }
-    bool CreateSysColorBrush(int index) { return Take(::CreateSolidBrush(::GetSysColor(index))); }
-};
-
-class CPen : public CGdiObjectT<HPEN> {
-public:
-    CPen() = default;
-    CPen(int style, int width, COLORREF color) { CreatePen(style, width, color); }
-    bool CreatePen(int style, int width, COLORREF color) { return Take(::CreatePen(style, width, color)); }
-};
-
-class CFont : public CGdiObjectT<HFONT> {
-public:
-    bool CreateFontIndirect(const LOGFONTA& lf) { return Take(::CreateFontIndirectA(&lf)); }
-    // Point size in tenths of a point, as the font dialogs count.
-    bool CreatePointFont(int pointSizeTenths, const char* faceName, HDC hdc = nullptr);
-};
-
 class CBitmap : public CGdiObjectT<HBITMAP> {
 public:
     bool LoadBitmap(HINSTANCE hInst, UINT resourceId) {
@@ -265,30 +242,6 @@ public:
 
 private:
     HWND m_hWnd;
-};
-
-// The whole-window DC (non-client area included), released in the destructor.
-class CWindowDC : public CDC {
-public:
-    explicit CWindowDC(HWND hwnd) : m_hWnd(hwnd) { m_hDC = ::GetWindowDC(hwnd); }
-    ~CWindowDC() override { ::ReleaseDC(m_hWnd, m_hDC); }
-
-private:
-    HWND m_hWnd;
-};
-
-// A back buffer for flicker-free painting: draw into it, and the destructor copies the rectangle onto
-// the target DC in one BitBlt. The buffer's coordinates are those of the target (the origin is shifted).
-class CMemDC : public CDC {
-public:
-    CMemDC(HDC target, const RECT& rc);
-    ~CMemDC() override;
-
-private:
-    HDC m_hTarget;
-    CRect m_rc;
-    CBitmap m_bitmap;
-    HGDIOBJ m_oldBitmap = nullptr;
 };
 
 // Selects an object into a DC for the lifetime of the restorer, then puts the previous one back.

@@ -209,7 +209,6 @@ public:
     bool SetForegroundWindow() { return ::SetForegroundWindow(m_hWnd) != FALSE; }
     void BringWindowToTop() { ::BringWindowToTop(m_hWnd); }
     void CenterWindow(HWND alternateOwner = nullptr);
-    bool EnableToolTips(bool enable = true) { return enable; } // tooltips are created by their owners
     bool ShowScrollBar(int bar, bool show = true) { return ::ShowScrollBar(m_hWnd, bar, show) != FALSE; }
     int GetScrollPos(int bar) const { return ::GetScrollPos(m_hWnd, bar); }
     int SetScrollPos(int bar, int pos, bool redraw = true) {

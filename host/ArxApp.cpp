@@ -6,15 +6,12 @@
 #include "host/TextConv.h"
 #include "settings/SettingsReport.h"
 
-HINSTANCE g_hOrvexModule = nullptr;
-
 // Static initialisation order matters: the data manager registers with the host's document manager
 // first, then the application object is built. Both live as long as the library.
 AsdkDataManager<CDocData> g_dataManager;
 CTesselArxApp theApp;
 
 bool CTesselArxApp::InitInstance() {
-    g_hOrvexModule = GetModuleHandleA("Orvex1.arx");
     // An exception caught in a window procedure is shown the host's way: command line and alert box.
     AfxSetErrorReporter([](const char* text) { ReportLibraryError("explorer window", text); });
     // Settings files that cannot be read or saved are said on the host's command line (and alerted).

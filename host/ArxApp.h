@@ -1,10 +1,7 @@
-// The library's application object and module handle.
+// The library's application object.
 #pragma once
 
 #include "frame/MdiMixin.h"
-
-// The library's instance handle, found by its file name when the application object starts.
-extern HINSTANCE g_hOrvexModule;
 
 #include "res/resource.h"
 

@@ -2,7 +2,9 @@
 
 #include "host/ArxApp.h"
 #include "host/HostApi.h"
+#include "host/Orvex.h"
 #include "settings/Tessel3Doc.h"
+#include "thumbs/AppMessages.h"
 
 #include <string>
 
@@ -23,6 +25,17 @@ bool IsExistingFile(const std::string& path) {
     return attributes != INVALID_FILE_ATTRIBUTES && !(attributes & FILE_ATTRIBUTE_DIRECTORY);
 }
 
+// Copies of what the LISP function took from its arguments, for the explorer of this call.
+ExplorerCall CallArguments() {
+    ExplorerCall call;
+    call.acceptCaption = g_szAcceptCaption;
+    call.cancelCaption = g_szCancelCaption;
+    call.startPath = g_szStartPath;
+    call.startShellPath = g_szStartShellPath;
+    call.hostFrame = acedGetAcadFrame();
+    return call;
+}
+
 } // namespace
 
 CDialogRun::~CDialogRun() {
@@ -33,10 +46,10 @@ CDialogRun::~CDialogRun() {
 bool CDialogRun::OnInitDialog() {
     CDialog::OnInitDialog();
     // The explorer is placed from this dialog's rectangle, so it is created before the dialog shrinks.
-    if (!theApp.CreateAndShow(this)) {
+    if (!theApp.CreateAndShow(this, CallArguments())) {
         // Nothing to show and nothing to wait for: an invisible loop would hold the host for good.
         acutPrintf(L"\nOrvex: the explorer window could not be created\n");
-        EndDialog(2);
+        EndDialog(kAppCancel);
         return true;
     }
     // The dialog only carries the loop: it shrinks to nothing in the corner.
@@ -48,10 +61,10 @@ bool CDialogRun::OnInitDialog() {
 
 bool CDialogRun::PreTranslateMessage(MSG* pMsg) {
     if (pMsg->message == WM_ORVEX_RESULT && pMsg->hwnd == m_hWnd) {
-        if (pMsg->wParam == 1) {
+        if (pMsg->wParam == kAppAccept) {
             const std::string drawing = ChosenDrawing();
             if (drawing.empty()) {
-                EndDialog(2); // accept with nothing chosen: the call returns nil
+                EndDialog(kAppCancel); // accept with nothing chosen: the call returns nil
                 return true;
             }
             if (!IsExistingFile(drawing)) {

@@ -1,12 +1,10 @@
-// The invisible modal dialog whose loop the explorer lives in. The explorer ends it by posting the
-// first application message with 1 (picked) or 2 (cancelled).
+// The invisible modal dialog whose loop the explorer lives in. The explorer ends it by posting
+// WM_ORVEX_RESULT with kAppAccept (picked) or kAppCancel (cancelled).
 #pragma once
 
 #include "framework/afxwin.h"
 
 #include "res/resource.h"
-
-constexpr UINT WM_ORVEX_RESULT = WM_APP; // wParam: 1 accept, 2 cancel
 
 class CDialogRun : public CDialog {
 public:

@@ -13,7 +13,6 @@ char g_szAcceptCaption[kCaptionChars] = "OK";
 char g_szCancelCaption[kCaptionChars] = "CANCEL";
 char g_szStartShellPath[kPathChars] = "";
 char g_szStartPath[kPathChars] = "";
-HWND g_hHostMainWnd = nullptr;
 
 namespace {
 
@@ -135,7 +134,6 @@ int OrvexWith(PickerPlatform& platform) {
     g_szStartShellPath[0] = 0;
     CopyBounded(g_szStartPath, narrowPath.size() < kPathChars ? narrowPath : std::string());
     if (!narrowPath.empty()) {
-        g_hHostMainWnd = acedGetAcadWinApp();
         const std::string shellPath = platform.StartShellPath(narrowPath);
         if (!CopyBounded(g_szStartShellPath, shellPath))
             acutPrintf(L"\nOrvex: the start folder's shell path is too long; starting at the last folder\n");

@@ -15,7 +15,6 @@ extern char g_szAcceptCaption[kCaptionChars]; // "OK" until the first call
 extern char g_szCancelCaption[kCaptionChars]; // "CANCEL" until the first call
 extern char g_szStartShellPath[kPathChars];   // display-name path of the start folder, or empty
 extern char g_szStartPath[kPathChars];        // the start path as given (file-system form), or empty
-extern HWND g_hHostMainWnd;                   // the host application's main window
 
 // What the picker needs from the platform: the shell, the run dialog and the explorer document.
 // The Windows build supplies the real ones; unit tests supply fakes.

@@ -50,14 +50,14 @@ public:
     HostInputRestorer()
         : m_frame(acedGetAcadFrame()), m_frameWasEnabled(m_frame && ::IsWindowEnabled(m_frame)),
           m_doubleClickTime(::GetDoubleClickTime()) {}
+    HostInputRestorer(const HostInputRestorer&) = delete;
+    HostInputRestorer& operator=(const HostInputRestorer&) = delete;
     ~HostInputRestorer() {
         if (::GetDoubleClickTime() != m_doubleClickTime)
             ::SetDoubleClickTime(m_doubleClickTime);
         if (m_frame && ::IsWindow(m_frame) && (::IsWindowEnabled(m_frame) != FALSE) != m_frameWasEnabled)
             ::EnableWindow(m_frame, m_frameWasEnabled);
     }
-    HostInputRestorer(const HostInputRestorer&) = delete;
-    HostInputRestorer& operator=(const HostInputRestorer&) = delete;
 
 private:
     HWND m_frame;
@@ -104,8 +104,7 @@ public:
     CTessel3Doc* Document() override { return g_pTessel3Doc; }
 
     void DestroyDocument() override {
-        delete g_pTessel3Doc; // saves the explorer's settings
-        g_pTessel3Doc = nullptr;
+        delete g_pTessel3Doc; // saves the explorer's settings and clears the pointer
     }
 
     void FocusHostView() override {

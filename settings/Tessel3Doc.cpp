@@ -30,6 +30,8 @@ CTessel3Doc::~CTessel3Doc() {
         Save();
     } catch (...) {
     }
+    if (g_pTessel3Doc == this)
+        g_pTessel3Doc = nullptr;
 }
 
 void CTessel3Doc::Load(const std::string& settingsFile) {

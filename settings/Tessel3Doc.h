@@ -39,5 +39,7 @@ private:
     void Save();
 };
 
-// The one explorer document, set by its constructor and never cleared; test it for null before use.
+// The explorer document of the current call: set by the constructor, cleared by the destructor of the
+// document it points to. The host reaches the document through it; windows get theirs from their
+// creation context.
 extern CTessel3Doc* g_pTessel3Doc;

@@ -4,10 +4,10 @@
 #include "host/TextConv.h"
 #include "res/resource.h"
 #include "settings/Tessel3Doc.h"
+#include "thumbs/AppMessages.h"
 #include "thumbs/DwgList.h"
 #include "thumbs/RenameRules.h"
 #include "thumbs/Tessel3View.h"
-#include "thumbs/ThumbsGlue.h"
 #include "thumbs/TooltipText.h"
 
 #include <shellapi.h>
@@ -16,8 +16,6 @@ namespace {
 
 // Every redraw of the control and its label repaints at once, background included.
 constexpr UINT kRedrawNow = RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW;
-// Frame colour given to the hooks while a control is plain.
-constexpr COLORREF kGrey = 0x808080;
 
 std::string CurrentDirectory() {
     char buffer[MAX_PATH + 1] = {};
@@ -36,12 +34,12 @@ DwgData& RecordAt(int index) {
 }
 
 // Makes the drawing the current one: the document's name, the title, the pick.
-void MakeCurrent(const std::string& name) {
-    if (g_pTessel3Doc)
-        g_pTessel3Doc->m_strName = name;
-    FrameSetTitle(CurrentDirectory() + "\\" + name);
-    FrameEnablePick(true);
-    FrameSetStatusText(std::string()); // a search's "no drawing starts with" is over
+void MakeCurrent(CTessel3View& view, const std::string& name) {
+    if (CTessel3Doc* doc = view.Document())
+        doc->m_strName = name;
+    view.SetTitle(CurrentDirectory() + "\\" + name);
+    view.EnablePick(true);
+    view.SetStatusText(std::string()); // a search's "no drawing starts with" is over
 }
 
 } // namespace
@@ -146,7 +144,9 @@ std::string SystemErrorText(DWORD error) {
 
 void CThumbLabel::Commit() {
     m_bRenaming = false;
-    std::string folder = g_pTessel3Doc ? g_pTessel3Doc->m_strPath : std::string();
+    CTessel3View* view = m_pOwner ? m_pOwner->m_pView : nullptr;
+    const CTessel3Doc* doc = view ? view->Document() : nullptr;
+    std::string folder = doc ? doc->m_strPath : std::string();
     if (folder.empty())
         folder = CurrentDirectory();
     folder = WithSlash(folder);
@@ -159,50 +159,46 @@ void CThumbLabel::Commit() {
         // The old name comes back before the user is told why.
         SetWindowText(oldName);
         RedrawEdge();
-        if (verdict != RenameVerdict::Unchanged)
-            FrameTellUser(RenameRefusalText(verdict, newName));
+        if (verdict != RenameVerdict::Unchanged && view)
+            view->TellUser(RenameRefusalText(verdict, newName));
         return;
     }
     if (!::MoveFileA((folder + oldName).c_str(), (folder + newName).c_str())) {
         const DWORD error = ::GetLastError();
         SetWindowText(oldName);
         RedrawEdge();
-        FrameTellUser("Cannot rename \"" + oldName + "\" to \"" + newName + "\": " + SystemErrorText(error));
+        if (view)
+            view->TellUser("Cannot rename \"" + oldName + "\" to \"" + newName +
+                           "\": " + SystemErrorText(error));
         return;
     }
     // The rescan rebuilds the grid, which destroys this label: it runs once this message is done.
-    if (g_pTessel3View)
-        g_pTessel3View->PostRefresh();
+    if (view)
+        view->PostRefresh();
     RedrawEdge();
 }
 
-LRESULT CThumbLabel::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
-    switch (message) {
-    case WM_LBUTTONDBLCLK:
-        BeginRename();
-        return 0;
-    case WM_KEYDOWN:
-        if (wParam == VK_RETURN) {
-            OnReturn();
-            return 0;
-        }
-        if (wParam == VK_ESCAPE) {
-            OnEscape();
-            return 0;
-        }
-        return Default();
-    case WM_CHAR:
-        if (wParam == '\r' || wParam == 0x1B) // handled on key down; no beep
-            return 0;
-        return Default();
-    case WM_KILLFOCUS: {
-        LRESULT result = Default();
-        OnLeave();
-        return result;
-    }
-    default:
-        return CEdit::WindowProc(message, wParam, lParam);
-    }
+void CThumbLabel::OnLButtonDblClk(UINT, CPoint) {
+    BeginRename();
+}
+
+void CThumbLabel::OnKeyDown(UINT nChar, UINT, UINT) {
+    if (nChar == VK_RETURN)
+        OnReturn();
+    else if (nChar == VK_ESCAPE)
+        OnEscape();
+    else
+        Default();
+}
+
+void CThumbLabel::OnChar(UINT nChar, UINT, UINT) {
+    if (nChar != '\r' && nChar != VK_ESCAPE) // those are handled on key down; no beep
+        Default();
+}
+
+void CThumbLabel::OnKillFocus(HWND) {
+    Default();
+    OnLeave();
 }
 
 // ---- the thumbnail ----------------------------------------------------------------------------------
@@ -212,16 +208,14 @@ exCDwgThumbnail::~exCDwgThumbnail() {
 }
 
 bool exCDwgThumbnail::Create(const std::string& name, int listIndex, const char* windowName, DWORD style,
-                             const RECT& cell, CWnd* parentView, UINT id) {
+                             const RECT& cell, CTessel3View* parentView, UINT id) {
     const bool created =
         CWnd::CreateEx(0, nullptr, windowName, style | WS_VISIBLE | WS_BORDER, cell, parentView, id);
     if (!created)
         return false;
 
-    EnableToolTips(true);
+    m_pView = parentView;
     m_nListIndex = listIndex;
-    SetFrameColour(1);
-    m_savedColour = GetFrameColour();
     ShowWindow(SW_SHOW);
     m_strName = name;
 
@@ -235,36 +229,34 @@ bool exCDwgThumbnail::Create(const std::string& name, int listIndex, const char*
         m_wndToolTip.AddTool(this, tip.text);
         m_wndToolTip.Activate(false);
     }
-    CreateLabel(name, parentView, cell);
+    CreateLabel(name, cell);
     return true;
 }
 
-bool exCDwgThumbnail::CreateLabel(const std::string& name, CWnd* parentView, const RECT& cell) {
+bool exCDwgThumbnail::CreateLabel(const std::string& name, const RECT& cell) {
     const int cxEdge = ::GetSystemMetrics(SM_CXEDGE);
     const int cyEdge = ::GetSystemMetrics(SM_CYEDGE);
     const CRect rc(cell.left + cxEdge, cell.bottom + cyEdge, cell.right - cxEdge,
                    cell.bottom + CTessel3View::LabelHeight() - cyEdge);
     m_wndLabel.m_pOwner = this;
     if (!m_wndLabel.CreateEx(0, "EDIT", "", WS_CHILD | ES_READONLY | ES_NOHIDESEL | ES_AUTOHSCROLL, rc,
-                             parentView, 0))
+                             m_pView, 0))
         return false;
     m_wndLabel.SetWindowText(name);
     if (RecordAt(m_nListIndex).IsSelected())
         HighlightLabel();
-    SetFrameColour(m_savedColour);
-    SetFrameColour(kGrey);
     m_wndLabel.ShowWindow(SW_SHOW);
     m_wndLabel.RedrawWindow(nullptr, nullptr, kRedrawNow);
     return true;
 }
 
 bool exCDwgThumbnail::DestroyWindow() {
-    m_wndUnused.DestroyWindow();
     m_wndLabel.m_bRenaming = false;
     m_wndLabel.DestroyWindow();
     m_wndLabel.m_pOwner = nullptr;
     m_wndToolTip.DestroyWindow();
     m_bToolTipActive = false;
+    m_pView = nullptr;
     return CWnd::DestroyWindow();
 }
 
@@ -282,7 +274,7 @@ LRESULT exCDwgThumbnail::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) 
         OnPaint();
         return 0;
     default:
-        return CDwgThumbnail::WindowProc(message, wParam, lParam);
+        return CWnd::WindowProc(message, wParam, lParam);
     }
 }
 
@@ -302,8 +294,6 @@ void exCDwgThumbnail::DropLabelHighlight() {
 void exCDwgThumbnail::Unselect() {
     DropLabelHighlight();
     RecordAt(m_nListIndex).Deselect();
-    if (!m_bNoFrameColour)
-        SetFrameColour(m_savedColour);
 }
 
 void exCDwgThumbnail::ShowSelection() {
@@ -313,15 +303,16 @@ void exCDwgThumbnail::ShowSelection() {
 
 void exCDwgThumbnail::SelectThis(bool clearOthers) {
     if (clearOthers) {
-        if (g_pTessel3View)
-            g_pTessel3View->DeselectAll();
+        if (m_pView)
+            m_pView->DeselectAll();
         else
             DeselectAllFlags();
     }
     DwgData& record = RecordAt(m_nListIndex);
     HighlightLabel();
     record.Select();
-    MakeCurrent(record.m_strName);
+    if (m_pView)
+        MakeCurrent(*m_pView, record.m_strName);
 }
 
 void exCDwgThumbnail::ToggleSelection() {
@@ -330,25 +321,27 @@ void exCDwgThumbnail::ToggleSelection() {
     if (record.IsSelected()) {
         DropLabelHighlight();
         record.Deselect();
-        FrameEnablePick(false);
-        if (g_pTessel3Doc)
-            g_pTessel3Doc->m_strName.clear();
-        FrameSetTitle(CurrentDirectory());
+        if (m_pView) {
+            m_pView->EnablePick(false);
+            if (CTessel3Doc* doc = m_pView->Document())
+                doc->m_strName.clear();
+            m_pView->SetTitle(CurrentDirectory());
+        }
     } else {
         HighlightLabel();
         record.Select();
-        MakeCurrent(record.m_strName);
+        if (m_pView)
+            MakeCurrent(*m_pView, record.m_strName);
     }
 }
 
 void exCDwgThumbnail::Pick() {
     const DwgData& record = RecordAt(m_nListIndex);
-    if (g_pTessel3Doc) {
-        g_pTessel3Doc->m_strName = record.m_strName;
-        g_pTessel3Doc->m_strPath = CurrentFolderWithSlash();
+    if (CTessel3Doc* doc = m_pView ? m_pView->Document() : nullptr) {
+        doc->m_strName = record.m_strName;
+        doc->m_strPath = CurrentFolderWithSlash();
     }
-    if (CWnd* main = AfxGetMainWnd(); main && main->m_hWnd)
-        main->PostMessage(WM_APP, 1, 0);
+    PostAppResult(kAppAccept);
 }
 
 bool exCDwgThumbnail::PreTranslateMessage(MSG* pMsg) {
@@ -411,7 +404,7 @@ bool exCDwgThumbnail::TranslateInput(MSG* pMsg) {
     }
 }
 
-CMenu BuildThumbnailMenu(CMenu& menu) {
+CMenu BuildThumbnailMenu(CMenu& menu, int sortMode) {
     CMenu popup;
     if (!menu.LoadMenu(IDR_THUMB_MENU))
         return popup;
@@ -422,15 +415,14 @@ CMenu BuildThumbnailMenu(CMenu& menu) {
     if (!::IsClipboardFormatAvailable(CF_HDROP))
         popup.EnableMenuItem(ID_THUMB_PASTE, MF_BYCOMMAND | MF_GRAYED);
     static const UINT kSortIds[] = {ID_SORT_NAME, ID_SORT_DATE, ID_SORT_SIZE};
-    const int mode = FrameSortMode();
-    if (mode >= 0 && mode < 3)
-        popup.CheckMenuItem(kSortIds[mode], MF_BYCOMMAND | MF_CHECKED);
+    if (sortMode >= 0 && sortMode < 3)
+        popup.CheckMenuItem(kSortIds[sortMode], MF_BYCOMMAND | MF_CHECKED);
     return popup;
 }
 
 void exCDwgThumbnail::ShowContextMenu(POINT screenPoint) {
     CMenu menu;
-    CMenu popup = BuildThumbnailMenu(menu);
+    CMenu popup = BuildThumbnailMenu(menu, m_pView ? m_pView->SortMode() : 0);
     if (!popup.m_hMenu)
         return;
     HWND self = m_hWnd;
@@ -447,7 +439,8 @@ void exCDwgThumbnail::OnContextCommand(int command) {
     case ID_SORT_NAME:
     case ID_SORT_DATE:
     case ID_SORT_SIZE:
-        if (HWND frame = FrameWindow())
+        // The sort belongs to the window the grid lives in.
+        if (HWND frame = ::GetAncestor(m_hWnd, GA_ROOT); frame && frame != m_hWnd)
             ::PostMessageA(frame, WM_COMMAND, static_cast<WPARAM>(command), 0);
         break;
     case ID_THUMB_COPY:

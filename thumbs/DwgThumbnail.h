@@ -4,7 +4,8 @@
 // index only between its creation and its destruction; the selection lives in the record.
 //
 // Ownership: the grid's pool owns the controls; a control owns its label (a sibling window, child of the
-// grid view), its tooltip and the never-created static, and DestroyWindow takes all of them down.
+// grid view) and its tooltip, and DestroyWindow takes both down. A control reaches the grid (and through
+// it the document and the frame) through the view it was created in.
 #pragma once
 
 #include "framework/afxwin.h"
@@ -12,15 +13,7 @@
 
 #include <string>
 
-class CDwgThumbnail : public CWnd {
-public:
-    // Frame colour hooks: this program draws no coloured frames, so they do nothing.
-    virtual void SetFrameColour(COLORREF) {}
-    virtual COLORREF GetFrameColour() const { return 0; }
-
-protected:
-    std::string m_strName; // the file name shown
-};
+class CTessel3View;
 
 // The label: a read-only edit that becomes the rename field.
 class CThumbLabel : public CEdit {
@@ -34,7 +27,10 @@ public:
     bool PreTranslateMessage(MSG* pMsg) override;
 
 protected:
-    LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
+    void OnLButtonDblClk(UINT flags, CPoint pt) override;
+    void OnKeyDown(UINT nChar, UINT repeat, UINT flags) override;
+    void OnChar(UINT nChar, UINT repeat, UINT flags) override;
+    void OnKillFocus(HWND newWnd) override;
 
 private:
     friend class exCDwgThumbnail;
@@ -49,16 +45,13 @@ private:
     class exCDwgThumbnail* m_pOwner = nullptr;
 };
 
-class exCDwgThumbnail : public CDwgThumbnail {
+class exCDwgThumbnail : public CWnd {
 public:
     exCDwgThumbnail() = default;
     ~exCDwgThumbnail() override;
-    // The pool is a CArray of controls: an empty control can be made, copying is never done.
-    exCDwgThumbnail(const exCDwgThumbnail&) : exCDwgThumbnail() {}
-    exCDwgThumbnail& operator=(const exCDwgThumbnail&) { return *this; }
 
     bool Create(const std::string& name, int listIndex, const char* windowName, DWORD style, const RECT& cell,
-                CWnd* parentView, UINT id);
+                CTessel3View* parentView, UINT id);
     bool DestroyWindow() override;
     bool PreTranslateMessage(MSG* pMsg) override;
     // Drops the label's highlight and the record's selection.
@@ -71,7 +64,6 @@ public:
     CToolTipCtrl& ToolTip() { return m_wndToolTip; }
     // The tooltip's text as it was built at creation.
     const std::string& ToolTipText() const { return m_strToolTip; }
-    bool NoFrameColour() const { return m_bNoFrameColour != 0; }
     bool ToolTipActive() const { return m_bToolTipActive; }
 
 protected:
@@ -80,7 +72,7 @@ protected:
 
 private:
     friend class CThumbLabel;
-    bool CreateLabel(const std::string& name, CWnd* parentView, const RECT& cell);
+    bool CreateLabel(const std::string& name, const RECT& cell);
     // The mouse and key table of PreTranslateMessage; true when the message was consumed.
     bool TranslateInput(MSG* pMsg);
     // Marks this drawing selected and current; clearOthers first drops every other selection.
@@ -93,11 +85,10 @@ private:
     void HighlightLabel();
     void DropLabelHighlight();
 
-    unsigned char m_bNoFrameColour = 0;
+    CTessel3View* m_pView = nullptr; // the grid that created the window, while it exists
+    std::string m_strName;           // the file name shown
     CThumbLabel m_wndLabel;
-    CStatic m_wndUnused; // destroyed with the control, never created
     int m_nListIndex = -1;
-    COLORREF m_savedColour = 0;
     CToolTipCtrl m_wndToolTip;
     std::string m_strToolTip;
     bool m_bToolTipActive = false;
@@ -108,6 +99,6 @@ std::string CurrentFolder();
 std::string CurrentFolderWithSlash();
 
 // Loads the thumbnail's context menu into menu and returns its popup (not owned), prepared: "&Paste"
-// greyed when the clipboard holds no file list, the frame's sort mode checked. Empty when the menu
-// resource is missing.
-CMenu BuildThumbnailMenu(CMenu& menu);
+// greyed when the clipboard holds no file list, sortMode (0 name, 1 date, 2 size) checked. Empty when the
+// menu resource is missing.
+CMenu BuildThumbnailMenu(CMenu& menu, int sortMode);

@@ -2,12 +2,10 @@
 
 #include "res/resource.h"
 #include "settings/Tessel3Doc.h"
+#include "thumbs/AppMessages.h"
 #include "thumbs/DwgList.h"
-#include "thumbs/ThumbsGlue.h"
 
 #include <algorithm>
-
-CTessel3View* g_pTessel3View = nullptr;
 
 namespace {
 
@@ -49,36 +47,65 @@ private:
     bool m_held;
 };
 
-void PostCancel() {
-    if (CWnd* main = AfxGetMainWnd(); main && main->m_hWnd)
-        main->PostMessage(WM_APP, 2, 0);
-}
-
 } // namespace
 
 CTessel3View::CTessel3View() {
-    g_pTessel3View = this;
-    if (g_pTessel3Doc && g_pTessel3Doc->m_nPictureHeight != 0 && g_pTessel3Doc->m_nPictureWidth != 0) {
-        // A size from the settings file is only as small or as large as the size commands could make it.
-        const grid::PictureSize size =
-            grid::ClampPicture(g_pTessel3Doc->m_nPictureWidth, g_pTessel3Doc->m_nPictureHeight,
-                               ::GetSystemMetrics(SM_CYVIRTUALSCREEN));
-        m_nCellHeight = size.height;
-        m_nCellWidth = size.width;
-    }
     LabelHeight(); // measured once, before the first layout needs it
 }
 
 CTessel3View::~CTessel3View() {
-    if (g_pTessel3View == this)
-        g_pTessel3View = nullptr;
+    // The drawing list is the model's, not the view's: the next scan empties it when it fills it anew.
     try {
         DestroyPool();
-        m_pool.RemoveAll();
-        DwgList.RemoveAll();
+        m_pool.clear();
     } catch (...) {
         // Destruction goes on; nothing left to report to.
     }
+}
+
+int CTessel3View::OnCreate(LPCREATESTRUCTA cs) {
+    const CTessel3Doc* doc = Document();
+    if (doc && doc->m_nPictureHeight != 0 && doc->m_nPictureWidth != 0) {
+        // A size from the settings file is only as small or as large as the size commands could make it.
+        const grid::PictureSize size = grid::ClampPicture(doc->m_nPictureWidth, doc->m_nPictureHeight,
+                                                          ::GetSystemMetrics(SM_CYVIRTUALSCREEN));
+        m_nCellHeight = size.height;
+        m_nCellWidth = size.width;
+    }
+    return CScrollView::OnCreate(cs);
+}
+
+// ---- the owner --------------------------------------------------------------------------------------
+
+CTessel3Doc* CTessel3View::Document() const {
+    return dynamic_cast<CTessel3Doc*>(GetDocument());
+}
+
+int CTessel3View::SortMode() const {
+    if (onSortMode)
+        return onSortMode();
+    const CTessel3Doc* doc = Document();
+    return doc ? doc->m_nSort : 0;
+}
+
+void CTessel3View::EnablePick(bool enable) {
+    if (onEnablePick)
+        onEnablePick(enable);
+}
+
+void CTessel3View::SetTitle(const std::string& text) {
+    if (onSetTitle)
+        onSetTitle(text);
+}
+
+void CTessel3View::SetStatusText(const std::string& text) {
+    if (onStatusText)
+        onStatusText(text);
+}
+
+void CTessel3View::TellUser(const std::string& text) {
+    if (onTellUser)
+        onTellUser(text);
 }
 
 int CTessel3View::LabelHeight() {
@@ -118,8 +145,10 @@ void CTessel3View::OnInitialUpdate() {
 // ---- operations -------------------------------------------------------------------------------------
 
 void CTessel3View::Rebuild() {
-    FrameSetTitle(g_pTessel3Doc ? g_pTessel3Doc->m_strPath : std::string());
-    FrameUpdateStatus();
+    const CTessel3Doc* doc = Document();
+    SetTitle(doc ? doc->m_strPath : std::string());
+    if (onFolderShown)
+        onFolderShown();
     m_nPoolRows = grid::kDefaultPoolRows;
     ScrollToBegin(true);
 }
@@ -129,7 +158,7 @@ void CTessel3View::ScrollToBegin(bool sort) {
     m_nColumns = grid::ColumnsForWidth(GetClientRect().Width(), m_nCellWidth, m_nGap);
     m_nOldColumns = m_nColumns; // a later relayout keeps the first drawing where it is
     if (sort)
-        SortDwgList(FrameSortMode());
+        SortDwgList(SortMode());
     m_nFirstRow = 0;
     // The controls are re-created below, so the contents need not be moved.
     ::SetScrollPos(m_hWnd, SB_HORZ, 0, TRUE);
@@ -157,20 +186,15 @@ void CTessel3View::ShowIndex(int index) {
 
 void CTessel3View::DeselectAll() {
     DeselectAllFlags();
-    for (int slot = 0; slot < m_pool.GetSize(); ++slot) {
-        if (m_pool[slot].m_hWnd)
-            m_pool[slot].Unselect();
+    for (const auto& control : m_pool) {
+        if (control->m_hWnd)
+            control->Unselect();
     }
 }
 
 void CTessel3View::SelectAll() {
     for (int i = 0; i < DwgList.GetSize(); ++i)
         DwgList[i].Select();
-    for (int slot = 0; slot < m_pool.GetSize(); ++slot) {
-        exCDwgThumbnail& control = m_pool[slot];
-        if (control.m_hWnd && !control.NoFrameColour())
-            control.SetFrameColour(0x808080);
-    }
 }
 
 void CTessel3View::Increase() {
@@ -189,11 +213,12 @@ void CTessel3View::Align() {
 
 void CTessel3View::PostRefresh() {
     if (m_hWnd)
-        PostMessage(WM_THUMBS_REFRESH);
+        PostMessage(WM_ORVEX_REFRESH);
 }
 
 void CTessel3View::Refresh() {
-    std::string folder = g_pTessel3Doc ? g_pTessel3Doc->m_strPath : std::string();
+    const CTessel3Doc* doc = Document();
+    std::string folder = doc ? doc->m_strPath : std::string();
     if (folder.empty()) {
         char buffer[MAX_PATH + 1] = {};
         DWORD n = ::GetCurrentDirectoryA(sizeof buffer, buffer);
@@ -205,30 +230,30 @@ void CTessel3View::Refresh() {
     ScanFolderPath(folder.c_str(), ".dwg", &problem);
     Rebuild();
     if (!problem.empty())
-        FrameSetStatusText(problem);
+        SetStatusText(problem);
 }
 
 exCDwgThumbnail* CTessel3View::ControlOf(int index) {
-    const int size = m_pool.GetSize();
+    const int size = PoolSize();
     if (index < 0 || size == 0)
         return nullptr;
-    exCDwgThumbnail& control = m_pool[grid::PoolSlot(index, size)];
+    exCDwgThumbnail& control = PoolControl(grid::PoolSlot(index, size));
     return control.m_hWnd && control.ListIndex() == index ? &control : nullptr;
 }
 
 // ---- layout -----------------------------------------------------------------------------------------
 
 void CTessel3View::DestroyPool() {
-    for (int slot = 0; slot < m_pool.GetSize(); ++slot) {
-        if (m_pool[slot].m_hWnd)
-            m_pool[slot].DestroyWindow();
+    for (const auto& control : m_pool) {
+        if (control->m_hWnd)
+            control->DestroyWindow();
     }
 }
 
 void CTessel3View::Layout() {
     RedrawHold hold(m_hWnd);
     DestroyPool();
-    m_pool.RemoveAll();
+    m_pool.clear();
     m_nCount = DwgList.GetSize();
     {
         // A client beyond the largest screen would need more controls than the process can spare.
@@ -269,7 +294,9 @@ void CTessel3View::Layout() {
     if (m_nCount == 0)
         return;
 
-    m_pool.SetSize(n.poolSize);
+    m_pool.reserve(static_cast<std::size_t>(n.poolSize));
+    while (PoolSize() < n.poolSize)
+        m_pool.push_back(std::make_unique<exCDwgThumbnail>());
     int top = m_ptOrigin.y;
     for (int row = m_nFirstRow; row < m_nFirstRow + m_nPoolRows; ++row) {
         CreateRow(row, top);
@@ -279,13 +306,13 @@ void CTessel3View::Layout() {
 }
 
 void CTessel3View::CreateRow(int row, int rowTop) {
-    const int poolSize = m_pool.GetSize();
+    const int poolSize = PoolSize();
     if (row < 0 || poolSize == 0)
         return;
     const grid::Geometry g = Geometry();
     for (int column = 0; column < m_nColumns; ++column) {
         const grid::Cell cell = grid::CellOf(g, m_nColumns, poolSize, row, column, rowTop);
-        exCDwgThumbnail& control = m_pool[cell.slot];
+        exCDwgThumbnail& control = PoolControl(cell.slot);
         if (control.m_hWnd)
             control.DestroyWindow();
         if (cell.index < m_nCount)
@@ -299,9 +326,7 @@ void CTessel3View::Refit(bool resizeFrame) {
     if (m_nRows <= 0)
         return;
     FlagGuard guard(m_bAligning);
-    HWND frame = FrameWindow();
-    if (!frame)
-        frame = ::GetAncestor(m_hWnd, GA_ROOT);
+    HWND frame = ::GetAncestor(m_hWnd, GA_ROOT);
     CRect frameRect;
     ::GetWindowRect(frame, &frameRect);
     const CRect client = GetClientRect();
@@ -320,7 +345,7 @@ void CTessel3View::Refit(bool resizeFrame) {
 void CTessel3View::Relayout() {
     RedrawHold hold(m_hWnd);
     DestroyPool();
-    m_pool.RemoveAll();
+    m_pool.clear();
     const int firstRow = grid::RelayoutFirstRow(m_nOldColumns, m_nFirstRow, m_nColumns, m_nCount);
     m_nOldColumns = m_nColumns;
     const int y = grid::RelayoutScrollY(Geometry(), firstRow, m_nTotalHeight);
@@ -422,7 +447,8 @@ bool CTessel3View::OnScroll(UINT scrollCode, UINT pos, bool doScroll) {
 bool CTessel3View::HandleKey(UINT key) {
     switch (key) {
     case VK_TAB:
-        FrameFocusFolderTree();
+        if (onFocusFolderTree)
+            onFocusFolderTree();
         return true;
     case VK_PRIOR:
         m_nFirstRow = grid::PageUpFirstRow(m_nFirstRow, m_nVisibleRows);
@@ -446,7 +472,7 @@ bool CTessel3View::HandleKey(UINT key) {
         LineDown();
         return true;
     case VK_ESCAPE:
-        PostCancel();
+        PostAppResult(kAppCancel);
         return true;
     default:
         return false;
@@ -466,31 +492,30 @@ bool CTessel3View::PreTranslateMessage(MSG* pMsg) {
 
 void CTessel3View::OnKeyDown(UINT nChar, UINT repeat, UINT flags) {
     if (nChar == VK_ESCAPE)
-        PostCancel();
+        PostAppResult(kAppCancel);
     else
         Default();
 }
 
 bool CTessel3View::OnCmdMsg(UINT id, int code) {
-    switch (id) {
-    case ID_VIEW_BEGIN:
-        ScrollToBegin(true);
-        return true;
-    case ID_VIEW_INCREASE:
-        Increase();
-        return true;
-    case ID_VIEW_DECREASE:
-        Decrease();
-        return true;
-    case ID_VIEW_ALIGNE:
-        Align();
-        return true;
-    case ID_SELECT_ALL:
-        SelectAll();
-        return true;
-    default:
-        return CScrollView::OnCmdMsg(id, code);
+    // The grid's commands, as the frame passes them on: each is one operation of the view.
+    static const struct {
+        UINT id;
+        void (*run)(CTessel3View&);
+    } kCommands[] = {
+        {ID_VIEW_BEGIN, [](CTessel3View& view) { view.ScrollToBegin(true); }},
+        {ID_VIEW_INCREASE, [](CTessel3View& view) { view.Increase(); }},
+        {ID_VIEW_DECREASE, [](CTessel3View& view) { view.Decrease(); }},
+        {ID_VIEW_ALIGNE, [](CTessel3View& view) { view.Align(); }},
+        {ID_SELECT_ALL, [](CTessel3View& view) { view.SelectAll(); }},
+    };
+    for (const auto& command : kCommands) {
+        if (command.id == id) {
+            command.run(*this);
+            return true;
+        }
     }
+    return CScrollView::OnCmdMsg(id, code);
 }
 
 void CTessel3View::OnSize(UINT type, int cx, int cy) {
@@ -510,8 +535,8 @@ void CTessel3View::OnDraw(CDC* pDC) {
     const CRect client = GetClientRect();
     pDC->IntersectClipRect(client);
     pDC->FillSolidRect(client, ::GetSysColor(COLOR_SCROLLBAR));
-    for (int slot = 0; slot < m_pool.GetSize(); ++slot) {
-        CThumbLabel& label = m_pool[slot].Label();
+    for (const auto& control : m_pool) {
+        CThumbLabel& label = control->Label();
         if (label.m_hWnd && label.IsRenaming())
             pDC->DrawEdge(label.EdgeRect(), EDGE_SUNKEN, BF_RECT);
     }
@@ -525,7 +550,7 @@ void CTessel3View::OnDestroy() {
 
 LRESULT CTessel3View::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
     switch (message) {
-    case WM_THUMBS_REFRESH:
+    case WM_ORVEX_REFRESH:
         Refresh();
         return 0;
     case WM_PRINTCLIENT: {

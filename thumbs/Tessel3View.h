@@ -1,6 +1,10 @@
 // The thumbnail grid: the right pane of the explorer frame. It lays the drawings of DwgList out in equal
 // cells, keeps a ring of thumbnail controls for the visible rows plus two, and scrolls row by row over a
-// scroll range capped at 32768 pixels. Reached module-wide through g_pTessel3View.
+// scroll range capped at 32768 pixels.
+//
+// The owner (the frame) creates the view with a context that holds the document, and sets the on...
+// handlers through which the grid and its thumbnails tell it what changed; a handler left empty is
+// simply not called. The thumbnails reach the grid through the view that created them.
 //
 // The controls always sit in client coordinates with the first row shown at the top; the scroll
 // position only mirrors the row (it wraps round inside the capped range), and every row step moves the
@@ -8,14 +12,38 @@
 #pragma once
 
 #include "framework/afxview.h"
-#include "framework/CArray.h"
 #include "thumbs/DwgThumbnail.h"
 #include "thumbs/GridMath.h"
+
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+class CTessel3Doc;
 
 class CTessel3View : public CScrollView {
 public:
     CTessel3View();
     ~CTessel3View() override;
+
+    // Set by the owner when it creates the view.
+    std::function<int()> onSortMode;                      // 0 by name, 1 by date, 2 by size
+    std::function<void(bool)> onEnablePick;               // the accept button and its label
+    std::function<void(const std::string&)> onSetTitle;   // the owner's window text
+    std::function<void()> onFolderShown;                  // a folder was scanned and laid out
+    std::function<void(const std::string&)> onStatusText; // the status bar's message (empty clears)
+    std::function<void(const std::string&)> onTellUser;   // something the user must read
+    std::function<void()> onFocusFolderTree;              // Tab leaves the grid for the folder tree
+
+    // The document of the creation context (the explorer's settings and current drawing), or nullptr.
+    CTessel3Doc* Document() const;
+    // What the grid and its thumbnails tell the owner, through the handlers above.
+    int SortMode() const;
+    void EnablePick(bool enable);
+    void SetTitle(const std::string& text);
+    void SetStatusText(const std::string& text);
+    void TellUser(const std::string& text);
 
     // After every scan of the current folder: title, status, then back to the first drawing, sorted.
     void Rebuild();
@@ -34,6 +62,17 @@ public:
     // asks for it is destroyed by the rebuild).
     void PostRefresh();
 
+    // The search edit's search as you type: finds the first drawing whose name starts with text (case
+    // ignored; a whole name matches too), clears every other selection, brings the match into view
+    // selected and makes it the current drawing with the title to match and the pick enabled. Without a
+    // match nothing is selected or current, the pick is disabled, the title shows the folder and the
+    // status bar says that no drawing starts with the text. An empty text or an empty list changes
+    // nothing but the status message. The window that had the focus keeps it.
+    void RunSearch(const std::string& text);
+    // Makes the drawing of that name (case ignored) the chosen one, as a search hit would; false when the
+    // list has no such drawing. The explorer chooses the drawing of the last run this way.
+    bool ChooseDrawing(const std::string& name);
+
     int GetPictureWidth() const { return m_nCellWidth; }
     int GetPictureHeight() const { return m_nCellHeight; }
     int GetColumns() const { return m_nColumns; }
@@ -41,9 +80,7 @@ public:
     int GetRows() const { return m_nRows; }
     int GetVisibleRows() const { return m_nVisibleRows; }
     int GetPoolRows() const { return m_nPoolRows; }
-    int GetPoolSize() const { return m_pool.GetSize(); }
-    // The pool's control in slot `slot` (a window only while its row is alive).
-    exCDwgThumbnail& PoolControl(int slot) { return m_pool[slot]; }
+    int GetPoolSize() const { return static_cast<int>(m_pool.size()); }
     // The live control showing list index `index`, or nullptr.
     exCDwgThumbnail* ControlOf(int index);
 
@@ -55,6 +92,7 @@ public:
     void OnInitialUpdate() override;
 
 protected:
+    int OnCreate(LPCREATESTRUCTA cs) override;
     LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
     bool PreCreateWindow(CREATESTRUCTA& cs) override;
     void OnDraw(CDC* pDC) override;
@@ -78,6 +116,11 @@ private:
     void DestroyPool();
     void Refresh();
     bool HandleKey(UINT key);
+    void ShowChosen(int index);
+    void ShowNothingChosen(const std::string& text);
+    int PoolSize() const { return static_cast<int>(m_pool.size()); }
+    // The pool's control in slot `slot` (a window only while its row is alive).
+    exCDwgThumbnail& PoolControl(int slot) { return *m_pool[static_cast<std::size_t>(slot)]; }
 
     POINT m_ptOrigin{0, 0};
     int m_nCellHeight = grid::kDefaultCellHeight;
@@ -92,10 +135,6 @@ private:
     int m_nVisibleRows = 0;
     bool m_bAligning = false;
     int m_nTotalHeight = 0; // capped scroll height of the last layout
-    CArray<exCDwgThumbnail, exCDwgThumbnail&> m_pool;
+    // The controls live on the heap: resizing the pool never moves or copies a live window.
+    std::vector<std::unique_ptr<exCDwgThumbnail>> m_pool;
 };
-
-extern CTessel3View* g_pTessel3View;
-
-// Posted to the grid view: rescan the current folder and rebuild.
-constexpr UINT WM_THUMBS_REFRESH = WM_USER + 0x321;

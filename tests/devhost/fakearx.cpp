@@ -2,6 +2,7 @@
 // product does, binds the host's operations by name from the process, and defines LISP functions that
 // show what the host does with each kind of result, print and alert, and a picker dialog.
 #include "host/arxhost.h"
+#include "thumbs/AppMessages.h"
 
 #include <windows.h>
 
@@ -195,7 +196,7 @@ INT_PTR CALLBACK PickerProc(HWND dialog, UINT message, WPARAM wParam, LPARAM) {
             return TRUE;
         }
         return FALSE;
-    case WM_APP: // accept (1) or cancel (2), as the explorer posts it
+    case WM_ORVEX_RESULT: // kAppAccept or kAppCancel, as the explorer posts it
         EndDialog(dialog, static_cast<INT_PTR>(wParam));
         return TRUE;
     default:

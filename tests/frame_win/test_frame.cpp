@@ -8,6 +8,7 @@
 #include "settings/SettingsPath.h"
 #include "settings/Tessel3Doc.h"
 #include "tests/support/TempFolder.h"
+#include "thumbs/AppMessages.h"
 #include "thumbs/Tessel3View.h"
 
 #include "res/resource.h"
@@ -25,6 +26,8 @@ namespace {
 
 class TestApp : public CMdiMixin {};
 TestApp g_app;
+// The arguments of the call the next run is given (the host's own frame is added from the host).
+ExplorerCall g_call;
 
 constexpr UINT WM_TEST_STEP = WM_APP + 7;
 constexpr UINT_PTR kWatchdog = 77;
@@ -49,7 +52,9 @@ public:
         CDialog::OnInitDialog();
         if (beforeCreate)
             beforeCreate();
-        created = g_app.CreateAndShow(this);
+        ExplorerCall call = g_call;
+        call.hostFrame = acedGetAcadFrame();
+        created = g_app.CreateAndShow(this, call);
         ::MoveWindow(m_hWnd, 0, 0, 0, 0, TRUE);
         SetTimer(kWatchdog, 15000);
         PostMessage(WM_TEST_STEP, 0);
@@ -57,7 +62,7 @@ public:
     }
 
     bool PreTranslateMessage(MSG* pMsg) override {
-        if (pMsg->message == WM_EXPLORER_RESULT && pMsg->hwnd == m_hWnd)
+        if (pMsg->message == WM_ORVEX_RESULT && pMsg->hwnd == m_hWnd)
             EndDialog(static_cast<INT_PTR>(pMsg->wParam));
         if (pMsg->message == WM_TEST_STEP && pMsg->hwnd == m_hWnd) {
             RunStep(static_cast<size_t>(pMsg->wParam));
@@ -81,8 +86,8 @@ private:
     void RunStep(size_t index) {
         if (hostFrame && !::IsWindowEnabled(hostFrame))
             hostDisabledDuringRun = true;
-        if (index < steps.size() && g_pMainFrame) {
-            steps[index](*g_pMainFrame);
+        if (index < steps.size() && g_app.ExplorerFrame()) {
+            steps[index](*g_app.ExplorerFrame());
             PostMessage(WM_TEST_STEP, index + 1);
         }
     }
@@ -125,9 +130,9 @@ protected:
     void SetUp() override {
         g_app.SetUp(IDR_MAINFRAME);
         std::remove(ExplorerSettingsPath().c_str());
-        std::snprintf(g_szAcceptCaption, kCaptionChars, "%s", "OK");
-        std::snprintf(g_szCancelCaption, kCaptionChars, "%s", "CANCEL");
-        g_szStartPath[0] = '\0';
+        g_call = ExplorerCall{};
+        g_call.acceptCaption = "OK";
+        g_call.cancelCaption = "CANCEL";
         HostApi api;
         SetHostApi(api);
     }
@@ -149,7 +154,7 @@ protected:
         const INT_PTR result = dialog.DoModal();
         Pump();
         EXPECT_TRUE(dialog.created);
-        EXPECT_EQ(g_pMainFrame, nullptr) << "the frame goes with the dialog";
+        EXPECT_EQ(g_app.ExplorerFrame(), nullptr) << "the frame goes with the dialog";
         return result;
     }
 };
@@ -229,8 +234,8 @@ TEST_F(ExplorerFrame, PlaceholdersBecomeSeparatorsHoldingTheSearchControls) {
 }
 
 TEST_F(ExplorerFrame, BottomToolbarCarriesTheCaptionsAndStartsWithoutAPick) {
-    std::snprintf(g_szAcceptCaption, kCaptionChars, "%s", "Insert");
-    std::snprintf(g_szCancelCaption, kCaptionChars, "%s", "Leave");
+    g_call.acceptCaption = "Insert";
+    g_call.cancelCaption = "Leave";
     RunDialog dialog;
     dialog.steps.push_back([](CMainFrame& frame) {
         CToolBar& bar = frame.GetPickToolBar();
@@ -438,7 +443,7 @@ TEST_F(ExplorerFrame, LayerLabelShowsTheStartFolderLayer) {
     const std::string folder = TempFolder("orvex-frame-layer");
     std::ofstream(folder + "\\datains.ini", std::ios::binary)
         << "[Default Parameters]\r\nLayer=Walls\r\nColor=3\r\nLisp command=\r\n";
-    std::snprintf(g_szStartPath, kPathChars, "%s\\plan.dwg", folder.c_str());
+    g_call.startPath = folder + "\\plan.dwg";
     RunDialog dialog;
     std::string label;
     dialog.steps.push_back([&](CMainFrame& frame) {
@@ -557,7 +562,7 @@ void RemoveFolder(const std::string& folder, std::initializer_list<const char*> 
 TEST_F(ExplorerFrame, TypingAPrefixChoosesTheDrawingAndAcceptTakesIt) {
     const auto files = {"abc.dwg", "xyz.dwg"};
     const std::string folder = FolderWithDrawings("orvex-frame-search", files);
-    std::snprintf(g_szStartPath, kPathChars, "%s\\", folder.c_str());
+    g_call.startPath = folder + "\\";
     RunDialog dialog;
     dialog.steps.push_back([](CMainFrame& frame) {
         EXPECT_FALSE(frame.IsPickEnabled());
@@ -616,7 +621,7 @@ TEST_F(ExplorerFrame, SavedDrawingStaysChosenForTheAcceptMessage) {
     const std::string folder = FolderWithDrawings("orvex-frame-saved-msg", files);
     WriteSettings("[CurrentPath]\r\nPath=" + folder + "\r\nName=plan.dwg\r\n");
     RunDialog dialog;
-    dialog.steps.push_back([](CMainFrame&) { CMainFrame::PostResult(kExplorerAccept); });
+    dialog.steps.push_back([](CMainFrame&) { PostAppResult(kAppAccept); });
     EXPECT_EQ(Run(dialog), 1);
     ASSERT_NE(g_pTessel3Doc, nullptr);
     EXPECT_EQ(g_pTessel3Doc->m_strName, "plan.dwg");
@@ -644,7 +649,7 @@ TEST_F(ExplorerFrame, ASavedDrawingNoLongerThereChoosesNothing) {
 TEST_F(ExplorerFrame, TypingWhatNoNameStartsWithChoosesNothingAndSaysSo) {
     const auto files = {"abc.dwg", "xyz.dwg"};
     const std::string folder = FolderWithDrawings("orvex-frame-nomatch", files);
-    std::snprintf(g_szStartPath, kPathChars, "%s\\", folder.c_str());
+    g_call.startPath = folder + "\\";
     RunDialog dialog;
     dialog.steps.push_back([](CMainFrame& frame) {
         CEditSearch& edit = frame.GetSearchEdit();

@@ -64,7 +64,7 @@ TEST_F(Tessel3DocTest, FirstRunStartsWithDefaultsAndWritesTheFreshFile) {
     EXPECT_EQ(ReadBytes(fileName), kFreshFile);
 }
 
-TEST_F(Tessel3DocTest, ConstructorRecordsTheDocumentAndDestructorLeavesIt) {
+TEST_F(Tessel3DocTest, ConstructorRecordsTheDocumentAndDestructorClearsIt) {
     g_pTessel3Doc = nullptr;
     auto doc = std::make_unique<CTessel3Doc>(m_dir.File("Orvex1.ini"));
     CTessel3Doc* address = doc.get();
@@ -72,9 +72,10 @@ TEST_F(Tessel3DocTest, ConstructorRecordsTheDocumentAndDestructorLeavesIt) {
     auto second = std::make_unique<CTessel3Doc>(m_dir.File("Other.ini"));
     EXPECT_EQ(g_pTessel3Doc, second.get());
     second.reset();
+    EXPECT_EQ(g_pTessel3Doc, nullptr) << "no pointer to a document that is gone";
+    g_pTessel3Doc = address;
     doc.reset();
-    EXPECT_NE(g_pTessel3Doc, nullptr);
-    g_pTessel3Doc = nullptr;
+    EXPECT_EQ(g_pTessel3Doc, nullptr);
 }
 
 TEST_F(Tessel3DocTest, LoadsAllNineSettings) {

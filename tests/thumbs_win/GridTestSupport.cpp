@@ -2,45 +2,36 @@
 
 #include "host/HostApi.h"
 #include "tests/support/TempFolder.h"
-#include "thumbs/ThumbsGlue.h"
+#include "thumbs/AppMessages.h"
 
 #include <gtest/gtest.h>
 
 #include <cstdio>
 #include <stdexcept>
 
-// ---- the frame's side of the glue, recorded ---------------------------------------------------------
+// ---- the frame's side of the view's handlers, recorded ---------------------------------------------
 
 FrameRecord& Frame() {
     static FrameRecord record;
     return record;
 }
 
-int FrameSortMode() {
-    return Frame().sortMode;
+namespace {
+
+void RecordFrameRequests(CTessel3View& view) {
+    view.onSortMode = [] { return Frame().sortMode; };
+    view.onEnablePick = [](bool enable) {
+        Frame().pickEnabled = enable;
+        ++Frame().pickCalls;
+    };
+    view.onSetTitle = [](const std::string& text) { Frame().title = text; };
+    view.onFolderShown = [] { ++Frame().statusUpdates; };
+    view.onStatusText = [](const std::string& text) { Frame().status = text; };
+    view.onTellUser = [](const std::string& text) { Frame().toldUser.push_back(text); };
+    view.onFocusFolderTree = [] { ++Frame().treeFocusRequests; };
 }
-void FrameEnablePick(bool enable) {
-    Frame().pickEnabled = enable;
-    ++Frame().pickCalls;
-}
-void FrameSetTitle(const std::string& text) {
-    Frame().title = text;
-}
-void FrameUpdateStatus() {
-    ++Frame().statusUpdates;
-}
-void FrameSetStatusText(const std::string& text) {
-    Frame().status = text;
-}
-void FrameTellUser(const std::string& text) {
-    Frame().toldUser.push_back(text);
-}
-void FrameFocusFolderTree() {
-    ++Frame().treeFocusRequests;
-}
-HWND FrameWindow() {
-    return Frame().frame;
-}
+
+} // namespace
 
 // ---- host ---------------------------------------------------------------------------------------------
 
@@ -72,7 +63,7 @@ void InstallCountingHost() {
 // ---- windows ------------------------------------------------------------------------------------------
 
 LRESULT MainWindow::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
-    if (message == WM_APP) {
+    if (message == WM_ORVEX_RESULT) {
         results.push_back(wParam);
         return 0;
     }
@@ -89,15 +80,18 @@ MainWindow& Main() {
     return main;
 }
 
-bool TestFrame::CreateFrame(int clientWidth, int clientHeight) {
+bool TestFrame::CreateFrame(int clientWidth, int clientHeight, CDocument* doc) {
     RECT rc{0, 0, clientWidth, clientHeight};
     ::AdjustWindowRectEx(&rc, WS_OVERLAPPEDWINDOW, FALSE, 0);
     if (!CreateEx(0, nullptr, "grid", WS_OVERLAPPEDWINDOW | WS_CLIPCHILDREN,
                   CRect(20, 20, 20 + rc.right - rc.left, 20 + rc.bottom - rc.top), nullptr, 0))
         return false;
     view = new CTessel3View; // deletes itself with its window
+    RecordFrameRequests(*view);
+    CCreateContext context;
+    context.m_pCurrentDoc = doc;
     if (!view->Create(nullptr, nullptr, WS_CHILD | WS_VISIBLE, CRect(0, 0, clientWidth, clientHeight), this,
-                      0xE900, nullptr))
+                      0xE900, &context))
         return false;
     view->OnInitialUpdate();
     ShowWindow(SW_SHOW);
@@ -262,7 +256,7 @@ GridBench::GridBench(int clientWidth, int clientHeight, const std::string& setti
         }
     }
     m_doc = std::make_unique<CTessel3Doc>(m_settings);
-    m_frame.CreateFrame(clientWidth, clientHeight);
+    m_frame.CreateFrame(clientWidth, clientHeight, m_doc.get());
     Frame().frame = m_frame.m_hWnd;
     Pump();
 }
@@ -278,7 +272,6 @@ GridBench::~GridBench() {
     Pump();
     Frame().frame = nullptr;
     m_doc.reset();
-    g_pTessel3Doc = nullptr;
     ::DeleteFileA(m_settings.c_str());
     DwgList.RemoveAll();
     for (const std::string& report : Reports())

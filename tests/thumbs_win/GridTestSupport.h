@@ -11,7 +11,7 @@
 #include <string>
 #include <vector>
 
-// What the grid asked of the frame (ThumbsGlue.h).
+// What the grid asked of the frame (through the view's handlers).
 struct FrameRecord {
     int sortMode = 0;
     bool pickEnabled = false;
@@ -48,7 +48,8 @@ MainWindow& Main();
 // A top-level frame whose client is the grid view.
 class TestFrame : public CWnd {
 public:
-    bool CreateFrame(int clientWidth, int clientHeight);
+    // The view is given doc through its creation context.
+    bool CreateFrame(int clientWidth, int clientHeight, CDocument* doc);
     CTessel3View* view = nullptr;
     std::vector<UINT> commands; // menu commands that reached the frame
 

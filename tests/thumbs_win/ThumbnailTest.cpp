@@ -135,7 +135,7 @@ TEST(ThumbnailMenu, PasteGreyedWithoutFilesAndSortModeChecked) {
     }
     Frame().sortMode = 1;
     CMenu menu;
-    CMenu popup = BuildThumbnailMenu(menu);
+    CMenu popup = BuildThumbnailMenu(menu, bench.view().SortMode());
     ASSERT_NE(popup.m_hMenu, nullptr);
     EXPECT_TRUE(popup.GetMenuState(ID_THUMB_PASTE, MF_BYCOMMAND) & MF_GRAYED);
     EXPECT_FALSE(popup.GetMenuState(ID_THUMB_COPY, MF_BYCOMMAND) & MF_GRAYED);
@@ -320,7 +320,7 @@ TEST(Search, FindsThePrefixSelectsShowsAndKeepsTheFocus) {
     edit.SetFocus();
     DwgList[0].Select();
     DwgList[10].Select();
-    RunSearch("D02500");
+    bench.view().RunSearch("D02500");
     EXPECT_TRUE(DwgList[2500].IsSelected());
     EXPECT_FALSE(DwgList[0].IsSelected());
     EXPECT_FALSE(DwgList[10].IsSelected());
@@ -334,7 +334,7 @@ TEST(Search, FindsThePrefixSelectsShowsAndKeepsTheFocus) {
     EXPECT_TRUE(Frame().pickEnabled);
 
     // A whole name matches.
-    RunSearch("d00007.dwg");
+    bench.view().RunSearch("d00007.dwg");
     EXPECT_TRUE(DwgList[7].IsSelected());
     EXPECT_EQ(g_pTessel3Doc->m_strName, "d00007.dwg");
     EXPECT_EQ(bench.view().GetFirstRow(), 7 / bench.view().GetColumns());
@@ -346,12 +346,12 @@ TEST(Search, NoMatchChoosesNothingAndSaysSo) {
     FillList(300);
     bench.view().Rebuild();
     Pump();
-    RunSearch("d00150");
+    bench.view().RunSearch("d00150");
     ASSERT_TRUE(DwgList[150].IsSelected());
     ASSERT_TRUE(Frame().pickEnabled);
     const int firstRow = bench.view().GetFirstRow();
 
-    RunSearch("xyz");
+    bench.view().RunSearch("xyz");
     EXPECT_FALSE(AnySelected());
     EXPECT_FALSE(LabelHighlighted(bench.view().ControlOf(150)));
     EXPECT_EQ(g_pTessel3Doc->m_strName, "");
@@ -361,7 +361,7 @@ TEST(Search, NoMatchChoosesNothingAndSaysSo) {
     EXPECT_EQ(bench.view().GetFirstRow(), firstRow) << "the grid stays where it was";
 
     // A match again takes the message away.
-    RunSearch("D00002");
+    bench.view().RunSearch("D00002");
     EXPECT_TRUE(DwgList[2].IsSelected());
     EXPECT_EQ(Frame().status, "");
     EXPECT_TRUE(Frame().pickEnabled);
@@ -378,16 +378,16 @@ TEST(Search, ChoosingADrawingByItsWholeName) {
     EndScan();
     bench.view().Rebuild();
     Pump();
-    RunSearch("plan");
+    bench.view().RunSearch("plan");
     EXPECT_EQ(g_pTessel3Doc->m_strName, "plan-a.dwg");
-    EXPECT_TRUE(ChooseDrawing("PLAN.dwg"));
+    EXPECT_TRUE(bench.view().ChooseDrawing("PLAN.dwg"));
     EXPECT_EQ(g_pTessel3Doc->m_strName, "plan.dwg");
     EXPECT_TRUE(DwgList[1].IsSelected());
     EXPECT_FALSE(DwgList[0].IsSelected());
     EXPECT_TRUE(LabelHighlighted(bench.view().ControlOf(1)));
     EXPECT_FALSE(LabelHighlighted(bench.view().ControlOf(0)));
     EXPECT_TRUE(Frame().pickEnabled);
-    EXPECT_FALSE(ChooseDrawing("gone.dwg"));
+    EXPECT_FALSE(bench.view().ChooseDrawing("gone.dwg"));
     EXPECT_EQ(g_pTessel3Doc->m_strName, "plan.dwg");
 }
 
@@ -397,12 +397,12 @@ TEST(Search, EmptyTextOrListChangesNothing) {
     bench.view().Rebuild();
     DwgList[3].Select();
     g_pTessel3Doc->m_strName = "keep";
-    RunSearch("");
+    bench.view().RunSearch("");
     EXPECT_TRUE(DwgList[3].IsSelected());
     EXPECT_EQ(g_pTessel3Doc->m_strName, "keep");
     FillList(0);
     bench.view().Rebuild();
-    RunSearch("d");
+    bench.view().RunSearch("d");
     EXPECT_EQ(g_pTessel3Doc->m_strName, "keep");
 }
 

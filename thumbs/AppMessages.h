@@ -1,0 +1,22 @@
+// The explorer's own window messages, in one place for the library, its tests and the development host.
+//
+// The run dialog is the application's main window while the explorer is open: the explorer tells it what
+// the user decided with WM_ORVEX_RESULT, and the dialog's loop ends the call with it. The grid view asks
+// itself to rescan with WM_ORVEX_REFRESH once the message being handled is done.
+#pragma once
+
+#include <windows.h>
+
+// Posted to the application's main window; wParam is an AppResult.
+constexpr UINT WM_ORVEX_RESULT = WM_APP;
+// Posted to the grid view: rescan the current folder and rebuild.
+constexpr UINT WM_ORVEX_REFRESH = WM_USER + 0x321;
+
+// What the user decided, as WM_ORVEX_RESULT carries it.
+enum AppResult : WPARAM {
+    kAppAccept = 1, // take the chosen drawing
+    kAppCancel = 2, // leave without one
+};
+
+// Posts WM_ORVEX_RESULT with `result` to the application's main window; false when there is none.
+bool PostAppResult(AppResult result);
