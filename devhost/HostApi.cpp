@@ -9,7 +9,7 @@
 #include "devhost/Timing.h"
 
 #ifdef DEVHOST_HAVE_DWGPREVIEW
-#include "thumbs/preview/DrawPreview.h"
+#include "preview/DrawPreview.h"
 #endif
 
 #include <cstdarg>

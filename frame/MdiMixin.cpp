@@ -3,7 +3,7 @@
 #include "frame/FolderPaneLink.h"
 #include "frame/GridLink.h"
 #include "frame/MainFrame.h"
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 #include "host/Orvex.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/DwgList.h"

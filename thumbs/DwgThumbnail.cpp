@@ -1,7 +1,7 @@
 #include "thumbs/DwgThumbnail.h"
 
-#include "host/HostApi.h"
-#include "host/TextConv.h"
+#include "hostapi/HostApi.h"
+#include "hostapi/TextConv.h"
 #include "res/resource.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/DwgList.h"

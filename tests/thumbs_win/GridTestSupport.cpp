@@ -1,6 +1,6 @@
 #include "GridTestSupport.h"
 
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 #include "thumbs/ThumbsGlue.h"
 
 #include <gtest/gtest.h>

@@ -1,6 +1,6 @@
-#include "thumbs/preview/DrawPreview.h"
+#include "preview/DrawPreview.h"
 
-#include "thumbs/preview/DwgPreview.h"
+#include "preview/DwgPreview.h"
 
 #include <objbase.h>
 #include <wincodec.h>

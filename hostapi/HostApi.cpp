@@ -1,4 +1,4 @@
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 
 #include <cstdarg>
 #include <cstdio>

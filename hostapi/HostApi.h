@@ -3,7 +3,7 @@
 // lacks it. Portable: native tests fill the table with fakes.
 #pragma once
 
-#include "host/arxhost.h"
+#include "hostapi/arxhost.h"
 
 #include <string>
 
