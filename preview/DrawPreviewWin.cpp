@@ -273,3 +273,16 @@ bool DrawDwgPreview(HDC dc, const RECT& area, const wchar_t* fileName, COLORREF 
     DrawNoPreviewMark(dc, area);
     return false;
 }
+
+bool DrawDwgPreviewInWindow(HWND window, const wchar_t* fileName, COLORREF background) {
+    if (!window || !IsWindow(window))
+        return false;
+    RECT area{};
+    GetClientRect(window, &area);
+    HDC dc = GetDC(window);
+    if (!dc)
+        return false;
+    const bool drawn = DrawDwgPreview(dc, area, fileName, background);
+    ReleaseDC(window, dc);
+    return drawn;
+}
