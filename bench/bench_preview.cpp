@@ -1,6 +1,6 @@
 // Reading one drawing's preview against reading the same bytes raw (one seek and one read of exactly
 // the picture), averaged over every sample drawing that has a preview, and over synthetic drawings.
-#include "thumbs/preview/DwgPreview.h"
+#include "preview/DwgPreview.h"
 
 #include "BenchClock.h"
 #include "SyntheticDwg.h"

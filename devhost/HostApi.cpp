@@ -9,7 +9,7 @@
 #include "devhost/Timing.h"
 
 #ifdef DEVHOST_HAVE_DWGPREVIEW
-#include "thumbs/preview/DrawPreview.h"
+#include "preview/DrawPreview.h"
 #endif
 
 #include <cstdarg>
@@ -212,19 +212,16 @@ std::uint32_t acedGetRGB(int colorIndex) {
     return PaletteColorRef(colorIndex);
 }
 
+// Declared exported above, but a function that is not defined here is not exported: the variant without
+// the operation plays a host that lacks it.
+#ifndef DEVHOST_WITHOUT_PREVIEW_OPERATION
 bool acdbDisplayPreviewFromDwg(const wchar_t* fileName, HWND window, const std::uint32_t* bgColor) {
 #ifdef DEVHOST_HAVE_DWGPREVIEW
     return Guarded(false, [&] {
         if (!fileName || !window || !IsWindow(window))
             return false;
-        RECT area{};
-        GetClientRect(window, &area);
-        HDC dc = GetDC(window);
-        if (!dc)
-            return false;
         const COLORREF background = bgColor ? static_cast<COLORREF>(*bgColor) : GetSysColor(COLOR_WINDOW);
-        const bool drawn = DrawDwgPreview(dc, area, fileName, background);
-        ReleaseDC(window, dc);
+        const bool drawn = DrawDwgPreviewInWindow(window, fileName, background);
         TimingPreviewDrawn(window, fileName);
         return drawn;
     });
@@ -232,6 +229,7 @@ bool acdbDisplayPreviewFromDwg(const wchar_t* fileName, HWND window, const std::
     return false;
 #endif
 }
+#endif
 
 int onLoadArxApp(const wchar_t* moduleFileName) {
     Guarded(0, [&] {

@@ -4,7 +4,7 @@
 #pragma once
 
 #include "devhost/Options.h"
-#include "host/arxhost.h"
+#include "hostapi/arxhost.h"
 
 #include <windows.h>
 

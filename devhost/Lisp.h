@@ -3,7 +3,7 @@
 // interface.
 #pragma once
 
-#include "host/arxhost.h"
+#include "hostapi/arxhost.h"
 
 #include <string>
 #include <string_view>

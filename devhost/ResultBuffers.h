@@ -2,7 +2,7 @@
 // so that any module of the process can release them. Portable.
 #pragma once
 
-#include "host/arxhost.h"
+#include "hostapi/arxhost.h"
 
 #include <cstdarg>
 

@@ -1,6 +1,7 @@
 #include "frame/MdiMixin.h"
 
 #include "frame/MainFrame.h"
+#include "hostapi/HostApi.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/DwgList.h"
 #include "thumbs/Tessel3View.h"

@@ -1,7 +1,7 @@
 #include "host/AdsListUser.h"
 
-#include "host/HostApi.h"
-#include "host/TextConv.h"
+#include "hostapi/HostApi.h"
+#include "hostapi/TextConv.h"
 
 #include <cstdlib>
 #include <cstring>

@@ -9,7 +9,7 @@
 // the list as it was.
 #pragma once
 
-#include "host/arxhost.h"
+#include "hostapi/arxhost.h"
 
 #include <cstddef>
 

@@ -1,9 +1,9 @@
 #include "host/ArxApp.h"
 
 #include "host/DataManager.h"
-#include "host/Guard.h"
-#include "host/HostApi.h"
-#include "host/TextConv.h"
+#include "hostapi/Guard.h"
+#include "hostapi/HostApi.h"
+#include "hostapi/TextConv.h"
 #include "settings/SettingsReport.h"
 
 // Static initialisation order matters: the data manager registers with the host's document manager

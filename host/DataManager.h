@@ -1,7 +1,7 @@
 // Per-document data, dropped when the host destroys the document.
 #pragma once
 
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 
 #include <map>
 

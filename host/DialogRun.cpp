@@ -1,7 +1,7 @@
 #include "host/DialogRun.h"
 
 #include "host/ArxApp.h"
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 #include "host/Orvex.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"

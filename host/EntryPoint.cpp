@@ -1,7 +1,7 @@
 #include "host/EntryPoint.h"
 
-#include "host/HostApi.h"
 #include "host/Orvex.h"
+#include "hostapi/HostApi.h"
 
 const LispFunction g_lispFunctions[kLispFunctionCount] = {
     {L"Orvex", &Orvex},

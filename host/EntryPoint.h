@@ -1,7 +1,7 @@
 // The entry point's message dispatch and the table of the library's LISP functions.
 #pragma once
 
-#include "host/arxhost.h"
+#include "hostapi/arxhost.h"
 
 struct LispFunction {
     const wchar_t* name; // as the host's LISP sees it

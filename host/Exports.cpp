@@ -1,7 +1,7 @@
 // The library's whole export table (see Orvex1.def). Nothing thrown inside may leave these functions.
 #include "host/EntryPoint.h"
-#include "host/Guard.h"
 #include "host/ModuleObject.h"
+#include "hostapi/Guard.h"
 
 #include "framework/afxwin.h"
 

@@ -1,6 +1,6 @@
 #include "host/ModuleObject.h"
 
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 
 #include <windows.h>
 

@@ -1,7 +1,7 @@
 // The module object the host's runtime asks for with odrxCreateModuleObject. One per process.
 #pragma once
 
-#include "host/arxhost.h"
+#include "hostapi/arxhost.h"
 
 #include <atomic>
 

@@ -1,8 +1,8 @@
 #include "host/Orvex.h"
 
 #include "host/AdsListUser.h"
-#include "host/HostApi.h"
-#include "host/TextConv.h"
+#include "hostapi/HostApi.h"
+#include "hostapi/TextConv.h"
 #include "settings/IniFile.h"
 #include "settings/Tessel3Doc.h"
 

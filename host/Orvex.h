@@ -1,7 +1,7 @@
 // The library's one LISP function and the process-wide values it hands to the explorer.
 #pragma once
 
-#include "host/arxhost.h"
+#include "hostapi/arxhost.h"
 
 #include <string>
 

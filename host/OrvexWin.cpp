@@ -1,8 +1,8 @@
 // The picker's platform on Windows: the shell's display names, the run dialog and the document.
 #include "host/ArxApp.h"
 #include "host/DialogRun.h"
-#include "host/HostApi.h"
 #include "host/Orvex.h"
+#include "hostapi/HostApi.h"
 #include "settings/Tessel3Doc.h"
 
 #include <shellapi.h>

@@ -1,7 +1,7 @@
 #include "thumbs/DwgThumbnail.h"
 
-#include "host/HostApi.h"
-#include "host/TextConv.h"
+#include "hostapi/TextConv.h"
+#include "preview/ShowPreview.h"
 #include "res/resource.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
@@ -265,7 +265,7 @@ void exCDwgThumbnail::OnPaint() {
     // The bare name: the host resolves it against the current directory, which the scan set.
     const std::wstring wide = WidenAnsi(m_strName);
     const std::uint32_t background = 0;
-    acdbDisplayPreviewFromDwg(wide.c_str(), m_hWnd, &background);
+    ShowDwgPreview(m_hWnd, wide.c_str(), background);
 }
 
 LRESULT exCDwgThumbnail::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {

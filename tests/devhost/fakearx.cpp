@@ -1,7 +1,7 @@
 // A small extension library for devhost's tests. It exports the four entry functions the way the
 // product does, binds the host's operations by name from the process, and defines LISP functions that
 // show what the host does with each kind of result, print and alert, and a picker dialog.
-#include "host/arxhost.h"
+#include "hostapi/arxhost.h"
 #include "thumbs/AppMessages.h"
 
 #include <windows.h>

@@ -3,7 +3,7 @@
 // loop ends with what the explorer posts (1 accept, 2 cancel).
 #include "frame/MainFrame.h"
 #include "frame/MdiMixin.h"
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 #include "host/Orvex.h"
 #include "settings/SettingsPath.h"
 #include "settings/Tessel3Doc.h"

@@ -91,4 +91,17 @@ TEST(HostApiTest, MissingOperationDegradesAndIsReportedOnce) {
               "print:\nOrvex1: the host does not provide acedAlert; that feature is not available.\n");
 }
 
+TEST(HostApiTest, MissingOperationTheLibraryMakesUpForSaysWhatItDoesInstead) {
+    FakeHost host;
+    HostApi api = Host();
+    api.acdbDisplayPreviewFromDwg = nullptr;
+    SetHostApi(api);
+    ReportMissingHostOperation("acdbDisplayPreviewFromDwg", "the library draws the previews itself");
+    ReportMissingHostOperation("acdbDisplayPreviewFromDwg", "the library draws the previews itself");
+    ASSERT_EQ(host.events.size(), 1u);
+    EXPECT_EQ(host.events[0],
+              "print:\nOrvex1: the host does not provide acdbDisplayPreviewFromDwg; the library "
+              "draws the previews itself.\n");
+}
+
 } // namespace

@@ -2,7 +2,7 @@
 // keeps the LISP result, and can refuse allocations on demand.
 #pragma once
 
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 
 #include <string>
 #include <vector>

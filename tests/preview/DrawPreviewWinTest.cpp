@@ -1,7 +1,7 @@
 // Drawing previews into a memory device context (Windows build, runs under Wine).
-#include "thumbs/preview/DrawPreview.h"
+#include "preview/DrawPreview.h"
 
-#include "thumbs/preview/DwgPreview.h"
+#include "preview/DwgPreview.h"
 
 #include "SyntheticDwg.h"
 #include "tests/support/TempFolder.h"

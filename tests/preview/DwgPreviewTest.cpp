@@ -1,4 +1,4 @@
-#include "thumbs/preview/DwgPreview.h"
+#include "preview/DwgPreview.h"
 
 #include "SyntheticDwg.h"
 #include "tests/support/TempFolder.h"

@@ -1,5 +1,5 @@
 // Fuzzes the preview reader with whole files held in memory.
-#include "thumbs/preview/DwgPreview.h"
+#include "preview/DwgPreview.h"
 
 #include <cstddef>
 #include <cstdint>

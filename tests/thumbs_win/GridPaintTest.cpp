@@ -3,7 +3,7 @@
 // through its own device context, as the real one does.
 #include "GridTestSupport.h"
 
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 
 #include <gtest/gtest.h>
 

@@ -1,6 +1,6 @@
 #include "GridTestSupport.h"
 
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 #include "tests/support/TempFolder.h"
 #include "thumbs/AppMessages.h"
 

@@ -1,6 +1,6 @@
 #include "SyntheticDwg.h"
 
-#include "thumbs/preview/DwgPreview.h"
+#include "preview/DwgPreview.h"
 
 #include <algorithm>
 #include <cstdio>

@@ -1,4 +1,4 @@
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 
 #include <cstdarg>
 #include <cstdio>
@@ -51,12 +51,18 @@ std::string MissingHostOperations() {
 void WriteDebuggerLine(const char* text); // per platform, beside BindHostApi
 
 void ReportMissingHostOperation(const char* operation) {
+    ReportMissingHostOperation(operation, "that feature is not available");
+}
+
+void ReportMissingHostOperation(const char* operation, const char* instead) {
     HostState& s = State();
     if (!s.reported.insert(operation).second)
         return;
     std::string line = "\nOrvex1: the host does not provide ";
     line += operation;
-    line += "; that feature is not available.\n";
+    line += "; ";
+    line += instead;
+    line += ".\n";
     if (s.api.acutPrintf) {
         std::wstring wide(line.begin(), line.end()); // the text is plain ASCII
         s.api.acutPrintf(L"%ls", wide.c_str());

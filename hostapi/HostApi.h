@@ -3,7 +3,7 @@
 // lacks it. Portable: native tests fill the table with fakes.
 #pragma once
 
-#include "host/arxhost.h"
+#include "hostapi/arxhost.h"
 
 #include <string>
 
@@ -29,6 +29,8 @@ std::string MissingHostOperations();
 // Says once per operation, on the host's command line (or the debugger when even printing is missing),
 // that a feature is unavailable because the host lacks `operation`.
 void ReportMissingHostOperation(const char* operation);
+// The same when the library makes up for the operation itself: `instead` says what it does.
+void ReportMissingHostOperation(const char* operation, const char* instead);
 
 // Wrappers. Each calls the bound operation; when the host lacks it, it reports that once and returns
 // the failure value of the operation (RTERROR, nullptr, false, 0).

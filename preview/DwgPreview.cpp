@@ -1,4 +1,4 @@
-#include "thumbs/preview/DwgPreview.h"
+#include "preview/DwgPreview.h"
 
 #include <cstdio>
 #include <cstring>

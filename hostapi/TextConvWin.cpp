@@ -1,4 +1,4 @@
-#include "host/TextConv.h"
+#include "hostapi/TextConv.h"
 
 #include <windows.h>
 

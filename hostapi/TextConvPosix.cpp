@@ -1,5 +1,5 @@
 // Native builds stand in for the ANSI code page with Latin-1: one byte, one character.
-#include "host/TextConv.h"
+#include "hostapi/TextConv.h"
 
 std::wstring WidenAnsi(const std::string& text) {
     std::wstring wide;

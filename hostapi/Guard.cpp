@@ -1,7 +1,7 @@
-#include "host/Guard.h"
+#include "hostapi/Guard.h"
 
-#include "host/HostApi.h"
-#include "host/TextConv.h"
+#include "hostapi/HostApi.h"
+#include "hostapi/TextConv.h"
 
 void ReportLibraryError(const char* where, const char* what) {
     try {

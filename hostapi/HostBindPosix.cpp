@@ -1,5 +1,5 @@
 // Native builds have no host process to bind from: the table stays empty until a test fills it.
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 
 #include <cstdio>
 

@@ -2,7 +2,7 @@
 // The executable is searched first, then every other module in load order, so a host that spreads its
 // interface over several DLLs is found too. This runs during the library's static initialisation
 // (under the loader lock), so it only calls GetModuleHandle, EnumProcessModules and GetProcAddress.
-#include "host/HostApi.h"
+#include "hostapi/HostApi.h"
 
 #include <windows.h>
 #include <psapi.h>

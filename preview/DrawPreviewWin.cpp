@@ -1,6 +1,6 @@
-#include "thumbs/preview/DrawPreview.h"
+#include "preview/DrawPreview.h"
 
-#include "thumbs/preview/DwgPreview.h"
+#include "preview/DwgPreview.h"
 
 #include <objbase.h>
 #include <wincodec.h>
@@ -272,4 +272,17 @@ bool DrawDwgPreview(HDC dc, const RECT& area, const wchar_t* fileName, COLORREF 
     FillBackground(dc, area, background);
     DrawNoPreviewMark(dc, area);
     return false;
+}
+
+bool DrawDwgPreviewInWindow(HWND window, const wchar_t* fileName, COLORREF background) {
+    if (!window || !IsWindow(window))
+        return false;
+    RECT area{};
+    GetClientRect(window, &area);
+    HDC dc = GetDC(window);
+    if (!dc)
+        return false;
+    const bool drawn = DrawDwgPreview(dc, area, fileName, background);
+    ReleaseDC(window, dc);
+    return drawn;
 }
