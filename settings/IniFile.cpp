@@ -353,3 +353,9 @@ bool CIniFile::DeleteKey(std::string keyname) {
     }
     return true;
 }
+
+// The same on every system: the process and a count of the calls keep two writers apart.
+std::string TemporaryFileBeside(const std::string& fileName, unsigned long processId,
+                                unsigned long callNumber) {
+    return fileName + "." + std::to_string(processId) + "-" + std::to_string(callNumber) + ".tmp";
+}

@@ -37,11 +37,6 @@ bool WriteAll(int fd, const std::string& bytes, int& error) {
 
 } // namespace
 
-std::string TemporaryFileBeside(const std::string& fileName, unsigned long processId,
-                                unsigned long callNumber) {
-    return fileName + "." + std::to_string(processId) + "-" + std::to_string(callNumber) + ".tmp";
-}
-
 WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, std::string& bytes,
                             unsigned long long* fileSize) {
     struct stat st;

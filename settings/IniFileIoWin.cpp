@@ -86,11 +86,6 @@ bool MoveOver(const std::string& temporary, const std::string& fileName) {
 
 } // namespace
 
-std::string TemporaryFileBeside(const std::string& fileName, unsigned long processId,
-                                unsigned long callNumber) {
-    return fileName + "." + std::to_string(processId) + "-" + std::to_string(callNumber) + ".tmp";
-}
-
 WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, std::string& bytes,
                             unsigned long long* fileSize) {
     const DWORD attributes = ::GetFileAttributesA(fileName.c_str());

@@ -86,8 +86,8 @@ fi
 # --- garbage, and a line of 3,000 characters, in Orvex1.ini ---
 python3 -c '
 import random, sys
-random.seed(11)
-sys.stdout.buffer.write(b"[View]\r\nSort=1\r\n" + bytes(random.randrange(256) for _ in range(20000)))
+r = random.Random(11)
+sys.stdout.buffer.write(b"[View]\r\nSort=1\r\n" + bytes(r.randrange(256) for _ in range(20000)))
 ' >"$ini"
 cp "$ini" "$WORK/ini.saved"
 script_with_host_checks 'wait text="Cancel" timeout=20000' 'sleep 300' \

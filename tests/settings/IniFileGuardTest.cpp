@@ -247,13 +247,13 @@ TEST_F(IniGuardTest, LayoutAloneDoesNotStopASave) {
 }
 
 TEST_F(IniGuardTest, BinaryGarbageIsReadHarmlesslyAndKept) {
-    for (unsigned seed : {1u, 7u, 42u, 1234u}) {
-        SCOPED_TRACE("seed " + std::to_string(seed));
-        std::mt19937 rng(seed);
+    for (unsigned stream : {1u, 7u, 42u, 1234u}) {
+        SCOPED_TRACE("stream " + std::to_string(stream));
+        std::mt19937 rng(stream);
         std::string text(64 * 1024, '\0');
         for (char& c : text)
             c = static_cast<char>(rng() & 0xFF);
-        std::string fileName = m_dir.File("garbage-" + std::to_string(seed) + ".ini");
+        std::string fileName = m_dir.File("garbage-" + std::to_string(stream) + ".ini");
         WriteBytes(fileName, text);
         CIniFile ini(fileName);
         ASSERT_NO_THROW(ini.ReadFile());
@@ -556,9 +556,9 @@ struct ModelStore {
 TEST_F(IniGuardTest, IndexFollowsEveryChange) {
     const std::vector<std::string> keyNames = {"", "A", "a", "B", "Size", "View", " A", "A "};
     const std::vector<std::string> valueNames = {"", "x", "X", "y", "Path", "path", "Sort", "z "};
-    for (unsigned seed = 1; seed <= 20; ++seed) {
-        SCOPED_TRACE("seed " + std::to_string(seed));
-        std::mt19937 rng(seed);
+    for (unsigned stream = 1; stream <= 20; ++stream) {
+        SCOPED_TRACE("stream " + std::to_string(stream));
+        std::mt19937 rng(stream);
         auto pick = [&](const std::vector<std::string>& pool) {
             return pool[std::uniform_int_distribution<std::size_t>(0, pool.size() - 1)(rng)];
         };
