@@ -103,6 +103,12 @@ bool CWaitingTreeCtrl::OnNotifyReflect(NMHDR* hdr, LRESULT* result) {
             Populate(std::exchange(m_hItemToPopulate, nullptr));
     } else if ((tv->action & TVE_COLLAPSE) && WantsRefresh()) {
         DeleteChildren(node);
+        // The button stays, so that the node can be filled again.
+        TVITEMA tvi{};
+        tvi.mask = TVIF_HANDLE | TVIF_CHILDREN;
+        tvi.hItem = node;
+        tvi.cChildren = 1;
+        SetItem(&tvi);
     }
     return true;
 }
