@@ -1,5 +1,23 @@
 #include "afxtree.h"
 
+UINT AfxTreeNotifyCode(UINT code) {
+    switch (code) {
+    case TVN_SELCHANGINGW: return TVN_SELCHANGINGA;
+    case TVN_SELCHANGEDW: return TVN_SELCHANGEDA;
+    case TVN_GETDISPINFOW: return TVN_GETDISPINFOA;
+    case TVN_SETDISPINFOW: return TVN_SETDISPINFOA;
+    case TVN_ITEMEXPANDINGW: return TVN_ITEMEXPANDINGA;
+    case TVN_ITEMEXPANDEDW: return TVN_ITEMEXPANDEDA;
+    case TVN_BEGINDRAGW: return TVN_BEGINDRAGA;
+    case TVN_BEGINRDRAGW: return TVN_BEGINRDRAGA;
+    case TVN_DELETEITEMW: return TVN_DELETEITEMA;
+    case TVN_BEGINLABELEDITW: return TVN_BEGINLABELEDITA;
+    case TVN_ENDLABELEDITW: return TVN_ENDLABELEDITA;
+    case TVN_GETINFOTIPW: return TVN_GETINFOTIPA;
+    default: return code;
+    }
+}
+
 HTREEITEM CTreeCtrl::InsertItem(const std::string& text, int image, int selectedImage, HTREEITEM parent,
                                 HTREEITEM after, LPARAM data, int children) {
     TVINSERTSTRUCTA insert{};
@@ -71,4 +89,18 @@ HTREEITEM CTreeCtrl::HitTest(CPoint pt, UINT* flags) const {
     if (flags)
         *flags = info.flags;
     return item;
+}
+
+bool CTreeCtrl::SetItemState(HTREEITEM item, UINT state, UINT mask) {
+    TVITEMA tvi{};
+    tvi.mask = TVIF_STATE;
+    tvi.hItem = item;
+    tvi.state = state;
+    tvi.stateMask = mask;
+    return SetItem(&tvi);
+}
+
+COLORREF CTreeCtrl::GetEffectiveBkColor() const {
+    const COLORREF colour = GetBkColor();
+    return colour == CLR_NONE ? ::GetSysColor(COLOR_WINDOW) : (colour & 0xFFFFFF);
 }

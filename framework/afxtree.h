@@ -3,6 +3,12 @@
 
 #include "afxwin.h"
 
+// The tree control sends its notifications with text in the form its parent asked for (WM_NOTIFYFORMAT):
+// ANSI codes to the framework's windows, wide codes to wide parents. The two NMTREEVIEW and NMTVDISPINFO
+// layouts match except for the text pointer's type. Returns the ANSI code for either form, the code
+// itself for every other notification.
+UINT AfxTreeNotifyCode(UINT code);
+
 class CTreeCtrl : public CWnd {
 public:
     bool Create(DWORD style, const RECT& rect, CWnd* parent, UINT id) {
@@ -34,6 +40,14 @@ public:
     UINT GetItemState(HTREEITEM item, UINT mask) const {
         return static_cast<UINT>(SendMessage(TVM_GETITEMSTATE, reinterpret_cast<WPARAM>(item), mask));
     }
+    bool SetItemState(HTREEITEM item, UINT state, UINT mask);
+    // The background colour; CLR_NONE (-1) while the control uses the system window colour.
+    COLORREF GetBkColor() const { return static_cast<COLORREF>(SendMessage(TVM_GETBKCOLOR)); }
+    COLORREF SetBkColor(COLORREF colour) {
+        return static_cast<COLORREF>(SendMessage(TVM_SETBKCOLOR, 0, static_cast<LPARAM>(colour)));
+    }
+    // The colour the control paints its background with: its own, or the window colour.
+    COLORREF GetEffectiveBkColor() const;
 
     HTREEITEM GetNextItem(HTREEITEM item, UINT code) const {
         return reinterpret_cast<HTREEITEM>(
@@ -70,6 +84,11 @@ public:
     HIMAGELIST SetImageList(HIMAGELIST list, int type) {
         return reinterpret_cast<HIMAGELIST>(
             SendMessage(TVM_SETIMAGELIST, static_cast<WPARAM>(type), reinterpret_cast<LPARAM>(list)));
+    }
+    // Queues the image list for the control instead of sending it: usable while the control is still
+    // being set up (PreSubclassWindow) or from another thread.
+    bool PostImageList(HIMAGELIST list, int type) {
+        return PostMessage(TVM_SETIMAGELIST, static_cast<WPARAM>(type), reinterpret_cast<LPARAM>(list));
     }
     HIMAGELIST GetImageList(int type) const {
         return reinterpret_cast<HIMAGELIST>(SendMessage(TVM_GETIMAGELIST, static_cast<WPARAM>(type)));

@@ -347,6 +347,7 @@ bool CWnd::SubclassWindow(HWND hwnd) {
     m_pfnSuper = reinterpret_cast<WNDPROC>(::GetWindowLongPtrA(hwnd, GWLP_WNDPROC));
     Bind(hwnd);
     ::SetWindowLongPtrA(hwnd, GWLP_WNDPROC, reinterpret_cast<LONG_PTR>(AfxWndProc));
+    PreSubclassWindow();
     return true;
 }
 

@@ -122,6 +122,9 @@ public:
     // Binds an existing window (a control of a system class, a dialog control) and routes its messages
     // through WindowProc; Default() then calls the window's original procedure.
     bool SubclassWindow(HWND hwnd);
+    // Called by SubclassWindow (and so for every control CreateEx makes of a system class) once the
+    // window is bound, before the caller sees it: a wrapper's hook for its control's set-up.
+    virtual void PreSubclassWindow() {}
     bool SubclassDlgItem(UINT id, CWnd* parent);
     HWND UnsubclassWindow();
     // Non-owning use of a foreign window: no binding, no subclassing, never destroyed by this object.

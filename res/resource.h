@@ -6,7 +6,8 @@
 #define IDD_ABOUTBOX 100
 #define IDR_MAINFRAME 128 // menu, accelerators, main toolbar, icon, title string
 #define IDD_SETLA 136
-#define IDC_DRAG_CURSOR 131
+#define IDC_HOURGLASS 131   // animated cursor of the waiting tree
+#define IDC_DRAG_CURSOR 132
 #define IDD_DIALOG_RUN 200
 #define IDR_TOOLBAR2 204  // bottom toolbar: accept and cancel
 #define IDR_THUMB_MENU 208 // context menu of a thumbnail

@@ -5,6 +5,8 @@
 
 #include <gtest/gtest.h>
 
+#include <cstring>
+
 #include <set>
 #include <string>
 #include <tuple>
@@ -104,6 +106,32 @@ TEST(Resources, ToolbarBitmapsHoldOneImagePerButton) {
 TEST(Resources, IconAndDragCursor) {
     EXPECT_NE(::LoadIconA(AfxGetResourceHandle(), MAKEINTRESOURCEA(IDR_MAINFRAME)), nullptr);
     EXPECT_NE(::LoadCursorA(AfxGetResourceHandle(), MAKEINTRESOURCEA(IDC_DRAG_CURSOR)), nullptr);
+}
+
+TEST(Resources, HourglassIsAnAnimatedCursorOfTenFrames) {
+    HRSRC found = ::FindResourceA(AfxGetResourceHandle(), MAKEINTRESOURCEA(IDC_HOURGLASS), RT_ANICURSOR);
+    ASSERT_NE(found, nullptr);
+    const auto* data =
+        static_cast<const unsigned char*>(::LockResource(::LoadResource(AfxGetResourceHandle(), found)));
+    ASSERT_NE(data, nullptr);
+    ASSERT_EQ(std::memcmp(data, "RIFF", 4), 0);
+    ASSERT_EQ(std::memcmp(data + 8, "ACONanih", 8), 0);
+    DWORD frames = 0;
+    std::memcpy(&frames, data + 20 + 4, sizeof frames); // the header's size, then the frame count
+    EXPECT_GE(frames, 10u);
+
+    HCURSOR hourglass = ::LoadCursorW(AfxGetResourceHandle(), MAKEINTRESOURCEW(IDC_HOURGLASS));
+    ASSERT_NE(hourglass, nullptr);
+    HDC screen = ::GetDC(nullptr);
+    HDC memory = ::CreateCompatibleDC(screen);
+    HBITMAP bitmap = ::CreateCompatibleBitmap(screen, 16, 16);
+    HGDIOBJ old = ::SelectObject(memory, bitmap);
+    for (UINT step = 0; step < 10; ++step)
+        EXPECT_TRUE(::DrawIconEx(memory, 0, 0, hourglass, 16, 16, step, nullptr, DI_NORMAL)) << step;
+    ::SelectObject(memory, old);
+    ::DeleteObject(bitmap);
+    ::DeleteDC(memory);
+    ::ReleaseDC(nullptr, screen);
 }
 
 TEST(Resources, ThumbnailContextMenu) {
