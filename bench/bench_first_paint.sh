@@ -12,6 +12,7 @@
 # cancelled by devhost's --after-ms timer long after the paint.
 set -euo pipefail
 source "$(dirname "${BASH_SOURCE[0]}")/explorer-lib.sh"
+need_builds
 
 counts=("$@")
 [ ${#counts[@]} -gt 0 ] || counts=(10000 100000)

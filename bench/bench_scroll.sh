@@ -13,6 +13,7 @@
 # many pictures a step draws. A step should cost the same whatever the folder's size.
 set -euo pipefail
 source "$(dirname "${BASH_SOURCE[0]}")/explorer-lib.sh"
+need_builds
 
 counts=("$@")
 [ ${#counts[@]} -gt 0 ] || counts=(10000 100000)
