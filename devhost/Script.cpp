@@ -148,7 +148,17 @@ const CommandName kCommands[] = {
     {L"typed", ScriptCommand::Kind::Typed, false, false},
     {L"double-click-time", ScriptCommand::Kind::DoubleClickTime, false, false},
     {L"echo", ScriptCommand::Kind::Echo, false, false},
+    {L"tree-select", ScriptCommand::Kind::TreeSelect, true, true},
+    {L"tree-expand", ScriptCommand::Kind::TreeExpand, true, true},
+    {L"tree-collapse", ScriptCommand::Kind::TreeCollapse, true, true},
+    {L"tree-right-click", ScriptCommand::Kind::TreeRightClick, true, true},
+    {L"tree-items", ScriptCommand::Kind::TreeItems, true, true},
 };
+
+bool TakesTreePath(ScriptCommand::Kind kind) {
+    return kind == ScriptCommand::Kind::TreeSelect || kind == ScriptCommand::Kind::TreeExpand ||
+           kind == ScriptCommand::Kind::TreeCollapse || kind == ScriptCommand::Kind::TreeRightClick;
+}
 
 bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, std::wstring& error) {
     const CommandName* name = nullptr;
@@ -229,6 +239,14 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
             command.hasPoint = true;
             continue;
         }
+        if (key == L"path" && TakesTreePath(command.kind)) {
+            if (value.empty()) {
+                error = L"path= takes a tree item's labels joined by backslashes: " + token;
+                return false;
+            }
+            command.treePath = value;
+            continue;
+        }
         if (key == L"with" && name->window) {
             if (!ParseModifiers(value, command.modifiers)) {
                 error = L"with= takes ctrl, shift and alt joined by +: " + token;
@@ -280,6 +298,19 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
             return false;
         }
         command.file = positional[0];
+        return true;
+    case ScriptCommand::Kind::TreeSelect:
+    case ScriptCommand::Kind::TreeExpand:
+    case ScriptCommand::Kind::TreeCollapse:
+    case ScriptCommand::Kind::TreeRightClick:
+        if (!positional.empty()) {
+            error = L"unexpected " + positional[0];
+            return false;
+        }
+        if (command.treePath.empty()) {
+            error = tokens[0] + L" needs path=\"LABEL\\LABEL...\"";
+            return false;
+        }
         return true;
     case ScriptCommand::Kind::Echo:
         for (std::size_t i = 0; i < positional.size(); ++i)

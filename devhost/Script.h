@@ -51,7 +51,12 @@ struct ScriptCommand {
         Returned,
         Typed,
         DoubleClickTime,
-        Echo
+        Echo,
+        TreeSelect,
+        TreeExpand,
+        TreeCollapse,
+        TreeRightClick,
+        TreeItems
     };
     int line = 0;
     Kind kind = Kind::Echo;
@@ -65,6 +70,7 @@ struct ScriptCommand {
     std::wstring text;          // type, echo
     std::wstring file;          // screenshot
     int ms = 0;                 // sleep
+    std::wstring treePath;      // path=: a tree item's label path, labels joined by backslashes
 };
 
 // Reads a whole script. False with "line N: message" in `error` at the first bad line.

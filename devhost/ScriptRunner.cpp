@@ -7,6 +7,7 @@
 #include "devhost/Text.h"
 #include "thumbs/AppMessages.h"
 
+#include <commctrl.h>
 #include <wincodec.h>
 
 #include <algorithm>
@@ -408,6 +409,153 @@ void Fact(const std::wstring& text) {
     WriteLine(L"[script] " + text);
 }
 
+// ---- tree controls, read through their window (same process: item structures may be sent) ----
+
+LRESULT TreeSend(HWND tree, UINT message, WPARAM wParam, LPARAM lParam) {
+    DWORD_PTR result = 0;
+    if (!SendMessageTimeoutW(tree, message, wParam, lParam, SMTO_ABORTIFHUNG, 5000, &result))
+        throw ScriptError{L"the tree window does not answer"};
+    return static_cast<LRESULT>(result);
+}
+
+HTREEITEM TreeNext(HWND tree, HTREEITEM item, UINT code) {
+    return reinterpret_cast<HTREEITEM>(TreeSend(tree, TVM_GETNEXTITEM, code, reinterpret_cast<LPARAM>(item)));
+}
+
+std::wstring TreeLabel(HWND tree, HTREEITEM item) {
+    wchar_t text[520] = {};
+    TVITEMW query{};
+    query.mask = TVIF_TEXT | TVIF_HANDLE;
+    query.hItem = item;
+    query.pszText = text;
+    query.cchTextMax = 520;
+    if (!TreeSend(tree, TVM_GETITEMW, 0, reinterpret_cast<LPARAM>(&query)))
+        return std::wstring();
+    // A control may answer with its own buffer instead of ours.
+    return query.pszText ? std::wstring(query.pszText) : std::wstring();
+}
+
+bool TreeExpanded(HWND tree, HTREEITEM item) {
+    return (TreeSend(tree, TVM_GETITEMSTATE, reinterpret_cast<WPARAM>(item), TVIS_EXPANDED) &
+            TVIS_EXPANDED) != 0;
+}
+
+// The item a label path names: the first label among the top-level items, each next one among the
+// children of the item before; labels compare without regard to case, as the folder tree's own walk.
+HTREEITEM FindTreeItem(HWND tree, const std::wstring& path) {
+    HTREEITEM item = nullptr;
+    std::size_t start = 0;
+    while (start <= path.size()) {
+        const std::size_t slash = path.find(L'\\', start);
+        const std::wstring label = path.substr(start, slash == std::wstring::npos ? slash : slash - start);
+        HTREEITEM candidate = item ? TreeNext(tree, item, TVGN_CHILD) : TreeNext(tree, nullptr, TVGN_ROOT);
+        while (candidate && CompareStringOrdinal(TreeLabel(tree, candidate).c_str(), -1, label.c_str(), -1,
+                                                 TRUE) != CSTR_EQUAL)
+            candidate = TreeNext(tree, candidate, TVGN_NEXT);
+        if (!candidate)
+            throw ScriptError{L"no tree item " +
+                              path.substr(0, slash == std::wstring::npos ? path.size() : slash)};
+        item = candidate;
+        if (slash == std::wstring::npos)
+            break;
+        start = slash + 1;
+    }
+    return item;
+}
+
+// The item's label rectangle in client coordinates, scrolled into view when its parents are open
+// (as a person would scroll to it); an item hidden in a closed parent is an error.
+RECT TreeLabelRect(HWND tree, HTREEITEM item, const std::wstring& path) {
+    for (HTREEITEM parent = TreeNext(tree, item, TVGN_PARENT); parent;
+         parent = TreeNext(tree, parent, TVGN_PARENT))
+        if (!TreeExpanded(tree, parent))
+            throw ScriptError{L"tree item " + path + L" is inside a closed item"};
+    TreeSend(tree, TVM_ENSUREVISIBLE, 0, reinterpret_cast<LPARAM>(item));
+    RECT rect{};
+    std::memcpy(&rect, &item, sizeof item); // TVM_GETITEMRECT takes the item in the rectangle
+    if (!TreeSend(tree, TVM_GETITEMRECT, TRUE, reinterpret_cast<LPARAM>(&rect)))
+        throw ScriptError{L"tree item " + path + L" is not shown"};
+    return rect;
+}
+
+// The client point of the item's expand button: the row's points left of the label, asked of the
+// control one by one.
+POINT TreeButtonPoint(HWND tree, HTREEITEM item, const RECT& label, const std::wstring& path) {
+    const int y = (label.top + label.bottom) / 2;
+    for (int x = label.left - 1; x >= 0; --x) {
+        TVHITTESTINFO hit{};
+        hit.pt = {x, y};
+        TreeSend(tree, TVM_HITTEST, 0, reinterpret_cast<LPARAM>(&hit));
+        if (hit.hItem == item && (hit.flags & TVHT_ONITEMBUTTON))
+            return hit.pt;
+    }
+    throw ScriptError{L"tree item " + path + L" has no expand button"};
+}
+
+void ClickTreePoint(HWND tree, POINT client, bool right) {
+    ClientToScreen(tree, &client);
+    MovePointer(client);
+    Sleep(30);
+    std::vector<INPUT> inputs;
+    AddMouse(inputs, right ? MOUSEEVENTF_RIGHTDOWN : MOUSEEVENTF_LEFTDOWN);
+    AddMouse(inputs, right ? MOUSEEVENTF_RIGHTUP : MOUSEEVENTF_LEFTUP);
+    Send(inputs);
+}
+
+template <class Condition> void WaitTree(const ScriptCommand& command, const wchar_t* what, Condition done) {
+    const ULONGLONG deadline = GetTickCount64() + static_cast<ULONGLONG>(command.timeoutMs);
+    while (!done()) {
+        if (GetTickCount64() >= deadline)
+            throw ScriptError{L"tree item " + command.treePath + L" is not " + what + L" after " +
+                              std::to_wstring(command.timeoutMs) + L" ms"};
+        Sleep(kPollMs);
+    }
+}
+
+void DriveTree(HWND tree, const ScriptCommand& command) {
+    using Kind = ScriptCommand::Kind;
+    const HTREEITEM item = FindTreeItem(tree, command.treePath);
+    const bool expand = command.kind == Kind::TreeExpand;
+    if ((expand || command.kind == Kind::TreeCollapse) && TreeExpanded(tree, item) == expand)
+        return; // already as asked: a click on the button would undo it
+    const RECT label = TreeLabelRect(tree, item, command.treePath);
+    const POINT centre{(label.left + label.right) / 2, (label.top + label.bottom) / 2};
+    switch (command.kind) {
+    case Kind::TreeSelect:
+        ClickTreePoint(tree, centre, false);
+        WaitTree(command, L"selected", [&] { return TreeNext(tree, nullptr, TVGN_CARET) == item; });
+        break;
+    case Kind::TreeExpand:
+    case Kind::TreeCollapse:
+        ClickTreePoint(tree, TreeButtonPoint(tree, item, label, command.treePath), false);
+        WaitTree(command, expand ? L"expanded" : L"collapsed",
+                 [&] { return TreeExpanded(tree, item) == expand; });
+        break;
+    default:
+        ClickTreePoint(tree, centre, true);
+        break;
+    }
+}
+
+// Every item whose parents are open, from the top: "tree-item LEVEL LABEL [expanded] [selected]".
+void PrintTreeItems(HWND tree) {
+    const HTREEITEM selected = TreeNext(tree, nullptr, TVGN_CARET);
+    for (HTREEITEM item = TreeNext(tree, nullptr, TVGN_ROOT); item;
+         item = TreeNext(tree, item, TVGN_NEXTVISIBLE)) {
+        int level = 0;
+        for (HTREEITEM parent = TreeNext(tree, item, TVGN_PARENT); parent;
+             parent = TreeNext(tree, parent, TVGN_PARENT))
+            ++level;
+        std::wstring line =
+            L"tree-item " + std::to_wstring(level) + L" " + EscapeControls(TreeLabel(tree, item));
+        if (TreeExpanded(tree, item))
+            line += L" expanded";
+        if (item == selected)
+            line += L" selected";
+        Fact(line);
+    }
+}
+
 struct RunDialogSearch {
     HWND found = nullptr;
     bool foundEmpty = false;
@@ -579,6 +727,16 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
         break;
     case Kind::Echo:
         Fact(command.text);
+        break;
+    case Kind::TreeSelect:
+    case Kind::TreeExpand:
+    case Kind::TreeCollapse:
+    case Kind::TreeRightClick:
+        DriveTree(WaitForWindow(command), command);
+        Sleep(kSettleMs);
+        break;
+    case Kind::TreeItems:
+        PrintTreeItems(WaitForWindow(command));
         break;
     }
     return true;

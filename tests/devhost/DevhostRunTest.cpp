@@ -301,6 +301,65 @@ TEST(Devhost, ScriptDrivesADialogWithRealInput) {
     DeleteFileW(shot.c_str());
 }
 
+TEST(Devhost, ScriptDrivesATreeByItsLabels) {
+    const std::wstring script = TempFile(L"tree.txt");
+    WriteFileText(script, "wait class=#32770 text=\"Fake tree picker\" timeout=10000\n"
+                          "tree-items class=#32770 > id=1003\n"
+                          "tree-expand class=#32770 > id=1003 path=Desktop\n"
+                          "tree-expand class=#32770 > id=1003 path=\"desktop\\my computer\"\n"
+                          "tree-expand class=#32770 > id=1003 path=\"Desktop\\My Computer\\Drive Z\"\n"
+                          "tree-select class=#32770 > id=1003 path=\"Desktop\\My Computer\\Drive Z\\work\"\n"
+                          "tree-items class=#32770 > id=1003\n"
+                          "tree-collapse class=#32770 > id=1003 path=\"Desktop\\My Computer\\Drive Z\"\n"
+                          "tree-right-click class=#32770 > id=1003 path=\"Desktop\\My Computer\\Drive C\"\n"
+                          "sleep 300\n"
+                          "tree-items class=#32770 > id=1003\n"
+                          "click class=#32770 > id=1001\n"
+                          "gone class=#32770 text=\"Fake tree picker\" visible=any\n");
+    const RunResult run = RunDevhost({L"--script", script, L"--eval", L"(picker \"tree\")"});
+    EXPECT_EQ(run.exitCode, 0u) << run.errors << run.output;
+    // The dialog gives the tree the focus, which selects its first item.
+    EXPECT_EQ(run.lines, WithCalls({"[script] tree-item 0 Desktop selected",
+                                    "[script] tree-item 0 Recycle",
+                                    "[script] tree-item 0 Desktop expanded",
+                                    "[script] tree-item 1 My Computer expanded",
+                                    "[script] tree-item 2 Drive C",
+                                    "[script] tree-item 2 Drive Z expanded",
+                                    "[script] tree-item 3 work selected",
+                                    "[script] tree-item 3 old",
+                                    "[script] tree-item 1 Network",
+                                    "[script] tree-item 0 Recycle",
+                                    "fake: tree right-click Drive C",
+                                    "[script] tree-item 0 Desktop expanded",
+                                    "[script] tree-item 1 My Computer expanded",
+                                    "[script] tree-item 2 Drive C",
+                                    "[script] tree-item 2 Drive Z selected",
+                                    "[script] tree-item 1 Network",
+                                    "[script] tree-item 0 Recycle",
+                                    "=> (\"picker\" 7 \"Drive Z\")"}))
+        << run.output;
+    DeleteFileW(script.c_str());
+}
+
+TEST(Devhost, ScriptTreeItemThatIsNotThereFailsTheRun) {
+    const std::wstring script = TempFile(L"tree-missing.txt");
+    WriteFileText(script, "wait class=#32770 text=\"Fake tree picker\" timeout=10000\n"
+                          "tree-select class=#32770 > id=1003 path=\"Desktop\\Nowhere\\x\"\n"
+                          "echo never\n");
+    const RunResult closed = RunDevhost({L"--script", script, L"--eval", L"(picker \"tree\")"});
+    EXPECT_EQ(closed.exitCode, 4u) << closed.errors;
+    EXPECT_EQ(closed.lines, WithCalls({"[script] error: line 2: no tree item Desktop\\\\Nowhere",
+                                       "=> (\"picker\" 2 \"\")"}));
+    WriteFileText(script, "wait class=#32770 text=\"Fake tree picker\" timeout=10000\n"
+                          "tree-select class=#32770 > id=1003 path=\"Desktop\\My Computer\"\n");
+    const RunResult hidden = RunDevhost({L"--script", script, L"--eval", L"(picker \"tree\")"});
+    EXPECT_EQ(hidden.exitCode, 4u) << hidden.errors;
+    EXPECT_EQ(hidden.lines,
+              WithCalls({"[script] error: line 2: tree item Desktop\\\\My Computer is inside a closed item",
+                         "=> (\"picker\" 2 \"\")"}));
+    DeleteFileW(script.c_str());
+}
+
 TEST(Devhost, AlertBoxWaitsForThePerson) {
     const std::wstring script = TempFile(L"alert.txt");
     WriteFileText(script, "wait class=#32770 text=devhost timeout=10000\n"

@@ -116,6 +116,32 @@ TEST(Script, Errors) {
     EXPECT_EQ(Error(L"wait id=1 visible=no\n"), L"line 1: visible= takes yes or any: visible=no");
 }
 
+TEST(Script, TreeCommandsNameAnItemByItsLabelPath) {
+    const auto commands =
+        Read(L"tree-select class=#32770 > id=1003 path=\"Desktop\\My Computer\" timeout=90\n"
+             L"tree-expand id=7 path=Desktop\n"
+             L"tree-collapse id=7 path=a\\b\n"
+             L"tree-right-click id=7 path=a\n"
+             L"tree-items class=SysTreeView32\n");
+    ASSERT_EQ(commands.size(), 5u);
+    EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::TreeSelect);
+    EXPECT_EQ(commands[0].treePath, L"Desktop\\My Computer");
+    EXPECT_EQ(commands[0].timeoutMs, 90);
+    ASSERT_EQ(commands[0].window.size(), 2u);
+    EXPECT_EQ(commands[1].kind, ScriptCommand::Kind::TreeExpand);
+    EXPECT_EQ(commands[2].kind, ScriptCommand::Kind::TreeCollapse);
+    EXPECT_EQ(commands[2].treePath, L"a\\b");
+    EXPECT_EQ(commands[3].kind, ScriptCommand::Kind::TreeRightClick);
+    EXPECT_EQ(commands[4].kind, ScriptCommand::Kind::TreeItems);
+    EXPECT_EQ(commands[4].treePath, L"");
+    EXPECT_EQ(Error(L"tree-select id=7\n"), L"line 1: tree-select needs path=\"LABEL\\\\LABEL...\"");
+    EXPECT_EQ(Error(L"tree-items id=7 path=a\n"), L"line 1: unexpected path=a");
+    EXPECT_EQ(Error(L"tree-expand path=a\n"),
+              L"line 1: tree-expand needs a window, such as class=NAME or id=N");
+    EXPECT_EQ(Error(L"tree-expand id=7 path=\n"),
+              L"line 1: path= takes a tree item's labels joined by backslashes: path=");
+}
+
 TEST(Script, KeyNames) {
     EXPECT_EQ(devhost::VirtualKeyOf(L"A"), 'A');
     EXPECT_EQ(devhost::VirtualKeyOf(L"z"), 'Z');

@@ -5,6 +5,7 @@
 #include "thumbs/AppMessages.h"
 
 #include <windows.h>
+#include <commctrl.h>
 
 #include <cstdint>
 #include <new>
@@ -204,10 +205,79 @@ INT_PTR CALLBACK PickerProc(HWND dialog, UINT message, WPARAM wParam, LPARAM) {
     }
 }
 
+// The tree picker's items: label and level, in order. All are there from the start, collapsed.
+struct TreeEntry {
+    const wchar_t* label;
+    int level;
+};
+const TreeEntry kTreeEntries[] = {
+    {L"Desktop", 0}, {L"My Computer", 1}, {L"Drive C", 2}, {L"Drive Z", 2}, {L"work", 3},
+    {L"plans", 4},   {L"old", 3},         {L"Network", 1}, {L"Recycle", 0},
+};
+
+void FillTree(HWND tree) {
+    HTREEITEM parents[8] = {TVI_ROOT};
+    for (const TreeEntry& entry : kTreeEntries) {
+        TVINSERTSTRUCTW insert{};
+        insert.hParent = parents[entry.level];
+        insert.hInsertAfter = TVI_LAST;
+        insert.item.mask = TVIF_TEXT;
+        insert.item.pszText = const_cast<wchar_t*>(entry.label);
+        parents[entry.level + 1] = reinterpret_cast<HTREEITEM>(
+            SendMessageW(tree, TVM_INSERTITEMW, 0, reinterpret_cast<LPARAM>(&insert)));
+    }
+}
+
+std::wstring TreeItemText(HWND tree, HTREEITEM item) {
+    wchar_t text[128] = {};
+    TVITEMW query{};
+    query.mask = TVIF_TEXT | TVIF_HANDLE;
+    query.hItem = item;
+    query.pszText = text;
+    query.cchTextMax = 128;
+    if (!item || !SendMessageW(tree, TVM_GETITEMW, 0, reinterpret_cast<LPARAM>(&query)))
+        return L"(none)";
+    return text;
+}
+
+// Tells on the command line which item a right click hit and which item a pick took.
+INT_PTR CALLBACK TreePickerProc(HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) {
+    if (message == WM_INITDIALOG) {
+        FillTree(GetDlgItem(dialog, 1003));
+        return TRUE;
+    }
+    if (message == WM_NOTIFY && reinterpret_cast<NMHDR*>(lParam)->idFrom == 1003 &&
+        reinterpret_cast<NMHDR*>(lParam)->code == NM_RCLICK) {
+        HWND tree = GetDlgItem(dialog, 1003);
+        TVHITTESTINFO hit{};
+        GetCursorPos(&hit.pt);
+        ScreenToClient(tree, &hit.pt);
+        SendMessageW(tree, TVM_HITTEST, 0, reinterpret_cast<LPARAM>(&hit));
+        Host().acutPrintf(L"fake: tree right-click %ls\n", TreeItemText(tree, hit.hItem).c_str());
+        SetWindowLongPtrW(dialog, DWLP_MSGRESULT, 1);
+        return TRUE;
+    }
+    if (message == WM_COMMAND && LOWORD(wParam) == 1001) {
+        HWND tree = GetDlgItem(dialog, 1003);
+        const std::wstring picked = TreeItemText(
+            tree, reinterpret_cast<HTREEITEM>(SendMessageW(tree, TVM_GETNEXTITEM, TVGN_CARET, 0)));
+        lstrcpynW(g_pickedText, picked.c_str(), 256);
+        EndDialog(dialog, 7);
+        return TRUE;
+    }
+    return PickerProc(dialog, message, wParam, lParam);
+}
+
+// (picker) shows the picker with an edit, (picker "tree") the one with a tree.
 void Picker() {
     g_pickedText[0] = 0;
-    const INT_PTR result = DialogBoxParamW(reinterpret_cast<HINSTANCE>(&__ImageBase), MAKEINTRESOURCEW(100),
-                                           Host().acedGetAcadFrame(), &PickerProc, 0);
+    resbuf* args = Host().acedGetArgs();
+    const bool tree = args && args->restype == RTSTR && std::wstring(args->resval.rstring) == L"tree";
+    if (args)
+        Host().acutRelRb(args);
+    const INT_PTR result =
+        DialogBoxParamW(reinterpret_cast<HINSTANCE>(&__ImageBase), MAKEINTRESOURCEW(tree ? 101 : 100),
+                        Host().acedGetAcadFrame(), tree ? &TreePickerProc : &PickerProc, 0);
     resbuf* list =
         Host().acutBuildList(RTSTR, L"picker", RTSHORT, static_cast<int>(result), RTSTR, g_pickedText, 0);
     Host().acedRetList(list);

@@ -1,0 +1,152 @@
+#include "ShellNamespace.h"
+
+#include "ShellString.h"
+
+#include <algorithm>
+
+std::string ShellDisplayName(IShellFolder* parentFolder, LPCITEMIDLIST relativeId, SHGDNF how) {
+    if (!parentFolder || !relativeId)
+        return {};
+    STRRET name{};
+    if (FAILED(parentFolder->GetDisplayNameOf(relativeId, how, &name)))
+        return {};
+    return CShellString(name, relativeId).Text();
+}
+
+bool ShellFileSystemPath(LPCITEMIDLIST absoluteId, std::string& path, std::size_t capacity) {
+    path.clear();
+    if (!absoluteId)
+        return false;
+    char buffer[MAX_PATH] = "";
+    if (!SHGetPathFromIDListA(absoluteId, buffer) || !buffer[0])
+        return false;
+    const std::string found(buffer);
+    if (found.size() + 1 > capacity)
+        return false;
+    path = found;
+    return true;
+}
+
+std::string ShellLabelOf(IShellFolder* parentFolder, LPCITEMIDLIST absoluteId, std::uint32_t flags) {
+    std::string label;
+    if ((flags & kShellFileSystemName) && ShellFileSystemPath(absoluteId, label) &&
+        !(flags & kShellNormalName)) {
+        // The rightmost n characters, n being the position of the last backslash: the tree has always
+        // cut its labels this way, which is not the same as taking the file name.
+        const std::size_t slash = label.find_last_of('\\');
+        const std::size_t n = slash == std::string::npos ? 0 : slash;
+        label = label.substr(label.size() - n);
+    }
+    if (label.empty())
+        label = ShellDisplayName(parentFolder, LastItemId(absoluteId),
+                                 (flags & kShellNormalName) ? SHGDN_NORMAL : SHGDN_INFOLDER);
+    return label;
+}
+
+bool ShellHasChildren(IShellFolder* parentFolder, LPCITEMIDLIST relativeId, std::uint32_t flags) {
+    if (!parentFolder || !relativeId)
+        return false;
+    SFGAOF attributes = SFGAO_FOLDER;
+    if (FAILED(parentFolder->GetAttributesOf(1, &relativeId, &attributes)) || !(attributes & SFGAO_FOLDER))
+        return false;
+    if ((flags & kShellNonFolders) || (attributes & SFGAO_REMOVABLE))
+        return true;
+    attributes = SFGAO_HASSUBFOLDER;
+    if (FAILED(parentFolder->GetAttributesOf(1, &relativeId, &attributes)))
+        return false;
+    return (attributes & SFGAO_HASSUBFOLDER) != 0;
+}
+
+IShellFolder* BindShellFolder(IShellFolder* desktop, LPCITEMIDLIST absoluteId) {
+    if (!desktop || !absoluteId)
+        return nullptr;
+    if (ItemIdListSize(absoluteId) == 0) {
+        desktop->AddRef();
+        return desktop;
+    }
+    IShellFolder* folder = nullptr;
+    if (FAILED(
+            desktop->BindToObject(absoluteId, nullptr, IID_IShellFolder, reinterpret_cast<void**>(&folder))))
+        return nullptr;
+    return folder;
+}
+
+int CompareShellIds(IShellFolder* folder, LPCITEMIDLIST a, LPCITEMIDLIST b) {
+    const HRESULT result = folder->CompareIDs(0, a, b);
+    if (FAILED(result))
+        return 0;
+    const short code = static_cast<short>(HRESULT_CODE(result));
+    return code < 0 ? -1 : code > 0 ? 1 : 0;
+}
+
+std::vector<CShellPidl> EnumerateShellChildren(IShellFolder* folder, HWND owner, std::uint32_t flags) {
+    std::vector<CShellPidl> children;
+    if (!folder)
+        return children;
+    const SHCONTF what = SHCONTF_FOLDERS | ((flags & kShellNonFolders) ? SHCONTF_NONFOLDERS : 0) |
+                         ((flags & kShellHidden) ? SHCONTF_INCLUDEHIDDEN : 0);
+    IEnumIDList* enumerator = nullptr;
+    // S_FALSE with no enumerator is a folder that has nothing to show.
+    if (FAILED(folder->EnumObjects(owner, what, &enumerator)) || !enumerator)
+        return children;
+    LPITEMIDLIST child = nullptr;
+    while (enumerator->Next(1, &child, nullptr) == S_OK) {
+        children.emplace_back(child);
+        child = nullptr;
+    }
+    enumerator->Release();
+    std::stable_sort(children.begin(), children.end(), [folder](const CShellPidl& a, const CShellPidl& b) {
+        return CompareShellIds(folder, a.get(), b.get()) < 0;
+    });
+    return children;
+}
+
+ShellPathWalk WalkShellLabelPath(const std::string& labelPath) {
+    ShellPathWalk walk;
+    CDesktopFolderRef desktop;
+    if (!desktop)
+        return walk;
+    CShellPidl desktopId;
+    if (FAILED(SHGetSpecialFolderLocation(nullptr, CSIDL_DESKTOP, desktopId.Receive())) || !desktopId)
+        return walk;
+
+    std::size_t position = 0;
+    for (;;) {
+        const std::size_t slash = labelPath.find('\\', position);
+        const std::string component =
+            labelPath.substr(position, slash == std::string::npos ? std::string::npos : slash - position);
+        position = slash == std::string::npos ? labelPath.size() : slash + 1;
+        if (component.empty()) {
+            walk.complete = true;
+            return walk;
+        }
+        // The candidates: the Desktop at the top, else the children of the node reached last.
+        IShellFolder* parent = nullptr;
+        CShellPidl parentId;
+        std::vector<CShellPidl> relativeIds;
+        if (walk.steps.empty()) {
+            parent = desktop.get();
+            parent->AddRef();
+            relativeIds.push_back(CShellPidl::CopyOf(desktopId.get()));
+        } else {
+            parentId = CShellPidl::CopyOf(walk.steps.back().absoluteId.get());
+            parent = BindShellFolder(desktop.get(), parentId.get());
+            relativeIds = EnumerateShellChildren(parent, nullptr, 0);
+        }
+        bool found = false;
+        for (const CShellPidl& relative : relativeIds) {
+            CShellPidl absolute = walk.steps.empty() ? CShellPidl::CopyOf(relative.get())
+                                                     : CShellPidl::Concat(parentId.get(), relative.get());
+            std::string label = ShellLabelOf(parent, absolute.get(), 0);
+            if (lstrcmpiA(label.c_str(), component.c_str()) == 0) {
+                walk.steps.push_back({std::move(absolute), std::move(label)});
+                found = true;
+                break;
+            }
+        }
+        if (parent)
+            parent->Release();
+        if (!found)
+            return walk;
+    }
+}
