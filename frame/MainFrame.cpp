@@ -1,11 +1,11 @@
 #include "frame/MainFrame.h"
 
 #include "frame/AboutDlgArx.h"
-#include "frame/LeftPaneView.h"
 #include "settings/IniFile.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
 #include "thumbs/Tessel3View.h"
+#include "tree/LeftView.h"
 
 #include "res/resource.h"
 
@@ -184,8 +184,43 @@ bool CMainFrame::CreatePickToolBar() {
 }
 
 CView* CMainFrame::MakeFolderPane() {
-    m_pFolderPane = new CLeftPaneView;
+    m_pFolderPane = new CLeftView;
+    m_pFolderPane->SetStartShellPath(m_call.startShellPath);
     return m_pFolderPane;
+}
+
+CChildView* CMainFrame::GetFolderTree() const {
+    return m_pFolderPane ? m_pFolderPane->GetTree() : nullptr;
+}
+
+void CMainFrame::WireFolderTree() {
+    CChildView* tree = GetFolderTree();
+    if (!tree)
+        return;
+    tree->onEnablePick = [this](bool enable) { EnablePick(enable); };
+    tree->onFolderShown = [this](const std::string& folderPath, const std::string& label) {
+        if (m_pGridView && m_pGridView->m_hWnd)
+            m_pGridView->Rebuild();
+        // A folder without a file-system path shows its name; the grid is empty.
+        if (folderPath.empty())
+            SetTitleText(label);
+    };
+    tree->onStatusText = [this](const std::string& text) {
+        if (m_hWnd && !text.empty())
+            SetMessageText(text);
+    };
+    tree->onFocusGrid = [this] {
+        if (m_pGridView && m_pGridView->m_hWnd)
+            m_pGridView->SetFocus();
+    };
+    if (m_pGridView)
+        m_pGridView->onRefreshFolder = [this] {
+            if (CChildView* folders = GetFolderTree(); folders && folders->GetSelectedItem()) {
+                folders->RefreshCurrentFolder();
+                return true;
+            }
+            return false;
+        };
 }
 
 CView* CMainFrame::MakeGridView() {
@@ -200,8 +235,10 @@ CView* CMainFrame::MakeGridView() {
     };
     grid->onTellUser = [this](const std::string& text) { TellUser(text); };
     grid->onFocusFolderTree = [this] {
-        if (m_pFolderPane)
-            m_pFolderPane->FocusFolderTree();
+        if (CChildView* tree = GetFolderTree())
+            tree->SetFocus();
+        else if (m_pFolderPane && m_pFolderPane->m_hWnd)
+            m_pFolderPane->SetFocus();
     };
     m_pGridView = grid;
     return grid;
@@ -229,6 +266,7 @@ bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {
         m_pGridView = nullptr;
         return false;
     }
+    WireFolderTree();
     return true;
 }
 

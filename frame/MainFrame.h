@@ -19,7 +19,8 @@
 #include <functional>
 #include <string>
 
-class CLeftPaneView;
+class CChildView;
+class CLeftView;
 class CTessel3Doc;
 class CTessel3View;
 
@@ -56,6 +57,8 @@ public:
 
     // The grid view, nullptr before the frame has made it and once the frame is destroyed.
     CTessel3View* GetGridView() const { return m_pGridView; }
+    // The folder tree, nullptr when the left pane has none.
+    CChildView* GetFolderTree() const;
     CEditSearch& GetSearchEdit() { return m_wndSearch; }
 
     // The frame's parts, for the hosting code and its tests.
@@ -89,6 +92,7 @@ private:
     bool CreateCaptionLabel(CToolBar& bar, UINT button, const char* caption, CStatic& label);
     CView* MakeGridView();
     CView* MakeFolderPane();
+    void WireFolderTree();
     bool ForwardToGrid(UINT id);
     void SetSortMode(int mode);
     void ShowHelp();
@@ -108,7 +112,7 @@ private:
     ExplorerCall m_call;
     CTessel3Doc* m_pDoc = nullptr;          // of the creation context; outlives the frame
     CTessel3View* m_pGridView = nullptr;    // the right pane
-    CLeftPaneView* m_pFolderPane = nullptr; // the left pane
+    CLeftView* m_pFolderPane = nullptr;     // the left pane
 };
 
 // Id of the bottom toolbar's window (the top one has the standard toolbar id).

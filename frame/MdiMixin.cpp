@@ -5,6 +5,7 @@
 #include "settings/Tessel3Doc.h"
 #include "thumbs/DwgList.h"
 #include "thumbs/Tessel3View.h"
+#include "tree/LeftView.h"
 
 #include "res/resource.h"
 
@@ -143,8 +144,17 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // 5. The posted accept and cancel messages go to the dialog.
     m_pMainWnd = dialog;
     frame->InitialUpdateFrame(doc, false);
-    // The grid shows the start folder.
-    const std::string scanProblem = ShowStartFolder(*frame, *doc, call.startPath);
+    // The folder tree has opened along the start folder's (or the saved) label path; without a tree the
+    // grid shows the start folder by its path.
+    // When the walk did not get there (a folder renamed, a drive named otherwise since) the grid still
+    // shows the folder by its path, and the keyboard starts in the grid: the tree would select its top
+    // node as soon as it got the focus.
+    CChildView* tree = frame->GetFolderTree();
+    const bool treeOpened = tree && tree->m_hPathTarget;
+    const std::string scanProblem = treeOpened ? std::string() : ShowStartFolder(*frame, *doc, call.startPath);
+    if (!treeOpened)
+        if (CTessel3View* grid = frame->GetGridView())
+            frame->SetActiveView(grid, false);
 
     // 6. Placement from the dialog's rectangle and the stored size, on a monitor of this desktop.
     const CRect rcDialog = dialog->GetWindowRect();
@@ -158,7 +168,18 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
         frame->ShowWindow(SW_SHOWNORMAL);
     }
 
-    // 7. Nothing is chosen yet.
+    // 7. The node the tree's walk reached is selected: the selection scans it and the grid shows it.
+    if (treeOpened) {
+        if (HTREEITEM target = tree->m_hPathTarget) {
+            tree->SelectSetFirstVisible(target);
+            tree->SelectDropTarget(target);
+            tree->SelectItem(target);
+            tree->EnsureVisible(target); // sideways too: a deep folder in a narrow pane
+            tree->SetFocus();
+        }
+    }
+
+    // Nothing is chosen yet.
     frame->UpdateWindow();
     frame->EnablePick(false);
 

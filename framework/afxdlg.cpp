@@ -69,7 +69,7 @@ INT_PTR CDialog::DoModal() {
     if (ownerWasEnabled)
         ::EnableWindow(owner, FALSE);
     if (m_bModalRunning && m_hWnd)
-        ::ShowWindow(m_hWnd, SW_SHOWNORMAL);
+        ::ShowWindow(m_hWnd, m_nShowCommand);
 
     bool idle = true;
     long idleCount = 0;

@@ -8,8 +8,9 @@ public:
     CDocument* GetDocument() const { return m_pDocument; }
     CFrameWnd* GetParentFrame() const { return AfxGetParentFrame(this); }
 
-    // Creates the view as a pane (id AFX_IDW_PANE_FIRST...) of a frame or splitter.
-    bool Create(const char* className, const char* windowName, DWORD style, const RECT& rect, CWnd* parent,
+    // Creates the view as a pane (id AFX_IDW_PANE_FIRST...) of a frame or splitter. A view with
+    // windows of its own overrides it; the pane stands when this returns true.
+    virtual bool Create(const char* className, const char* windowName, DWORD style, const RECT& rect, CWnd* parent,
                 UINT id, CCreateContext* context = nullptr);
     using CWnd::Create;
 

@@ -350,6 +350,9 @@ protected:
 
     UINT m_nIDTemplate;
     CWnd* m_pParentWnd;
+    // How DoModal shows the dialog once it is initialised: a dialog that only carries a loop for another
+    // window shows itself without taking the activation (and the keyboard) from that window.
+    int m_nShowCommand = SW_SHOWNORMAL;
 
 private:
     friend INT_PTR CALLBACK AfxDlgProc(HWND, UINT, WPARAM, LPARAM);

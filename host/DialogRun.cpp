@@ -56,7 +56,8 @@ bool CDialogRun::OnInitDialog() {
     ::MoveWindow(m_hWnd, 0, 0, 0, 0, TRUE);
     // A fixed double-click time for the thumbnails' clicks; the run puts the user's own back at its end.
     ::SetDoubleClickTime(300);
-    return true;
+    // The explorer has placed the keyboard focus (in its tree or its grid): the dialog takes none.
+    return false;
 }
 
 bool CDialogRun::PreTranslateMessage(MSG* pMsg) {

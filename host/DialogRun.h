@@ -8,7 +8,8 @@
 
 class CDialogRun : public CDialog {
 public:
-    CDialogRun() : CDialog(IDD_DIALOG_RUN, nullptr) {}
+    // Shown without activation: the keyboard stays in the explorer the dialog has opened.
+    CDialogRun() : CDialog(IDD_DIALOG_RUN, nullptr) { m_nShowCommand = SW_SHOWNA; }
     // Stops being the application's main window: the next run must not take it for its owner.
     ~CDialogRun() override;
 

@@ -2,7 +2,7 @@
 #include "host/ArxApp.h"
 #include "host/DialogRun.h"
 #include "host/Orvex.h"
-#include "host/StartShellPathWin.h"
+#include "tree/StartShellPath.h"
 #include "hostapi/HostApi.h"
 #include "settings/Tessel3Doc.h"
 

@@ -375,6 +375,12 @@ bool exCDwgThumbnail::TranslateInput(MSG* pMsg) {
     case WM_LBUTTONDOWN:
         if (m_wndToolTip.m_hWnd)
             m_wndToolTip.RelayEvent(pMsg);
+        // A click in the grid takes the keyboard there (from the folder tree, the search edit).
+        if (HWND view = GetParentHwnd()) {
+            HWND focus = ::GetFocus();
+            if (focus != view && !::IsChild(view, focus))
+                ::SetFocus(view);
+        }
         if (pMsg->wParam == MK_LBUTTON) {
             SelectThis(true);
             RedrawWindow(nullptr, nullptr, kRedrawNow);

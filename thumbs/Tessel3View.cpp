@@ -217,6 +217,8 @@ void CTessel3View::PostRefresh() {
 }
 
 void CTessel3View::Refresh() {
+    if (onRefreshFolder && onRefreshFolder())
+        return;
     const CTessel3Doc* doc = Document();
     std::string folder = doc ? doc->m_strPath : std::string();
     if (folder.empty()) {

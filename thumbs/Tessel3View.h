@@ -35,6 +35,9 @@ public:
     std::function<void(const std::string&)> onStatusText; // the status bar's message (empty clears)
     std::function<void(const std::string&)> onTellUser;   // something the user must read
     std::function<void()> onFocusFolderTree;              // Tab leaves the grid for the folder tree
+    // Rescans the current folder through the folder tree and rebuilds; false when there is no tree to
+    // do it (the grid then rescans its folder by path itself).
+    std::function<bool()> onRefreshFolder;
 
     // The document of the creation context (the explorer's settings and current drawing), or nullptr.
     CTessel3Doc* Document() const;

@@ -12,7 +12,8 @@ failures=0
 checks=0
 
 WORK=$(mktemp -d "${TMPDIR:-/tmp}/orvex-e2e.XXXXXX")
-trap 'rm -rf "$WORK"' EXIT
+# E2E_SHOTS=DIR keeps the screenshots a test took (its *.png) in DIR, to look at them.
+trap 'if [ -n "${E2E_SHOTS:-}" ]; then mkdir -p "$E2E_SHOTS" && cp "$WORK"/*.png "$E2E_SHOTS"/ 2>/dev/null; fi; rm -rf "$WORK"' EXIT
 mkdir -p "$WORK/lib"
 cp "$ORVEX_ARX" "$WORK/lib/Orvex1.arx"
 ARX="$WORK/lib/Orvex1.arx"

@@ -10,6 +10,7 @@
 #include "tests/support/TempFolder.h"
 #include "thumbs/AppMessages.h"
 #include "thumbs/Tessel3View.h"
+#include "tree/StartShellPath.h"
 
 #include "res/resource.h"
 
@@ -54,6 +55,9 @@ public:
             beforeCreate();
         ExplorerCall call = g_call;
         call.hostFrame = acedGetAcadFrame();
+        // As the LISP function does: the tree opens along the start folder's label path.
+        if (!call.startPath.empty() && call.startShellPath.empty())
+            call.startShellPath = StartShellPathOf(call.startPath);
         created = g_app.CreateAndShow(this, call);
         ::MoveWindow(m_hWnd, 0, 0, 0, 0, TRUE);
         SetTimer(kWatchdog, 15000);

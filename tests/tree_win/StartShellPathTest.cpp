@@ -1,7 +1,7 @@
 // The label path the LISP call builds for its start folder must lead the tree to that folder: walked
 // the way the tree walks it, on drive C: (Wine's own disk) and drive Z: (the Unix root).
 #include "ShellTestSupport.h"
-#include "host/StartShellPathWin.h"
+#include "tree/StartShellPath.h"
 #include "tests/support/TempFolder.h"
 
 #include <windows.h>

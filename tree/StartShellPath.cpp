@@ -1,5 +1,5 @@
 // The start folder's label path, built from the shell's display names.
-#include "host/StartShellPathWin.h"
+#include "tree/StartShellPath.h"
 
 #include <windows.h>
 #include <shellapi.h>

@@ -1,0 +1,94 @@
+#include "tree/LeftView.h"
+
+#include "settings/Tessel3Doc.h"
+#include "thumbs/AppMessages.h"
+#include "tree/StartShellPath.h"
+
+#include "res/resource.h"
+
+namespace {
+
+constexpr UINT kTreeStyle = WS_CHILD | WS_VISIBLE | TVS_HASBUTTONS | TVS_HASLINES | TVS_LINESATROOT;
+constexpr UINT kAnimationPeriod = 125; // milliseconds
+
+// Parses a folder path into an item id list the way the shell would and frees it again: asks the shell
+// about the folder once before the tree walks to it (a network folder wakes up here). Failures do not
+// matter.
+void TouchFolder(IShellFolder* desktop, const std::string& path) {
+    if (!desktop || path.empty())
+        return;
+    const int n = ::MultiByteToWideChar(CP_THREAD_ACP, 0, path.c_str(), -1, nullptr, 0);
+    if (n <= 0)
+        return;
+    std::wstring wide(static_cast<std::size_t>(n), L'\0');
+    ::MultiByteToWideChar(CP_THREAD_ACP, 0, path.c_str(), -1, wide.data(), n);
+    CShellPidl parsed;
+    ULONG eaten = 0;
+    desktop->ParseDisplayName(nullptr, nullptr, wide.data(), &eaten, parsed.Receive(), nullptr);
+}
+
+} // namespace
+
+CChildView::CChildView() {
+    SetLoadingIcon(nullptr, true);
+    SetAnimationPeriod(kAnimationPeriod);
+    m_hHourglassCursor = static_cast<HCURSOR>(::LoadCursorW(AfxGetInstanceHandle(), MAKEINTRESOURCEW(IDC_HOURGLASS)));
+    SetHourglass(m_hHourglassCursor);
+}
+
+CChildView::~CChildView() {
+    if (m_hHourglassCursor)
+        ::DestroyCursor(m_hHourglassCursor);
+}
+
+bool CChildView::PreTranslateMessage(MSG* pMsg) {
+    if (pMsg->message != WM_KEYDOWN || pMsg->hwnd != m_hWnd)
+        return false;
+    switch (pMsg->wParam) {
+    case VK_ESCAPE:
+        PostAppResult(kAppCancel);
+        return true;
+    case VK_TAB:
+        if (onFocusGrid)
+            onFocusGrid();
+        return true;
+    default:
+        return false;
+    }
+}
+
+bool CLeftView::Create(const char* className, const char* windowName, DWORD style, const RECT& rect,
+                       CWnd* parent, UINT id, CCreateContext* context) {
+    if (!CView::Create(className, windowName, style, rect, parent, id, context))
+        return false;
+    if (!m_wndTree.Create(kTreeStyle, CRect(), this, AFX_IDW_PANE_FIRST))
+        return true; // an empty pane: the explorer works on without its tree
+    auto* doc = dynamic_cast<CTessel3Doc*>(m_pDocument);
+    m_wndTree.SetDocument(doc);
+    {
+        CDesktopFolderRef desktop;
+        if (doc)
+            TouchFolder(desktop.get(), doc->m_strPath);
+    }
+    m_wndTree.PopulateTree(nullptr, 0);
+    if (!doc)
+        return true;
+    if (!m_strStartShellPath.empty())
+        doc->m_strShellPath = m_strStartShellPath;
+    else if (doc->m_strShellPath.empty() && !doc->m_strPath.empty())
+        doc->m_strShellPath = StartShellPathOf(doc->m_strPath + "\\"); // settings that only know the folder
+    m_wndTree.ExpandToLabelPath(doc->m_strShellPath);
+    return true;
+}
+
+void CLeftView::OnSize(UINT type, int cx, int cy) {
+    CView::OnSize(type, cx, cy);
+    if (m_wndTree.m_hWnd)
+        ::SetWindowPos(m_wndTree.m_hWnd, nullptr, 0, 0, cx, cy, SWP_NOZORDER | SWP_NOMOVE);
+}
+
+void CLeftView::OnSetFocus(HWND oldWnd) {
+    CView::OnSetFocus(oldWnd);
+    if (m_wndTree.m_hWnd)
+        m_wndTree.SetFocus();
+}

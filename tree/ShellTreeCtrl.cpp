@@ -1,0 +1,348 @@
+#include "tree/ShellTreeCtrl.h"
+
+#include "settings/Tessel3Doc.h"
+#include "thumbs/DwgList.h"
+#include "tree/ShellNamespace.h"
+
+#include <shellapi.h>
+
+#include <cstring>
+#include <memory>
+
+namespace {
+
+constexpr UINT kInsertMask = TVIF_TEXT | TVIF_IMAGE | TVIF_PARAM | TVIF_SELECTEDIMAGE | TVIF_CHILDREN;
+constexpr int kLabelChars = MAX_PATH;
+
+// The system small icon of an item (open: the opened-folder form).
+int SmallIconOf(LPCITEMIDLIST absoluteId, bool open) {
+    SHFILEINFOA info{};
+    const UINT how = SHGFI_PIDL | SHGFI_SYSICONINDEX | SHGFI_SMALLICON | (open ? SHGFI_OPENICON : 0);
+    if (!::SHGetFileInfoA(reinterpret_cast<LPCSTR>(absoluteId), 0, &info, sizeof info, how))
+        return 0;
+    return info.iIcon;
+}
+
+// Copies a label into the request's buffer, narrow or wide as the request asks.
+void CopyLabel(TVITEMA& item, const std::string& label, bool wideText) {
+    if (!item.pszText || item.cchTextMax <= 0)
+        return;
+    if (!wideText) {
+        ::lstrcpynA(item.pszText, label.c_str(), item.cchTextMax);
+        return;
+    }
+    auto* wide = reinterpret_cast<wchar_t*>(item.pszText);
+    const int n = ::MultiByteToWideChar(CP_ACP, 0, label.c_str(), -1, wide, item.cchTextMax);
+    if (n == 0)
+        wide[item.cchTextMax - 1] = L'\0'; // too long: cut, as lstrcpyn would
+    wide[item.cchTextMax - 1] = L'\0';
+}
+
+} // namespace
+
+CShellTreeCtrl::CShellTreeCtrl() = default;
+
+CShellTreeCtrl::~CShellTreeCtrl() = default;
+
+void CShellTreeCtrl::PreSubclassWindow() {
+    CWaitingTreeCtrl::PreSubclassWindow();
+    CShellPidl desktop;
+    if (FAILED(::SHGetSpecialFolderLocation(m_hWnd, CSIDL_DESKTOP, desktop.Receive())) || !desktop)
+        return;
+    SHFILEINFOA info{};
+    const auto list = reinterpret_cast<HIMAGELIST>(
+        ::SHGetFileInfoA(reinterpret_cast<LPCSTR>(desktop.get()), 0, &info, sizeof info,
+                         SHGFI_SYSICONINDEX | SHGFI_SMALLICON | SHGFI_PIDL));
+    // Posted: the control may still be in the middle of its creation here.
+    if (list)
+        PostImageList(list, TVSIL_NORMAL);
+}
+
+void CShellTreeCtrl::OnDestroy() {
+    m_bClosing = true;
+    // The records go while the owner still reflects the deletions to this object.
+    DeleteAllItems();
+    CWaitingTreeCtrl::OnDestroy();
+}
+
+CShellNode* CShellTreeCtrl::NodeOf(HTREEITEM item) const {
+    if (!item || item == TVI_ROOT)
+        return nullptr;
+    return reinterpret_cast<CShellNode*>(GetItemData(item));
+}
+
+CShellPidl CShellTreeCtrl::CopyItemId(HTREEITEM item) const {
+    const CShellNode* node = NodeOf(item);
+    return node ? CShellPidl::CopyOf(node->AbsoluteId()) : CShellPidl();
+}
+
+void CShellTreeCtrl::PopulateTree(LPCITEMIDLIST root, std::uint32_t flags) {
+    if (!m_desktop)
+        return;
+    if (!root) {
+        CShellPidl desktopId;
+        if (FAILED(::SHGetSpecialFolderLocation(m_hWnd, CSIDL_DESKTOP, desktopId.Receive())) || !desktopId)
+            return;
+        InsertNode(TVI_ROOT, m_desktop.get(), nullptr, desktopId.get(), flags);
+        return;
+    }
+    SendMessage(WM_SETREDRAW, FALSE);
+    PopulateNode(TVI_ROOT, root, flags);
+    SendMessage(WM_SETREDRAW, TRUE);
+}
+
+HTREEITEM CShellTreeCtrl::InsertNode(HTREEITEM parent, IShellFolder* parentFolder, LPCITEMIDLIST parentId,
+                                     LPCITEMIDLIST relativeId, std::uint32_t flags) {
+    CShellPidl absolute = CShellPidl::Concat(parentId, relativeId);
+    if (!absolute)
+        return nullptr;
+    auto node = std::make_unique<CShellNode>(parentFolder, std::move(absolute), flags);
+
+    char label[kLabelChars] = "";
+    TVINSERTSTRUCTA insert{};
+    insert.hParent = parent;
+    insert.hInsertAfter = TVI_LAST;
+    insert.item.mask = kInsertMask;
+    insert.item.pszText = label;
+    insert.item.cchTextMax = kLabelChars;
+    insert.item.lParam = reinterpret_cast<LPARAM>(node.get());
+    // What is not supplied on demand is computed now.
+    FillDisplayInfo(insert.item, *node, kInsertMask & ~m_nCallbackMask, false);
+    if (m_nCallbackMask & kCallbackText)
+        insert.item.pszText = LPSTR_TEXTCALLBACKA;
+    if (m_nCallbackMask & kCallbackImage)
+        insert.item.iImage = I_IMAGECALLBACK;
+    if (m_nCallbackMask & kCallbackSelectedImage)
+        insert.item.iSelectedImage = I_IMAGECALLBACK;
+    if (m_nCallbackMask & kCallbackChildren)
+        insert.item.cChildren = I_CHILDRENCALLBACK;
+    insert.item.mask |= kInsertMask; // the state bits the fill added stay
+    HTREEITEM item = InsertItem(&insert);
+    if (item)
+        node.release(); // the item owns it now; TVN_DELETEITEM frees it
+    return item;
+}
+
+void CShellTreeCtrl::FillDisplayInfo(TVITEMA& item, const CShellNode& node, UINT mask, bool wideText) const {
+    IShellFolder* folder = node.ParentFolder();
+    LPCITEMIDLIST relative = node.RelativeId();
+    if (mask & TVIF_TEXT)
+        CopyLabel(item, ShellLabelOf(folder, node.AbsoluteId(), node.Flags()), wideText);
+
+    if (mask & (TVIF_IMAGE | TVIF_SELECTEDIMAGE)) {
+        SFGAOF attributes = SFGAO_GHOSTED | SFGAO_LINK | SFGAO_SHARE | SFGAO_FOLDER;
+        if (!folder || !relative || FAILED(folder->GetAttributesOf(1, &relative, &attributes)))
+            attributes = 0;
+        if (attributes & SFGAO_GHOSTED) {
+            item.mask |= TVIF_STATE;
+            item.state |= TVIS_CUT;
+            item.stateMask |= TVIS_CUT;
+        }
+        if (attributes & (SFGAO_SHARE | SFGAO_LINK)) {
+            item.mask |= TVIF_STATE;
+            item.state &= ~TVIS_OVERLAYMASK;
+            item.state |= INDEXTOOVERLAYMASK((attributes & SFGAO_SHARE) ? 1 : 2);
+            item.stateMask |= TVIS_OVERLAYMASK;
+        }
+        if (mask & TVIF_IMAGE)
+            item.iImage = item.iSelectedImage = SmallIconOf(node.AbsoluteId(), false);
+        if ((mask & TVIF_SELECTEDIMAGE) && (attributes & SFGAO_FOLDER))
+            item.iSelectedImage = SmallIconOf(node.AbsoluteId(), true);
+    }
+
+    if (mask & TVIF_CHILDREN)
+        item.cChildren = ShellHasChildren(folder, relative, node.Flags()) ? 1 : 0;
+}
+
+bool CShellTreeCtrl::PopulateNode(HTREEITEM item, LPCITEMIDLIST absoluteId, std::uint32_t flags) {
+    IShellFolder* folder = BindShellFolder(m_desktop.get(), absoluteId);
+    if (!folder)
+        return false;
+    const SHCONTF what = SHCONTF_FOLDERS | ((flags & kShellNonFolders) ? SHCONTF_NONFOLDERS : 0) |
+                         ((flags & kShellHidden) ? SHCONTF_INCLUDEHIDDEN : 0);
+    IEnumIDList* enumerator = nullptr;
+    if (FAILED(folder->EnumObjects(m_hWnd, what, &enumerator)))
+        enumerator = nullptr;
+    // Released however the filling ends.
+    struct Release {
+        IShellFolder* folder;
+        IEnumIDList*& enumerator;
+        ~Release() {
+            if (enumerator)
+                enumerator->Release();
+            folder->Release();
+        }
+    } release{folder, enumerator};
+    if (enumerator) {
+        SetPopulationCount(0, 0);
+        LPITEMIDLIST child = nullptr;
+        while (enumerator->Next(1, &child, nullptr) == S_OK) {
+            CShellPidl relative(child);
+            InsertNode(item, folder, absoluteId, relative.get(), flags & kShellInherited);
+            IncreasePopulation(1);
+        }
+        if (GetPopulationCount() > 0) {
+            TVSORTCB sort{};
+            sort.hParent = item;
+            sort.lpfnCompare = &CShellTreeCtrl::CompareNodes;
+            sort.lParam = 0;
+            SortChildrenCB(&sort);
+        }
+        SetPopulationCount(1, 1);
+    }
+    return true;
+}
+
+int CALLBACK CShellTreeCtrl::CompareNodes(LPARAM a, LPARAM b, LPARAM) {
+    const auto* first = reinterpret_cast<const CShellNode*>(a);
+    const auto* second = reinterpret_cast<const CShellNode*>(b);
+    if (!first || !second || !second->ParentFolder())
+        return 0;
+    return CompareShellIds(second->ParentFolder(), first->RelativeId(), second->RelativeId());
+}
+
+bool CShellTreeCtrl::PopulateItem(HTREEITEM node) {
+    if (node == TVI_ROOT)
+        return true;
+    const CShellNode* record = NodeOf(node);
+    if (!record)
+        return true;
+    if (!PopulateNode(node, record->AbsoluteId(), record->Flags()))
+        return true;
+    std::string path;
+    if (!ShellFileSystemPath(record->AbsoluteId(), path) || path.size() < 3)
+        return true; // a virtual folder
+    // Folders on removable, optical and network drives keep their button when they turned out empty:
+    // the medium may be in later.
+    return ::GetDriveTypeA(path.substr(0, 3).c_str()) == DRIVE_FIXED;
+}
+
+std::string CShellTreeCtrl::GetLabelPath(HTREEITEM item) const {
+    std::string path;
+    if (!item)
+        return path;
+    path = GetItemText(item);
+    for (HTREEITEM parent = GetParentItem(item); parent; parent = GetParentItem(parent))
+        path = GetItemText(parent) + "\\" + path;
+    return path;
+}
+
+void CShellTreeCtrl::ExpandToLabelPath(const std::string& labelPath) {
+    HTREEITEM current = nullptr;
+    std::size_t position = 0;
+    for (;;) {
+        const std::size_t slash = labelPath.find('\\', position);
+        const std::string component =
+            labelPath.substr(position, slash == std::string::npos ? std::string::npos : slash - position);
+        position = slash == std::string::npos ? labelPath.size() : slash + 1;
+        if (component.empty())
+            break;
+        HTREEITEM candidate = current ? GetChildItem(current) : GetRootItem();
+        while (candidate && ::lstrcmpiA(GetItemText(candidate).c_str(), component.c_str()) != 0)
+            candidate = GetNextSiblingItem(candidate);
+        if (!candidate)
+            return; // the path target keeps what it had
+        Expand(candidate, TVE_EXPAND);
+        current = candidate;
+    }
+    if (current)
+        m_hPathTarget = current;
+}
+
+std::string CShellTreeCtrl::FolderPathOf(HTREEITEM item) const {
+    const CShellNode* node = NodeOf(item);
+    std::string path;
+    // The Desktop, the namespace's root, is not a folder of files here even where the shell gives it the
+    // user's desktop directory: it holds My Computer, the network and the rest.
+    if (node && ItemIdListSize(node->AbsoluteId()) > 0)
+        ShellFileSystemPath(node->AbsoluteId(), path);
+    return path;
+}
+
+int CShellTreeCtrl::ScanFolder(HTREEITEM item, const char* needle, std::string* problem) {
+    if (problem)
+        problem->clear();
+    if (m_pDoc)
+        m_pDoc->m_strShellPath = GetLabelPath(item);
+    BeginScan();
+    const std::string path = FolderPathOf(item);
+    if (path.empty())
+        return 0; // Desktop, My Computer and the like: the current folder stays what it was
+    // The scan checks that the path fits the runtime's buffers before it is used anywhere.
+    const int scanned = ScanFolderPath(path.c_str(), needle, problem);
+    if (m_pDoc && FolderPathProblem(path).empty())
+        m_pDoc->m_strPath = path;
+    return scanned;
+}
+
+void CShellTreeCtrl::ShowScanned(HTREEITEM item, int, const std::string& problem) {
+    const std::string path = FolderPathOf(item);
+    if (onFolderShown)
+        onFolderShown(path, GetItemText(item));
+    if (onStatusText)
+        onStatusText(problem);
+}
+
+void CShellTreeCtrl::RefreshCurrentFolder() {
+    HTREEITEM item = GetSelectedItem();
+    if (!item)
+        return;
+    std::string problem;
+    const int scanned = ScanFolder(item, ".dwg", &problem);
+    ShowScanned(item, scanned, problem);
+}
+
+void CShellTreeCtrl::OnSelChanged(HTREEITEM item) {
+    if (m_bClosing || !item)
+        return;
+    if (onEnablePick)
+        onEnablePick(false);
+    std::string problem;
+    const int scanned = ScanFolder(item, ".dwg", &problem);
+    // Stays highlighted while the focus is in the grid.
+    SelectDropTarget(item);
+    ShowScanned(item, scanned, problem);
+    SetFocus();
+}
+
+bool CShellTreeCtrl::OnNotifyReflect(NMHDR* hdr, LRESULT* result) {
+    const UINT code = AfxTreeNotifyCode(hdr->code);
+    switch (code) {
+    case TVN_DELETEITEMA: {
+        const auto* tv = reinterpret_cast<const NMTREEVIEWA*>(hdr);
+        delete reinterpret_cast<CShellNode*>(tv->itemOld.lParam);
+        *result = 0;
+        return true;
+    }
+    case TVN_GETDISPINFOA: {
+        auto* info = reinterpret_cast<NMTVDISPINFOA*>(hdr);
+        if (const auto* node = reinterpret_cast<const CShellNode*>(info->item.lParam))
+            FillDisplayInfo(info->item, *node, info->item.mask, hdr->code == TVN_GETDISPINFOW);
+        *result = 0;
+        return true;
+    }
+    case TVN_SELCHANGEDA:
+        OnSelChanged(reinterpret_cast<const NMTREEVIEWA*>(hdr)->itemNew.hItem);
+        *result = 0;
+        return true;
+    case TVN_SELCHANGINGA:
+    case TVN_KEYDOWN:
+    case NM_SETFOCUS:
+    case NM_KILLFOCUS:
+        *result = 0;
+        return true;
+    case NM_RCLICK: {
+        CPoint screen;
+        ::GetCursorPos(&screen);
+        CPoint client = screen;
+        ::ScreenToClient(m_hWnd, &client);
+        HTREEITEM item = HitTest(client);
+        if (item && onFolderMenu)
+            onFolderMenu(item, screen);
+        *result = 1; // the control's own handling would send a context-menu message too
+        return true;
+    }
+    default:
+        return CWaitingTreeCtrl::OnNotifyReflect(hdr, result);
+    }
+}

@@ -1,0 +1,89 @@
+// The shell folder tree: the shell namespace as the Windows shell presents it, rooted at the Desktop,
+// folders only, each node filled with its sub-folders when it is first expanded (behind the waiting
+// control's animation). Selecting a folder makes it the explorer's current folder: the tree scans it into
+// the drawing list and tells its owner, which rebuilds the grid.
+//
+// Each item's data is a CShellNode (the folder that enumerated it, its absolute item id list, its
+// enumeration flags), created when the item is inserted and destroyed with it.
+//
+// Wiring. The owner sets the document (the explorer's settings: current folder and label path) and the
+// handlers; a handler left empty is not called. Nothing here reaches the frame or the grid directly.
+#pragma once
+
+#include "tree/ShellNode.h"
+#include "tree/WaitingTreeCtrl.h"
+
+#include <functional>
+#include <string>
+
+class CTessel3Doc;
+
+class CShellTreeCtrl : public CWaitingTreeCtrl {
+public:
+    // Attributes supplied on demand (TVN_GETDISPINFO) instead of at insertion.
+    enum CallbackMask : UINT {
+        kCallbackText = 0x01,
+        kCallbackImage = 0x02,
+        kCallbackSelectedImage = 0x20,
+        kCallbackChildren = 0x40,
+    };
+
+    CShellTreeCtrl();
+    ~CShellTreeCtrl() override;
+
+    // Set by the owner.
+    std::function<void(bool)> onEnablePick; // the accept button: off while the folder changes
+    // A folder selection was scanned into the drawing list: the grid rebuilds. folderPath is empty for a
+    // node without a file-system path (Desktop, My Computer), whose label is then given.
+    std::function<void(const std::string& folderPath, const std::string& label)> onFolderShown;
+    std::function<void(const std::string&)> onStatusText; // what the scan has to say (empty: all well)
+    std::function<void(HTREEITEM, CPoint)> onFolderMenu;  // right click on a node (screen point)
+    void SetDocument(CTessel3Doc* doc) { m_pDoc = doc; }
+
+    UINT GetCallbackMask() const { return m_nCallbackMask; }
+    void SetCallbackMask(UINT mask) { m_nCallbackMask = mask & 0x63; }
+
+    // Null root: one top node, the Desktop. Otherwise that folder's children are the top-level nodes.
+    void PopulateTree(LPCITEMIDLIST root, std::uint32_t flags);
+    // A copy of the node's absolute item id list; empty when the item has no record.
+    CShellPidl CopyItemId(HTREEITEM item) const;
+    // The node's record, or null.
+    CShellNode* NodeOf(HTREEITEM item) const;
+    // "Desktop\My Computer\C:\dir": the labels from the top node down to the item; empty for null.
+    std::string GetLabelPath(HTREEITEM item) const;
+    // Expands the nodes named by a label path (case ignored), filling each on the way; the last one
+    // becomes the path target. An empty component ends the walk; a name that matches no node stops it
+    // and leaves the path target as it was. Selects nothing.
+    void ExpandToLabelPath(const std::string& labelPath);
+    // The file-system path of a node, or empty for a virtual folder and for the Desktop at the top.
+    std::string FolderPathOf(HTREEITEM item) const;
+    // Scans the item's folder into the drawing list: the document's label path first, then the list
+    // emptied; a node with a file-system path becomes the document's folder and the current directory
+    // and its drawings (names containing needle) are listed. 1 when the folder was read to its end, 0
+    // when it has no folder or could not be read. problem receives what the user should be told.
+    int ScanFolder(HTREEITEM item, const char* needle, std::string* problem = nullptr);
+    // Rescans the selected folder and has the grid rebuild (after a rename or a file command).
+    void RefreshCurrentFolder();
+
+protected:
+    void PreSubclassWindow() override;
+    bool PopulateItem(HTREEITEM node) override;
+    bool OnNotifyReflect(NMHDR* hdr, LRESULT* result) override;
+    void OnDestroy() override;
+
+    // Tells the owner what a scan of the item found (title, grid, status).
+    void ShowScanned(HTREEITEM item, int scanned, const std::string& problem);
+
+private:
+    HTREEITEM InsertNode(HTREEITEM parent, IShellFolder* parentFolder, LPCITEMIDLIST parentId,
+                         LPCITEMIDLIST relativeId, std::uint32_t flags);
+    void FillDisplayInfo(TVITEMA& item, const CShellNode& node, UINT mask, bool wideText) const;
+    bool PopulateNode(HTREEITEM item, LPCITEMIDLIST absoluteId, std::uint32_t flags);
+    void OnSelChanged(HTREEITEM item);
+    static int CALLBACK CompareNodes(LPARAM a, LPARAM b, LPARAM);
+
+    CDesktopFolderRef m_desktop;
+    UINT m_nCallbackMask = 0;
+    CTessel3Doc* m_pDoc = nullptr;
+    bool m_bClosing = false; // the window is going: selection changes are no longer folder changes
+};
