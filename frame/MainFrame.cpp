@@ -1,6 +1,7 @@
 #include "frame/MainFrame.h"
 
 #include "frame/AboutDlgArx.h"
+#include "fileops/ForFileCommands.h"
 #include "settings/IniFile.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
@@ -240,8 +241,30 @@ CView* CMainFrame::MakeGridView() {
         else if (m_pFolderPane && m_pFolderPane->m_hWnd)
             m_pFolderPane->SetFocus();
     };
+    WireFileCommands(*grid);
     m_pGridView = grid;
     return grid;
+}
+
+void CMainFrame::WireFileCommands(CTessel3View& grid) {
+    // The current folder is the document's; the process's current directory follows it.
+    const auto folder = [this] {
+        std::string path = m_pDoc ? m_pDoc->m_strPath : std::string();
+        if (path.empty()) {
+            char buffer[MAX_PATH + 1] = "";
+            const DWORD n = ::GetCurrentDirectoryA(sizeof buffer, buffer);
+            path.assign(buffer, n < sizeof buffer ? n : 0);
+        }
+        return path;
+    };
+    grid.onClipboardHoldsDrawings = [] { return ForFileCommands().ClipboardHoldsDrawings(); };
+    grid.onCopySelection = [folder](bool cut) { CopySelectionToClipboard(folder(), cut); };
+    grid.onPaste = [this] { return ForFileCommands().PasteIntoCurrentFolder(m_hWnd); };
+    grid.onDeleteSelection = [this, folder] { DeleteSelection(m_hWnd, folder()); };
+    grid.onRenameFile = [](const std::string& source, const std::string& destination) {
+        return ForFileCommands().RenameFile(source, destination, nullptr);
+    };
+    grid.onShowProperties = [](const std::string& path) { ShowFileProperties(path); };
 }
 
 bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {

@@ -93,6 +93,7 @@ private:
     CView* MakeGridView();
     CView* MakeFolderPane();
     void WireFolderTree();
+    void WireFileCommands(CTessel3View& grid);
     bool ForwardToGrid(UINT id);
     void SetSortMode(int mode);
     void ShowHelp();

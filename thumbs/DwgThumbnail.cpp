@@ -10,8 +10,6 @@
 #include "thumbs/Tessel3View.h"
 #include "thumbs/TooltipText.h"
 
-#include <shellapi.h>
-
 namespace {
 
 // Every redraw of the control and its label repaints at once, background included.
@@ -95,8 +93,8 @@ bool CThumbLabel::PreTranslateMessage(MSG* pMsg) {
 }
 
 void CThumbLabel::OnReturn() {
-    if (m_bRenaming)
-        Commit();
+    if (m_bRenaming && !Commit())
+        return; // the grid has re-created its controls meanwhile
     m_strSaved = GetWindowText();
     SetReadOnly(true);
 }
@@ -124,25 +122,7 @@ void CThumbLabel::OnLeave() {
         ::RedrawWindow(view, nullptr, nullptr, kRedrawNow | RDW_ALLCHILDREN);
 }
 
-namespace {
-
-// The system's text for an error code, without its line end.
-std::string SystemErrorText(DWORD error) {
-    char* text = nullptr;
-    const DWORD n = ::FormatMessageA(FORMAT_MESSAGE_ALLOCATE_BUFFER | FORMAT_MESSAGE_FROM_SYSTEM |
-                                         FORMAT_MESSAGE_IGNORE_INSERTS,
-                                     nullptr, error, 0, reinterpret_cast<char*>(&text), 0, nullptr);
-    std::string result = n && text ? std::string(text, n) : "error " + std::to_string(error);
-    if (text)
-        ::LocalFree(text);
-    while (!result.empty() && (result.back() == '\n' || result.back() == '\r' || result.back() == ' '))
-        result.pop_back();
-    return result;
-}
-
-} // namespace
-
-void CThumbLabel::Commit() {
+bool CThumbLabel::Commit() {
     m_bRenaming = false;
     CTessel3View* view = m_pOwner ? m_pOwner->m_pView : nullptr;
     const CTessel3Doc* doc = view ? view->Document() : nullptr;
@@ -161,21 +141,26 @@ void CThumbLabel::Commit() {
         RedrawEdge();
         if (verdict != RenameVerdict::Unchanged && view)
             view->TellUser(RenameRefusalText(verdict, newName));
-        return;
+        return true;
     }
-    if (!::MoveFileA((folder + oldName).c_str(), (folder + newName).c_str())) {
-        const DWORD error = ::GetLastError();
-        SetWindowText(oldName);
-        RedrawEdge();
-        if (view)
-            view->TellUser("Cannot rename \"" + oldName + "\" to \"" + newName +
-                           "\": " + SystemErrorText(error));
-        return;
+    // The shell renames; its loop may let the grid re-create its controls, so this label is looked at again
+    // only if it still stands.
+    const HWND self = m_hWnd;
+    const int result = view ? view->RenameFile(folder + oldName, folder + newName) : -1;
+    const bool alive = ::IsWindow(self) && CWnd::FromHandle(self) == this;
+    if (result != 0) {
+        if (alive) {
+            SetWindowText(oldName);
+            RedrawEdge();
+        }
+        return alive;
     }
     // The rescan rebuilds the grid, which destroys this label: it runs once this message is done.
     if (view)
         view->PostRefresh();
-    RedrawEdge();
+    if (alive)
+        RedrawEdge();
+    return alive;
 }
 
 void CThumbLabel::OnLButtonDblClk(UINT, CPoint) {
@@ -410,15 +395,15 @@ bool exCDwgThumbnail::TranslateInput(MSG* pMsg) {
     }
 }
 
-CMenu BuildThumbnailMenu(CMenu& menu, int sortMode) {
+CMenu BuildThumbnailMenu(CMenu& menu, int sortMode, bool canPaste) {
     CMenu popup;
     if (!menu.LoadMenu(IDR_THUMB_MENU))
         return popup;
     popup = menu.GetSubMenu(0);
     if (!popup.m_hMenu)
         return popup;
-    // Only file lists can be pasted.
-    if (!::IsClipboardFormatAvailable(CF_HDROP))
+    // Only a file list that names a drawing is offered for pasting.
+    if (!canPaste)
         popup.EnableMenuItem(ID_THUMB_PASTE, MF_BYCOMMAND | MF_GRAYED);
     static const UINT kSortIds[] = {ID_SORT_NAME, ID_SORT_DATE, ID_SORT_SIZE};
     if (sortMode >= 0 && sortMode < 3)
@@ -428,7 +413,8 @@ CMenu BuildThumbnailMenu(CMenu& menu, int sortMode) {
 
 void exCDwgThumbnail::ShowContextMenu(POINT screenPoint) {
     CMenu menu;
-    CMenu popup = BuildThumbnailMenu(menu, m_pView ? m_pView->SortMode() : 0);
+    CMenu popup = BuildThumbnailMenu(menu, m_pView ? m_pView->SortMode() : 0,
+                                     m_pView && m_pView->ClipboardHoldsDrawings());
     if (!popup.m_hMenu)
         return;
     HWND self = m_hWnd;
@@ -449,10 +435,18 @@ void exCDwgThumbnail::OnContextCommand(int command) {
         if (HWND frame = ::GetAncestor(m_hWnd, GA_ROOT); frame && frame != m_hWnd)
             ::PostMessageA(frame, WM_COMMAND, static_cast<WPARAM>(command), 0);
         break;
+    // The file commands run the shell's loops: nothing of this control is touched after them.
     case ID_THUMB_COPY:
+        if (m_pView)
+            m_pView->CopySelection(false);
+        break;
     case ID_THUMB_DELETE:
+        if (m_pView)
+            m_pView->DeleteSelection();
+        break;
     case ID_THUMB_PASTE:
-        // Carried out by the file commands.
+        if (m_pView)
+            m_pView->PasteFiles();
         break;
     case ID_THUMB_RENAME:
         m_wndLabel.BeginRename();
@@ -466,13 +460,7 @@ void exCDwgThumbnail::OnContextCommand(int command) {
 }
 
 void exCDwgThumbnail::ShowProperties() {
-    const std::string file = RecordAt(m_nListIndex).m_strName;
-    SHELLEXECUTEINFOA info{};
-    info.cbSize = sizeof info;
-    info.fMask = SEE_MASK_INVOKEIDLIST;
-    info.hwnd = m_hWnd;
-    info.lpVerb = "properties";
-    info.lpFile = file.c_str();
-    info.nShow = SW_SHOW;
-    ::ShellExecuteExA(&info);
+    // The full path: the property sheet does not depend on the current directory.
+    if (m_pView)
+        m_pView->ShowProperties(CurrentFolderWithSlash() + RecordAt(m_nListIndex).m_strName);
 }

@@ -37,7 +37,8 @@ private:
     void OnReturn();
     void OnEscape();
     void OnLeave();
-    void Commit();
+    // False when the label went while the file was renamed (the grid re-created its controls).
+    bool Commit();
     void RedrawEdge();
 
     bool m_bRenaming = false;
@@ -99,6 +100,6 @@ std::string CurrentFolder();
 std::string CurrentFolderWithSlash();
 
 // Loads the thumbnail's context menu into menu and returns its popup (not owned), prepared: "&Paste"
-// greyed when the clipboard holds no file list, sortMode (0 name, 1 date, 2 size) checked. Empty when the
-// menu resource is missing.
-CMenu BuildThumbnailMenu(CMenu& menu, int sortMode);
+// greyed unless canPaste (the clipboard holds drawings), sortMode (0 name, 1 date, 2 size) checked. Empty
+// when the menu resource is missing.
+CMenu BuildThumbnailMenu(CMenu& menu, int sortMode, bool canPaste);

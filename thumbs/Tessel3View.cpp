@@ -235,6 +235,83 @@ void CTessel3View::Refresh() {
         SetStatusText(problem);
 }
 
+bool CTessel3View::ClipboardHoldsDrawings() const {
+    return onClipboardHoldsDrawings && onClipboardHoldsDrawings();
+}
+
+bool CTessel3View::AnySelected() const {
+    for (int i = 0; i < DwgList.GetSize(); ++i)
+        if (DwgList[i].IsSelected())
+            return true;
+    return false;
+}
+
+void CTessel3View::CopySelection(bool cut) {
+    if (onCopySelection)
+        onCopySelection(cut);
+}
+
+void CTessel3View::PasteFiles() {
+    if (onPaste && onPaste())
+        PostRefresh();
+}
+
+void CTessel3View::DeleteSelection() {
+    if (!onDeleteSelection)
+        return;
+    onDeleteSelection();
+    PostRefresh();
+}
+
+int CTessel3View::RenameFile(const std::string& source, const std::string& destination) {
+    if (onRenameFile)
+        return onRenameFile(source, destination);
+    if (::MoveFileA(source.c_str(), destination.c_str()))
+        return 0;
+    const DWORD error = ::GetLastError();
+    TellUser("Cannot rename \"" + source + "\" to \"" + destination + "\" (error " + std::to_string(error) + ").");
+    return static_cast<int>(error ? error : 1);
+}
+
+void CTessel3View::ShowProperties(const std::string& path) {
+    if (onShowProperties)
+        onShowProperties(path);
+}
+
+int CTessel3View::RunContextMenu(POINT screenPoint) {
+    CMenu menu;
+    if (!menu.CreatePopupMenu())
+        return 0;
+    const UINT selection = AnySelected() ? MF_ENABLED : MF_GRAYED;
+    menu.AppendMenu(MF_STRING | selection, kGridMenuCopy, "&Copy");
+    menu.AppendMenu(MF_STRING | (ClipboardHoldsDrawings() ? MF_ENABLED : MF_GRAYED), kGridMenuPaste, "&Paste");
+    menu.AppendMenu(MF_STRING | selection, kGridMenuDelete, "&Delete");
+    menu.AppendMenu(MF_STRING | MF_GRAYED, kGridMenuRename, "&Rename");
+    const int command = menu.TrackPopupMenu(TPM_RIGHTBUTTON | TPM_NONOTIFY | TPM_RETURNCMD, screenPoint.x,
+                                            screenPoint.y, m_hWnd);
+    switch (command) {
+    case kGridMenuCopy:
+        CopySelection(false);
+        break;
+    case kGridMenuPaste:
+        PasteFiles();
+        break;
+    case kGridMenuDelete:
+        DeleteSelection();
+        break;
+    default:
+        break;
+    }
+    return command;
+}
+
+void CTessel3View::OnRButtonDown(UINT flags, CPoint pt) {
+    POINT screen = pt;
+    ::ClientToScreen(m_hWnd, &screen);
+    RunContextMenu(screen);
+    CScrollView::OnRButtonDown(flags, pt);
+}
+
 exCDwgThumbnail* CTessel3View::ControlOf(int index) {
     const int size = PoolSize();
     if (index < 0 || size == 0)
@@ -510,6 +587,9 @@ bool CTessel3View::OnCmdMsg(UINT id, int code) {
         {ID_VIEW_DECREASE, [](CTessel3View& view) { view.Decrease(); }},
         {ID_VIEW_ALIGNE, [](CTessel3View& view) { view.Align(); }},
         {ID_SELECT_ALL, [](CTessel3View& view) { view.SelectAll(); }},
+        {ID_EDIT_COPY, [](CTessel3View& view) { view.CopySelection(false); }},
+        {ID_EDIT_CUT, [](CTessel3View& view) { view.CopySelection(true); }},
+        {ID_EDIT_PASTE, [](CTessel3View& view) { view.PasteFiles(); }},
     };
     for (const auto& command : kCommands) {
         if (command.id == id) {

@@ -22,6 +22,9 @@
 
 class CTessel3Doc;
 
+// The numbers of the grid's own context menu (built at run time).
+enum GridMenuCommand { kGridMenuCopy = 1, kGridMenuPaste = 2, kGridMenuDelete = 3, kGridMenuRename = 4 };
+
 class CTessel3View : public CScrollView {
 public:
     CTessel3View();
@@ -38,6 +41,15 @@ public:
     // Rescans the current folder through the folder tree and rebuilds; false when there is no tree to
     // do it (the grid then rescans its folder by path itself).
     std::function<bool()> onRefreshFolder;
+    // The file commands, carried out by the owner's file operations; the grid offers them in its menus
+    // and keys. Each looks at the records' selection and the current folder itself.
+    std::function<bool()> onClipboardHoldsDrawings;       // whether Paste is offered
+    std::function<void(bool cut)> onCopySelection;        // the selected drawings onto the clipboard
+    std::function<bool()> onPaste;                        // true when files were pasted
+    std::function<void()> onDeleteSelection;              // to the Recycle Bin, the shell confirming
+    // Renames a file (full paths); the shell's result, 0 when it was renamed.
+    std::function<int(const std::string& source, const std::string& destination)> onRenameFile;
+    std::function<void(const std::string& path)> onShowProperties; // the shell's property sheet
 
     // The document of the creation context (the explorer's settings and current drawing), or nullptr.
     CTessel3Doc* Document() const;
@@ -64,6 +76,22 @@ public:
     // Rescans the current folder and rebuilds, once the message being handled is done (a control that
     // asks for it is destroyed by the rebuild).
     void PostRefresh();
+
+    // The file commands, as the menus and keys of the grid and its thumbnails run them. Those that change
+    // the folder refresh it afterwards. The shell's own loops run inside them: a thumbnail that calls one
+    // looks itself up again before it goes on.
+    bool ClipboardHoldsDrawings() const;
+    bool AnySelected() const;
+    void CopySelection(bool cut);
+    void PasteFiles();
+    void DeleteSelection();
+    // Renames with the owner's file operation (without one, with a plain file move that says why it
+    // failed); 0 when the file was renamed.
+    int RenameFile(const std::string& source, const std::string& destination);
+    void ShowProperties(const std::string& path);
+    // The grid's own context menu at a screen point: "&Copy" 1, "&Paste" 2, "&Delete" 3, "&Rename" 4
+    // (always greyed). Returns the number chosen (0 when dismissed) after running it.
+    int RunContextMenu(POINT screenPoint);
 
     // The search edit's search as you type: finds the first drawing whose name starts with text (case
     // ignored; a whole name matches too), clears every other selection, brings the match into view
@@ -101,6 +129,7 @@ protected:
     void OnDraw(CDC* pDC) override;
     void OnSize(UINT type, int cx, int cy) override;
     void OnKeyDown(UINT nChar, UINT repeat, UINT flags) override;
+    void OnRButtonDown(UINT flags, CPoint pt) override;
     bool OnEraseBkgnd(CDC* pDC) override;
     void OnDestroy() override;
     bool OnCmdMsg(UINT id, int code) override;

@@ -135,7 +135,7 @@ TEST(ThumbnailMenu, PasteGreyedWithoutFilesAndSortModeChecked) {
     }
     Frame().sortMode = 1;
     CMenu menu;
-    CMenu popup = BuildThumbnailMenu(menu, bench.view().SortMode());
+    CMenu popup = BuildThumbnailMenu(menu, bench.view().SortMode(), bench.view().ClipboardHoldsDrawings());
     ASSERT_NE(popup.m_hMenu, nullptr);
     EXPECT_TRUE(popup.GetMenuState(ID_THUMB_PASTE, MF_BYCOMMAND) & MF_GRAYED);
     EXPECT_FALSE(popup.GetMenuState(ID_THUMB_COPY, MF_BYCOMMAND) & MF_GRAYED);

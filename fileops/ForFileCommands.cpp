@@ -1,0 +1,195 @@
+#include "fileops/ForFileCommands.h"
+
+#include "fileops/DropBlock.h"
+#include "fileops/ShellFileOp.h"
+#include "framework/afxfiledlg.h"
+#include "framework/afxwin.h"
+#include "thumbs/DwgList.h"
+
+#include <shellapi.h>
+
+#include <cstring>
+#include <io.h>
+
+const char* const kCopyFileTitle = "Copy file";
+const char* const kOverwriteQuestion = "File already exists!Are you sure you want to overwrite it?";
+const char* const kOverwriteCaption = "Confirm overwriting";
+const char* const kCannotCopy = "Cannot copy file:";
+
+namespace {
+
+// The clipboard's sequence number right after the last cut was put there (0: no cut pending). While the
+// clipboard still holds that list, a paste moves.
+DWORD g_cutSequence = 0;
+
+class ClipboardOpen {
+public:
+    explicit ClipboardOpen(HWND owner) {
+        // Another program may hold the clipboard for a moment.
+        for (int attempt = 0; attempt < 5 && !m_open; ++attempt) {
+            m_open = ::OpenClipboard(owner) != FALSE;
+            if (!m_open)
+                ::Sleep(20);
+        }
+    }
+    ~ClipboardOpen() {
+        if (m_open)
+            ::CloseClipboard();
+    }
+    ClipboardOpen(const ClipboardOpen&) = delete;
+    ClipboardOpen& operator=(const ClipboardOpen&) = delete;
+    explicit operator bool() const { return m_open; }
+
+private:
+    bool m_open = false;
+};
+
+std::string CurrentDirectory() {
+    char buffer[260] = "";
+    const DWORD n = ::GetCurrentDirectoryA(259, buffer);
+    return n > 0 && n < 259 ? std::string(buffer, n) : std::string();
+}
+
+} // namespace
+
+std::vector<std::string> ClipboardFileList() {
+    ClipboardOpen clipboard(nullptr);
+    if (!clipboard || !::IsClipboardFormatAvailable(CF_HDROP))
+        return {};
+    HGLOBAL handle = ::GetClipboardData(CF_HDROP);
+    if (!handle)
+        return {};
+    const SIZE_T size = ::GlobalSize(handle);
+    const void* data = ::GlobalLock(handle);
+    if (!data)
+        return {};
+    // A private copy: the block belongs to the clipboard.
+    std::vector<unsigned char> copy(static_cast<const unsigned char*>(data),
+                                    static_cast<const unsigned char*>(data) + size);
+    ::GlobalUnlock(handle);
+    return ReadDropBlock(copy.data(), copy.size());
+}
+
+bool PutFileListOnClipboard(const std::vector<std::string>& paths, bool cut) {
+    const std::vector<unsigned char> block = BuildDropBlock(paths);
+    HGLOBAL handle = ::GlobalAlloc(GMEM_MOVEABLE | GMEM_ZEROINIT | GMEM_SHARE, block.size());
+    if (!handle)
+        return false;
+    if (void* data = ::GlobalLock(handle)) {
+        std::memcpy(data, block.data(), block.size());
+        ::GlobalUnlock(handle);
+    }
+    {
+        ClipboardOpen clipboard(nullptr);
+        if (!clipboard) {
+            ::GlobalFree(handle);
+            return false;
+        }
+        ::EmptyClipboard();
+        if (!::SetClipboardData(CF_HDROP, handle)) {
+            ::GlobalFree(handle);
+            return false;
+        }
+    }
+    g_cutSequence = cut ? ::GetClipboardSequenceNumber() : 0;
+    return true;
+}
+
+bool ForFileCommands::ClipboardHoldsDrawings() const {
+    return ListHoldsDrawings(ClipboardFileList());
+}
+
+bool ForFileCommands::PasteIntoCurrentFolder(HWND owner) const {
+    const std::vector<std::string> names = ClipboardFileList();
+    // What Paste is offered for: a list that names a drawing. Then every file of it is pasted.
+    if (!ListHoldsDrawings(names))
+        return false;
+    const bool move = g_cutSequence != 0 && g_cutSequence == ::GetClipboardSequenceNumber();
+    const std::string folder = CurrentDirectory();
+    if (folder.empty())
+        return false;
+    CShellFileOp op;
+    op.SetOwner(owner);
+    for (const std::string& name : names)
+        op.AddName(CShellFileOp::kSource, name);
+    op.AddName(CShellFileOp::kDestination, folder);
+    const int result = move ? op.Move() : op.Copy();
+    if (result == 0 && move && !op.Aborted()) {
+        // The files are gone from where the list says: the list goes too, as after a cut in the system's
+        // file manager.
+        ClipboardOpen clipboard(nullptr);
+        if (clipboard && g_cutSequence == ::GetClipboardSequenceNumber())
+            ::EmptyClipboard();
+        g_cutSequence = 0;
+    }
+    return result == 0;
+}
+
+int ForFileCommands::RenameFile(const std::string& source, const std::string& destination, CEdit* label) const {
+    CShellFileOp op;
+    op.AddName(CShellFileOp::kSource, source);
+    op.AddName(CShellFileOp::kDestination, destination);
+    // The shell asks nothing before a rename; a name that is taken fails instead of replacing.
+    op.SetFlags(FOF_ALLOWUNDO | FOF_NOCONFIRMMKDIR);
+    const int result = op.Rename();
+    if (result != 0 && label && label->m_hWnd) {
+        const auto separator = source.find_last_of('\\');
+        label->SetWindowText(separator == std::string::npos ? source : source.substr(separator + 1));
+    }
+    return result;
+}
+
+int ForFileCommands::CopyToFile(const std::string& source, HWND owner) const {
+    CFileDialog dialog(false, nullptr, source.c_str(), OFN_HIDEREADONLY, "All files (*.*)|*.*||");
+    dialog.m_ofn.hwndOwner = owner;
+    dialog.m_strTitle = kCopyFileTitle;
+    dialog.DoModal();
+    // Whatever closed the dialog, its name decides.
+    const std::string chosen = dialog.GetPathName();
+    if (chosen.empty())
+        return 1;
+    const std::string target = CopyTargetName(chosen);
+    __finddata64_t found{};
+    const intptr_t search = ::_findfirst64(target.c_str(), &found);
+    if (search != -1) {
+        ::_findclose(search);
+        if (::MessageBoxA(owner, kOverwriteQuestion, kOverwriteCaption,
+                          MB_YESNO | MB_ICONQUESTION | MB_DEFBUTTON2) != IDYES)
+            return 1;
+    }
+    if (!::CopyFileA(source.c_str(), target.c_str(), FALSE))
+        AfxMessageBox(std::string(kCannotCopy) + source, MB_OK);
+    return 1;
+}
+
+std::vector<std::string> SelectedPaths(const std::string& folder) {
+    const std::string prefix = FolderWithSlash(folder);
+    std::vector<std::string> paths;
+    for (int i = 0; i < DwgList.GetSize(); ++i)
+        if (DwgList[i].IsSelected())
+            paths.push_back(prefix + DwgList[i].m_strName);
+    return paths;
+}
+
+bool CopySelectionToClipboard(const std::string& folder, bool cut) {
+    return PutFileListOnClipboard(SelectedPaths(folder), cut);
+}
+
+int DeleteSelection(HWND owner, const std::string& folder) {
+    CShellFileOp op;
+    op.SetOwner(owner);
+    for (const std::string& path : SelectedPaths(folder))
+        op.AddName(CShellFileOp::kSource, path);
+    return op.Delete();
+}
+
+bool ShowFileProperties(const std::string& path) {
+    SHELLEXECUTEINFOA info{};
+    info.cbSize = sizeof info;
+    info.fMask = SEE_MASK_INVOKEIDLIST;
+    info.hwnd = nullptr;
+    info.lpVerb = "properties";
+    info.lpFile = path.c_str();
+    info.nShow = SW_SHOW;
+    return ::ShellExecuteExA(&info) != FALSE;
+}

@@ -1,0 +1,29 @@
+// Fuzzes the reader of the clipboard's file list with whole blocks: whatever the bytes, it stays inside the
+// block and what it gives back reads back the same from a block the explorer writes.
+#include "fileops/DropBlock.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    // A block of exactly the input's size, so that a read past it is seen by the sanitizer.
+    auto* block = static_cast<unsigned char*>(std::malloc(size ? size : 1));
+    if (size)
+        std::memcpy(block, data, size);
+    const auto names = ReadDropBlock(block, size);
+    std::size_t total = 0;
+    for (const auto& name : names) {
+        if (name.empty() || name.find('\0') != std::string::npos)
+            std::abort();
+        total += name.size() + 1;
+    }
+    if (total > size)
+        std::abort();
+    std::free(block);
+    const auto rebuilt = BuildDropBlock(names);
+    if (rebuilt.size() % kDropBlockStep != 0 || ReadDropBlock(rebuilt.data(), rebuilt.size()) != names)
+        std::abort();
+    return 0;
+}
