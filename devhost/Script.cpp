@@ -153,6 +153,8 @@ const CommandName kCommands[] = {
     {L"tree-collapse", ScriptCommand::Kind::TreeCollapse, true, true},
     {L"tree-right-click", ScriptCommand::Kind::TreeRightClick, true, true},
     {L"tree-items", ScriptCommand::Kind::TreeItems, true, true},
+    {L"clipboard-put", ScriptCommand::Kind::ClipboardPut, false, false},
+    {L"clipboard-files", ScriptCommand::Kind::ClipboardFiles, false, false},
 };
 
 bool TakesTreePath(ScriptCommand::Kind kind) {
@@ -311,6 +313,14 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
             error = tokens[0] + L" needs path=\"LABEL\\LABEL...\"";
             return false;
         }
+        return true;
+    case ScriptCommand::Kind::ClipboardPut:
+        if (positional.empty() || (positional[0] != L"ansi" && positional[0] != L"wide")) {
+            error = L"clipboard-put takes ansi or wide, then the file names";
+            return false;
+        }
+        command.wide = positional[0] == L"wide";
+        command.files.assign(positional.begin() + 1, positional.end());
         return true;
     case ScriptCommand::Kind::Echo:
         for (std::size_t i = 0; i < positional.size(); ++i)

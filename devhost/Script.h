@@ -56,7 +56,9 @@ struct ScriptCommand {
         TreeExpand,
         TreeCollapse,
         TreeRightClick,
-        TreeItems
+        TreeItems,
+        ClipboardPut,
+        ClipboardFiles
     };
     int line = 0;
     Kind kind = Kind::Echo;
@@ -71,6 +73,8 @@ struct ScriptCommand {
     std::wstring file;          // screenshot
     int ms = 0;                 // sleep
     std::wstring treePath;      // path=: a tree item's label path, labels joined by backslashes
+    bool wide = false;               // clipboard-put wide: the names as UTF-16
+    std::vector<std::wstring> files; // clipboard-put: the names of the list
 };
 
 // Reads a whole script. False with "line N: message" in `error` at the first bad line.

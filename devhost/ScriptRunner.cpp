@@ -8,6 +8,8 @@
 #include "thumbs/AppMessages.h"
 
 #include <commctrl.h>
+#include <shellapi.h>
+#include <shlobj.h>
 #include <wincodec.h>
 
 #include <algorithm>
@@ -538,6 +540,81 @@ void DriveTree(HWND tree, const ScriptCommand& command) {
 }
 
 // Every item whose parents are open, from the top: "tree-item LEVEL LABEL [expanded] [selected]".
+// The clipboard, as another program uses it: a file list put there with the system's own layout (ANSI
+// or wide names), and the list read back through the system's DragQueryFileW.
+class OpenedClipboard {
+public:
+    OpenedClipboard() {
+        for (int attempt = 0; attempt < 50 && !m_open; ++attempt) {
+            m_open = OpenClipboard(nullptr) != FALSE;
+            if (!m_open)
+                Sleep(20);
+        }
+        if (!m_open)
+            throw ScriptError{L"the clipboard cannot be opened (error " + std::to_wstring(GetLastError()) + L")"};
+    }
+    ~OpenedClipboard() { CloseClipboard(); }
+    OpenedClipboard(const OpenedClipboard&) = delete;
+    OpenedClipboard& operator=(const OpenedClipboard&) = delete;
+
+private:
+    bool m_open = false;
+};
+
+void PutClipboardFiles(const ScriptCommand& command) {
+    std::string names;
+    for (const std::wstring& file : command.files) {
+        if (command.wide) {
+            names.append(reinterpret_cast<const char*>(file.c_str()), (file.size() + 1) * sizeof(wchar_t));
+        } else {
+            const int n = WideCharToMultiByte(CP_ACP, 0, file.c_str(), -1, nullptr, 0, nullptr, nullptr);
+            std::string ansi(static_cast<std::size_t>(n > 0 ? n : 1), '\0');
+            WideCharToMultiByte(CP_ACP, 0, file.c_str(), -1, ansi.data(), n, nullptr, nullptr);
+            names += ansi; // with its NUL
+        }
+    }
+    names.append(command.wide ? 2 : 1, '\0');
+    HGLOBAL block = GlobalAlloc(GMEM_MOVEABLE | GMEM_ZEROINIT, sizeof(DROPFILES) + names.size());
+    if (!block)
+        throw ScriptError{L"no memory for the clipboard's file list"};
+    auto* drop = static_cast<DROPFILES*>(GlobalLock(block));
+    drop->pFiles = sizeof(DROPFILES);
+    drop->fWide = command.wide ? TRUE : FALSE;
+    std::memcpy(reinterpret_cast<char*>(drop) + sizeof(DROPFILES), names.data(), names.size());
+    GlobalUnlock(block);
+    OpenedClipboard clipboard;
+    EmptyClipboard();
+    if (!SetClipboardData(CF_HDROP, block)) {
+        GlobalFree(block);
+        throw ScriptError{L"the clipboard refused the file list"};
+    }
+    Fact(L"clipboard-put " + std::to_wstring(command.files.size()) + (command.wide ? L" wide" : L" ansi"));
+}
+
+void PrintClipboardFiles() {
+    OpenedClipboard clipboard;
+    HANDLE data = IsClipboardFormatAvailable(CF_HDROP) ? GetClipboardData(CF_HDROP) : nullptr;
+    if (!data) {
+        Fact(L"clipboard-files none");
+        return;
+    }
+    bool wide = false;
+    if (const auto* drop = static_cast<const DROPFILES*>(GlobalLock(data))) {
+        wide = drop->fWide != FALSE;
+        GlobalUnlock(data);
+    }
+    auto* hdrop = static_cast<HDROP>(data);
+    const UINT count = DragQueryFileW(hdrop, 0xFFFFFFFF, nullptr, 0);
+    Fact(L"clipboard-files " + std::to_wstring(count) + (wide ? L" wide" : L" ansi"));
+    for (UINT i = 0; i < count; ++i) {
+        const UINT length = DragQueryFileW(hdrop, i, nullptr, 0);
+        std::wstring name(length + 1, L'\0');
+        DragQueryFileW(hdrop, i, name.data(), length + 1);
+        name.resize(length);
+        Fact(L"clipboard-file " + EscapeControls(name));
+    }
+}
+
 void PrintTreeItems(HWND tree) {
     const HTREEITEM selected = TreeNext(tree, nullptr, TVGN_CARET);
     for (HTREEITEM item = TreeNext(tree, nullptr, TVGN_ROOT); item;
@@ -583,6 +660,51 @@ HWND FindRunDialog(DWORD threadId) {
     return search.found;
 }
 
+namespace {
+
+struct NestedSearch {
+    HWND runDialog = nullptr;
+    std::vector<HWND> dialogs;
+};
+
+BOOL CALLBACK VisitNestedWindow(HWND hwnd, LPARAM param) {
+    auto* search = reinterpret_cast<NestedSearch*>(param);
+    if (hwnd != search->runDialog && IsWindowVisible(hwnd) && ClassOf(hwnd) == L"#32770")
+        search->dialogs.push_back(hwnd);
+    return TRUE;
+}
+
+} // namespace
+
+int EndNestedLoops(DWORD threadId) {
+    int ended = 0;
+    GUITHREADINFO info{};
+    info.cbSize = sizeof info;
+    if (GetGUIThreadInfo(threadId, &info) && (info.flags & (GUI_INMENUMODE | GUI_POPUPMENUMODE))) {
+        if (threadId == GetCurrentThreadId())
+            EndMenu();
+        else if (info.hwndMenuOwner)
+            PostMessageW(info.hwndMenuOwner, WM_CANCELMODE, 0, 0);
+        ++ended;
+    }
+    NestedSearch search;
+    search.runDialog = FindRunDialog(threadId);
+    EnumThreadWindows(threadId, &VisitNestedWindow, reinterpret_cast<LPARAM>(&search));
+    for (HWND dialog : search.dialogs) {
+        // A box that is itself disabled waits for one above it.
+        if (!IsWindowEnabled(dialog))
+            continue;
+        int answer = IDOK;
+        if (GetDlgItem(dialog, IDCANCEL))
+            answer = IDCANCEL;
+        else if (GetDlgItem(dialog, IDNO))
+            answer = IDNO;
+        PostMessageW(dialog, WM_COMMAND, MAKEWPARAM(answer, BN_CLICKED), 0);
+        ++ended;
+    }
+    return ended;
+}
+
 ScriptRunner::ScriptRunner(std::vector<ScriptCommand> commands, DWORD uiThreadId)
     : m_commands(std::move(commands)), m_uiThreadId(uiThreadId) {}
 
@@ -622,6 +744,11 @@ void ScriptRunner::Run() {
             // Do not leave the LISP call waiting for input that will not come.
             if (HWND dialog = FindRunDialog(m_uiThreadId))
                 PostMessageW(dialog, WM_ORVEX_RESULT, kAppCancel, 0);
+            // A menu or a box left open by the failed step would hold the call: end them until it returns.
+            for (int round = 0; round < 100 && CallsPending() > 0; ++round) {
+                EndNestedLoops(m_uiThreadId);
+                Sleep(kPollMs);
+            }
             return;
         }
     }
@@ -737,6 +864,12 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
         break;
     case Kind::TreeItems:
         PrintTreeItems(WaitForWindow(command));
+        break;
+    case Kind::ClipboardPut:
+        PutClipboardFiles(command);
+        break;
+    case Kind::ClipboardFiles:
+        PrintClipboardFiles();
         break;
     }
     return true;

@@ -39,4 +39,10 @@ private:
 // nothing when there are several; nullptr when there is none.
 HWND FindRunDialog(DWORD threadId);
 
+// Ends the loops that run inside the call on top of the run dialog's, so that a posted cancel is seen: an
+// open menu is cancelled, and each other visible dialog of the thread (a message box, the shell's
+// confirmation, a file dialog, a property sheet) is answered with Cancel, else No, else OK. Callable from
+// any thread. Returns how many it asked to end.
+int EndNestedLoops(DWORD threadId);
+
 } // namespace devhost

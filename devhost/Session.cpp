@@ -77,12 +77,18 @@ WPARAM g_postValue = 0;
 bool g_posted = false;
 
 void CALLBACK PostTimer(HWND, UINT, UINT_PTR timer, DWORD) {
-    if (g_posted)
+    if (g_posted) {
+        // The call is still running after the post: a menu, a message box or a shell dialog runs its own
+        // loop on top of the run dialog's. End them; the timer stays until the call returns.
+        const int ended = EndNestedLoops(GetCurrentThreadId());
+        if (ended && Host().options.verbose)
+            WriteLine(L"[host] ended " + std::to_wstring(ended) + L" nested loop(s)");
         return;
+    }
     if (HWND dialog = FindRunDialog(GetCurrentThreadId())) {
         PostMessageW(dialog, WM_ORVEX_RESULT, g_postValue, 0);
         g_posted = true;
-        KillTimer(nullptr, timer);
+        SetTimer(nullptr, timer, kPostRetryMs, &PostTimer); // now watching for nested loops
         if (Host().options.verbose)
             WriteLine(g_postValue == kAppAccept ? L"[host] posted accept" : L"[host] posted cancel");
         return;

@@ -3,6 +3,8 @@
 
 #include "afxwin.h"
 
+#include <commdlg.h>
+
 #include <string>
 
 class CFileDialog {
