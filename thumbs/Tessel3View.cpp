@@ -240,10 +240,7 @@ bool CTessel3View::ClipboardHoldsDrawings() const {
 }
 
 bool CTessel3View::AnySelected() const {
-    for (int i = 0; i < DwgList.GetSize(); ++i)
-        if (DwgList[i].IsSelected())
-            return true;
-    return false;
+    return ::AnySelected();
 }
 
 void CTessel3View::CopySelection(bool cut) {

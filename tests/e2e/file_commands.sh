@@ -1,0 +1,127 @@
+#!/usr/bin/env bash
+# The file commands as a person uses them: drawings copied in one folder and pasted in another, a cut that
+# moves, a delete that goes to the trash, renames in the label that are taken or refused; the clipboard's
+# list read by the system as another program would, and a wide list from another program that offers no
+# Paste. Real input through devhost's script; after every call the host must take input again.
+. "$(dirname "$0")/lib.sh"
+
+# Wine's trash is the desktop's (XDG): this test's own. Wine's services read it when they start, so the
+# test waits for the Wine of an earlier test to end before its first Windows program.
+export XDG_DATA_HOME="$WORK/xdg"
+mkdir -p "$XDG_DATA_HOME"
+WINEPREFIX="${WINEPREFIX:-$ROOT/build/wineprefix}" "$(command -v wineserver || echo /usr/lib/wine/wineserver)" -w \
+  2>/dev/null || true
+
+root="$WORK/orvexfiles"
+samples="$ROOT/../shared/dwg-samples"
+mkdir -p "$root/a" "$root/b"
+if [ -f "$samples/MANIFEST.csv" ]; then
+  cp "$samples/2000/Arc.dwg" "$root/a/arc.dwg"
+  cp "$samples/2004/Cone.dwg" "$root/a/cone.dwg" 2>/dev/null || cp "$samples/2000/Cone.dwg" "$root/a/cone.dwg"
+  cp "$samples/2007/Donut.dwg" "$root/a/donut.dwg" 2>/dev/null || cp "$samples/2000/Donut.dwg" "$root/a/donut.dwg"
+  cp "$samples/2010/Helix.dwg" "$root/b/helix.dwg" 2>/dev/null || cp "$samples/2000/Arc.dwg" "$root/b/helix.dwg"
+else
+  echo "note: ../shared/dwg-samples is absent; synthetic drawings stand in for the real ones"
+  gen_dwg "$WORK/gen" 4 --variant 3
+  set -- "$WORK/gen"/*
+  mv "$1" "$root/a/arc.dwg"; mv "$2" "$root/a/cone.dwg"; mv "$3" "$root/a/donut.dwg"; mv "$4" "$root/b/helix.dwg"
+fi
+echo "notes" >"$root/a/notes.txt"
+
+tree='class=SysTreeView32'
+frame='contains="orvexfiles" nth=0'
+script() { printf '%s\n' "$@" >"$WORK/script.txt"; }
+run() { devhost --script "$(winpath "$WORK/script.txt")" --eval "$1"; }
+call_at() { printf '(Orvex 1 2 "%s\\\\" "Insert" "Close")' "$(lisppath "$1")"; }
+labels() { printf '%s\n' "$OUT" | sed -n 's/^\[script\] count //p' | tr '\n' ' ' | sed 's/ $//'; }
+shot() { printf 'screenshot %s %s' "$frame" "$(winpath "$WORK/$1.png")"; }
+ini_value() { tr -d '\r' <"$WORK/lib/Orvex1.ini" 2>/dev/null | sed -n "s/^$1=//p"; }
+has() { printf '%s\n' "$1" | grep -q -- "$2"; }
+on_disk() { (cd "$1" && ls | tr '\n' ' ' | sed 's/ $//'); }
+
+# 0. Where the tree shows the two folders: the label path of a, from the explorer's own settings.
+script 'wait contains="arc.dwg" timeout=30000' 'key escape'
+run "$(call_at "$root/a")"
+a_path=$(ini_value ShellPath)
+b_path="${a_path%\\*}\\b"
+expect_true "the explorer opened folder a (label path $a_path)" [ "${a_path##*\\}" == "a" ]
+
+# 1. Copy two drawings of a (click, Ctrl+click, Ctrl+C), select b in the tree, Ctrl+V.
+script 'wait contains="arc.dwg" timeout=30000' \
+       'click class=Edit text="arc.dwg" at=60,-50' 'click class=Edit text="donut.dwg" at=60,-50 with=ctrl' \
+       'key ctrl+c' 'clipboard-files' \
+       "tree-select $tree path=\"$b_path\"" 'wait contains="helix.dwg" timeout=10000' \
+       'click class=Edit text="helix.dwg" at=60,-50' 'key ctrl+v' \
+       'wait class=Edit text="arc.dwg" timeout=10000' 'sleep 300' \
+       'count class=Edit contains=".dwg"' "$(shot pasted)" 'key escape'
+run "$(call_at "$root/a")"
+expect_line "Ctrl+C put the two selected drawings on the clipboard, ANSI" "[script] clipboard-files 2 ansi"
+expect_true "as full paths, in the grid's order" has "$OUT" \
+  "clipboard-file $(winpath "$root/a/arc.dwg" | sed 's/\\/\\\\\\\\/g')$"
+expect_true "the second one too" has "$OUT" "clipboard-file $(winpath "$root/a/donut.dwg" | sed 's/\\/\\\\\\\\/g')$"
+expect_true "Ctrl+V in b copied both there (b holds: $(on_disk "$root/b"))" [ "$(on_disk "$root/b")" == "arc.dwg donut.dwg helix.dwg" ]
+expect_true "and left a as it was ($(on_disk "$root/a"))" [ "$(on_disk "$root/a")" == "arc.dwg cone.dwg donut.dwg notes.txt" ]
+expect_true "the copies are the same files" cmp -s "$root/a/arc.dwg" "$root/b/arc.dwg"
+expect_line "the grid of b shows the three drawings" "[script] count 3"
+
+# 2. Cut and paste moves: helix from b to a (Ctrl+X, then Ctrl+V in a); b's grid follows too.
+script 'wait contains="helix.dwg" timeout=30000' \
+       'click class=Edit text="helix.dwg" at=60,-50' 'key ctrl+x' 'clipboard-files' \
+       "tree-select $tree path=\"$a_path\"" 'wait contains="cone.dwg" timeout=10000' \
+       'click class=Edit text="cone.dwg" at=60,-50' 'key ctrl+v' \
+       'wait class=Edit text="helix.dwg" timeout=10000' 'sleep 300' 'count class=Edit contains=".dwg"' \
+       'clipboard-files' \
+       "tree-select $tree path=\"$b_path\"" 'wait contains="arc.dwg" timeout=10000' 'sleep 300' \
+       'count class=Edit contains=".dwg"' 'key escape'
+run "$(call_at "$root/b")"
+expect_true "Ctrl+X put helix on the clipboard" has "$OUT" 'clipboard-file .*\\\\b\\\\helix.dwg$'
+expect_true "Ctrl+V in a moved it: gone from b ($(on_disk "$root/b"))" [ "$(on_disk "$root/b")" == "arc.dwg donut.dwg" ]
+expect_true "and in a ($(on_disk "$root/a"))" [ "$(on_disk "$root/a")" == "arc.dwg cone.dwg donut.dwg helix.dwg notes.txt" ]
+expect_true "the grids show it: a 4, then b 2 (got $(labels))" [ "$(labels)" == "4 2" ]
+expect_line "after the move the clipboard's list is gone" "[script] clipboard-files none"
+
+# 3. Delete from the thumbnail's menu: the shell asks, the file goes to the trash and leaves the grid.
+cp "$root/a/cone.dwg" "$WORK/cone.orig"
+script 'wait contains="cone.dwg" timeout=30000' \
+       'right-click class=Edit text="cone.dwg" at=60,-50' 'sleep 300' 'key d' \
+       'wait class=#32770 text="Confirm file deletion" timeout=10000' \
+       "screenshot class=#32770 text=\"Confirm file deletion\" $(winpath "$WORK/delete-confirm.png")" \
+       'click class=#32770 text="Confirm file deletion" > class=Button text="&Yes"' \
+       'gone class=Edit text="cone.dwg" timeout=10000' 'sleep 300' 'count class=Edit contains=".dwg"' 'key escape'
+run "$(call_at "$root/a")"
+expect_true "the delete is gone from a ($(on_disk "$root/a"))" [ "$(on_disk "$root/a")" == "arc.dwg donut.dwg helix.dwg notes.txt" ]
+expect_line "and from the grid" "[script] count 3"
+trashed="$XDG_DATA_HOME/Trash/files/cone.dwg"
+expect_true "it is in the trash" [ -f "$trashed" ]
+expect_true "the trash knows where it came from" grep -q "^Path=.*orvexfiles/a/cone.dwg$" "$XDG_DATA_HOME/Trash/info/cone.dwg.trashinfo"
+mv "$trashed" "$root/a/cone.dwg" 2>/dev/null
+expect_true "brought back, it is the same file" cmp -s "$WORK/cone.orig" "$root/a/cone.dwg"
+
+box='class=#32770 text="Drawing explorer"'
+# 4. Rename in the label: from the menu to a new name; by a double click on the label to a name that is
+# taken (refused with a message, the old name back, both files intact); to ..\x.dwg (refused).
+script 'wait contains="cone.dwg" timeout=30000' \
+       'right-click class=Edit text="cone.dwg" at=60,-50' 'sleep 300' 'key r' \
+       'type "cylinder.dwg"' 'key enter' 'wait class=Edit text="cylinder.dwg" timeout=10000' 'sleep 300' \
+       'double-click class=Edit text="donut.dwg"' 'type "arc.dwg"' 'key enter' \
+       "wait $box timeout=10000" "text $box > class=Static contains=\"Cannot\"" \
+       "screenshot $box $(winpath "$WORK/rename-refused.png")" \
+       "click $box > class=Button text=OK" 'sleep 300' 'exists class=Edit text="donut.dwg"' \
+       'double-click class=Edit text="helix.dwg"' 'type "..\\x.dwg"' 'key enter' \
+       "wait $box timeout=10000" "text $box > class=Static contains=\"Cannot\"" \
+       "click $box > class=Button text=OK" 'sleep 300' 'exists class=Edit text="helix.dwg"' \
+       'count class=Edit contains=".dwg"' 'key escape'
+run "$(call_at "$root/a")"
+expect_true "the rename to a new name renamed the file ($(on_disk "$root/a"))" \
+  [ "$(on_disk "$root/a")" == "arc.dwg cylinder.dwg donut.dwg helix.dwg notes.txt" ]
+expect_line "a taken name is refused with a message" \
+  '[script] text Cannot rename to "arc.dwg": a file of that name already exists.'
+expect_true "both files intact" cmp -s "$root/b/arc.dwg" "$root/a/arc.dwg"
+expect_true "the donut too" cmp -s "$root/b/donut.dwg" "$root/a/donut.dwg"
+expect_true "..\\x.dwg is refused" has "$OUT" '^\[script\] text Cannot rename to "\.\.\\\\x\.dwg": a name cannot contain'
+expect_true "nothing left the folder" [ ! -e "$root/x.dwg" ]
+expect_true "the old labels came back (got $(printf '%s\n' "$OUT" | grep -c '^\[script\] exists yes'))" \
+  [ "$(printf '%s\n' "$OUT" | grep -c '^\[script\] exists yes')" -eq 2 ]
+expect_line "the grid still shows four drawings" "[script] count 4"
+
+finish
