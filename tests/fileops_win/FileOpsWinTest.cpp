@@ -61,10 +61,20 @@ std::string ReadFile(const std::string& path) {
     return out.str();
 }
 
+// The probe program lies beside the test program.
+std::string Probe() {
+    char path[MAX_PATH] = "";
+    ::GetModuleFileNameA(nullptr, path, MAX_PATH);
+    std::string folder(path);
+    folder.erase(folder.find_last_of('\\') + 1);
+    return "\"" + folder + CLIPBOARD_PROBE + "\"";
+}
+
 // Runs a program and returns its standard output.
 std::string RunProgram(const std::string& commandLine) {
     std::string output;
-    FILE* pipe = ::_popen(commandLine.c_str(), "r");
+    // cmd /c keeps the inner quotes only when the whole line is quoted once more.
+    FILE* pipe = ::_popen(("\"" + commandLine + "\"").c_str(), "r");
     if (!pipe)
         return output;
     char buffer[512];
@@ -250,7 +260,7 @@ TEST(Clipboard, TheExplorersListIsOneAnsiBlockInStepsOf4096) {
 
 TEST(Clipboard, AnotherProcessReadsTheListThroughDragQueryFileAAndW) {
     ASSERT_TRUE(PutFileListOnClipboard({"Z:\\orvex\\plan one.dwg", "Z:\\orvex\\notes.txt"}, false));
-    const std::string out = RunProgram(CLIPBOARD_PROBE " read");
+    const std::string out = RunProgram(Probe() + " read");
     EXPECT_EQ(out, "count-a 2\na Z:\\orvex\\plan one.dwg\na Z:\\orvex\\notes.txt\n"
                    "count-w 2\nw Z:\\orvex\\plan one.dwg\nw Z:\\orvex\\notes.txt\n");
 }
@@ -260,7 +270,7 @@ TEST(Clipboard, TheSystemsFileOperationPastesTheList) {
     const std::string a = folder.Write("a.dwg", "drawing"), b = folder.Write("b.txt", "text");
     const std::string target = folder.MakeDir("target");
     ASSERT_TRUE(PutFileListOnClipboard({a, b}, false));
-    const std::string out = RunProgram(CLIPBOARD_PROBE " paste \"" + target + "\"");
+    const std::string out = RunProgram(Probe() + " paste \"" + target + "\"");
     EXPECT_EQ(out, "pasted 2 result 0\n");
     EXPECT_EQ(ReadFile(target + "\\a.dwg"), "drawing");
     EXPECT_EQ(ReadFile(target + "\\b.txt"), "text");
@@ -286,7 +296,7 @@ TEST(Clipboard, AWideListFromAnotherProgramOffersNoPasteAndPastesNothing) {
     TempFolder folder("orvex-wide");
     const std::string a = folder.Write("a.dwg", "drawing");
     const std::string target = folder.MakeDir("target");
-    const std::string out = RunProgram(CLIPBOARD_PROBE " put-wide \"" + a + "\"");
+    const std::string out = RunProgram(Probe() + " put-wide \"" + a + "\"");
     ASSERT_EQ(out, "put-wide 1 ok\n");
     ForFileCommands commands;
     EXPECT_FALSE(commands.ClipboardHoldsDrawings());
@@ -429,11 +439,10 @@ struct SaveDialogDriver {
         ::GetWindowTextA(hwnd, title, sizeof title);
         s_titles.emplace_back(title);
         if (std::strcmp(title, kCopyFileTitle) == 0) {
-            // The file name field (edt1, or the combo box's edit cmb13).
+            // The file name field: edt1, or the combo box cmb13 of the explorer-style dialog.
             HWND edit = ::GetDlgItem(hwnd, 0x480);
             if (!edit)
-                if (HWND combo = ::GetDlgItem(hwnd, 0x47c))
-                    edit = ::FindWindowExA(combo, nullptr, "Edit", nullptr);
+                edit = ::GetDlgItem(hwnd, 0x47c);
             if (edit)
                 ::SetWindowTextA(edit, s_name.c_str());
             ::PostMessageA(hwnd, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED), 0);
