@@ -742,12 +742,15 @@ void ScriptRunner::Run() {
             WriteLine(L"[script] error: line " + std::to_wstring(command.line) + L": " +
                       EscapeControls(error.message));
             // Do not leave the LISP call waiting for input that will not come.
-            if (HWND dialog = FindRunDialog(m_uiThreadId))
-                PostMessageW(dialog, WM_ORVEX_RESULT, kAppCancel, 0);
-            // A menu or a box left open by the failed step would hold the call: end them until it returns.
-            for (int round = 0; round < 100 && CallsPending() > 0; ++round) {
-                EndNestedLoops(m_uiThreadId);
-                Sleep(kPollMs);
+            // A menu or a box left open by the failed step would take the message and hold the call: end
+            // them first, then post, until the call has returned.
+            for (int round = 0; round < 200; ++round) {
+                if (EndNestedLoops(m_uiThreadId) == 0)
+                    if (HWND dialog = FindRunDialog(m_uiThreadId))
+                        PostMessageW(dialog, WM_ORVEX_RESULT, kAppCancel, 0);
+                Sleep(kPollMs * 4);
+                if (CallsPending() == 0)
+                    break;
             }
             return;
         }

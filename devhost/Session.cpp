@@ -24,6 +24,7 @@ namespace {
 int g_applicationIdentity;
 
 constexpr UINT_PTR kPostRetryMs = 50;
+constexpr UINT_PTR kRepostMs = 500;
 
 std::wstring SystemMessage(DWORD code) {
     wchar_t* buffer = nullptr;
@@ -77,20 +78,22 @@ WPARAM g_postValue = 0;
 bool g_posted = false;
 
 void CALLBACK PostTimer(HWND, UINT, UINT_PTR timer, DWORD) {
-    if (g_posted) {
-        // The call is still running after the post: a menu, a message box or a shell dialog runs its own
-        // loop on top of the run dialog's. End them; the timer stays until the call returns.
-        const int ended = EndNestedLoops(GetCurrentThreadId());
-        if (ended && Host().options.verbose)
+    // A menu, a message box or a shell dialog running its own loop on top of the run dialog's would take
+    // the posted message and drop it: end those first, and post once only the run dialog's loop is left.
+    const int ended = EndNestedLoops(GetCurrentThreadId());
+    if (ended) {
+        if (Host().options.verbose)
             WriteLine(L"[host] ended " + std::to_wstring(ended) + L" nested loop(s)");
+        SetTimer(nullptr, timer, kPostRetryMs, &PostTimer);
         return;
     }
     if (HWND dialog = FindRunDialog(GetCurrentThreadId())) {
         PostMessageW(dialog, WM_ORVEX_RESULT, g_postValue, 0);
-        g_posted = true;
-        SetTimer(nullptr, timer, kPostRetryMs, &PostTimer); // now watching for nested loops
-        if (Host().options.verbose)
+        if (!g_posted && Host().options.verbose)
             WriteLine(g_postValue == kAppAccept ? L"[host] posted accept" : L"[host] posted cancel");
+        g_posted = true;
+        // Posted again while the call runs: a loop that began meanwhile may have taken it.
+        SetTimer(nullptr, timer, kRepostMs, &PostTimer);
         return;
     }
     SetTimer(nullptr, timer, kPostRetryMs, &PostTimer); // not there yet: look again shortly

@@ -281,8 +281,8 @@ int CTessel3View::RunContextMenu(POINT screenPoint) {
         return 0;
     const UINT selection = AnySelected() ? MF_ENABLED : MF_GRAYED;
     menu.AppendMenu(MF_STRING | selection, kGridMenuCopy, "&Copy");
-    menu.AppendMenu(MF_STRING | (ClipboardHoldsDrawings() ? MF_ENABLED : MF_GRAYED), kGridMenuPaste, "&Paste");
     menu.AppendMenu(MF_STRING | selection, kGridMenuDelete, "&Delete");
+    menu.AppendMenu(MF_STRING | (ClipboardHoldsDrawings() ? MF_ENABLED : MF_GRAYED), kGridMenuPaste, "&Paste");
     menu.AppendMenu(MF_STRING | MF_GRAYED, kGridMenuRename, "&Rename");
     const int command = menu.TrackPopupMenu(TPM_RIGHTBUTTON | TPM_NONOTIFY | TPM_RETURNCMD, screenPoint.x,
                                             screenPoint.y, m_hWnd);

@@ -89,8 +89,8 @@ public:
     // failed); 0 when the file was renamed.
     int RenameFile(const std::string& source, const std::string& destination);
     void ShowProperties(const std::string& path);
-    // The grid's own context menu at a screen point: "&Copy" 1, "&Paste" 2, "&Delete" 3, "&Rename" 4
-    // (always greyed). Returns the number chosen (0 when dismissed) after running it.
+    // The grid's own context menu at a screen point: "&Copy" 1, "&Delete" 3, "&Paste" 2, "&Rename" 4
+    // (always greyed), in that order. Returns the number chosen (0 when dismissed) after running it.
     int RunContextMenu(POINT screenPoint);
 
     // The search edit's search as you type: finds the first drawing whose name starts with text (case

@@ -14,7 +14,7 @@ WINEPREFIX="${WINEPREFIX:-$ROOT/build/wineprefix}" "$(command -v wineserver || e
 
 root="$WORK/orvexfiles"
 samples="$ROOT/../shared/dwg-samples"
-mkdir -p "$root/a" "$root/b"
+mkdir -p "$root/a" "$root/b" "$root/c" "$root/d"
 if [ -f "$samples/MANIFEST.csv" ]; then
   cp "$samples/2000/Arc.dwg" "$root/a/arc.dwg"
   cp "$samples/2004/Cone.dwg" "$root/a/cone.dwg" 2>/dev/null || cp "$samples/2000/Cone.dwg" "$root/a/cone.dwg"
@@ -44,6 +44,7 @@ script 'wait contains="arc.dwg" timeout=30000' 'key escape'
 run "$(call_at "$root/a")"
 a_path=$(ini_value ShellPath)
 b_path="${a_path%\\*}\\b"
+c_path="${a_path%\\*}\\c"
 expect_true "the explorer opened folder a (label path $a_path)" [ "${a_path##*\\}" == "a" ]
 
 # 1. Copy two drawings of a (click, Ctrl+click, Ctrl+C), select b in the tree, Ctrl+V.
@@ -123,5 +124,55 @@ expect_true "nothing left the folder" [ ! -e "$root/x.dwg" ]
 expect_true "the old labels came back (got $(printf '%s\n' "$OUT" | grep -c '^\[script\] exists yes'))" \
   [ "$(printf '%s\n' "$OUT" | grep -c '^\[script\] exists yes')" -eq 2 ]
 expect_line "the grid still shows four drawings" "[script] count 4"
+
+# 5. The grid's own menu: in the empty folder c a right click on the background offers Paste (the
+# clipboard holds a drawing); "p" pastes. Rename is always greyed there (see the screenshot).
+grid='id=59649'
+script 'wait contains="arc.dwg" timeout=30000' \
+       'click class=Edit text="arc.dwg" at=60,-50' 'key ctrl+c' \
+       "tree-select $tree path=\"$c_path\"" 'sleep 500' 'count class=Edit contains=".dwg"' \
+       "right-click $grid at=300,200" 'sleep 300' "screenshot class=#32768 $(winpath "$WORK/grid-menu.png")" 'key p' \
+       'wait class=Edit text="arc.dwg" timeout=10000' 'sleep 300' 'count class=Edit contains=".dwg"' 'key escape'
+run "$(call_at "$root/a")"
+expect_true "the background menu's Paste put arc in c ($(on_disk "$root/c"))" [ "$(on_disk "$root/c")" == "arc.dwg" ]
+expect_true "the grid of c: empty, then one drawing (got $(labels))" [ "$(labels)" == "0 1" ]
+
+# 6. Another program reads the list the explorer left on the clipboard, after the library is unloaded:
+# through the system's DragQueryFileA and DragQueryFileW, and pastes it with the system's file operation.
+probe() { "$WINE_RUN" "$CLIPBOARD_PROBE" "$@" 2>/dev/null | tr -d '\r'; }
+arc_win=$(winpath "$root/a/arc.dwg")
+expect_true "DragQueryFileA and W in another process read the explorer's list" \
+  [ "$(probe read)" == "$(printf 'count-a 1\na %s\ncount-w 1\nw %s' "$arc_win" "$arc_win")" ]
+expect_true "the clipboard holds the file list and nothing of the library (formats: $(probe formats | tr '\n' ' '))" \
+  has "$(probe formats)" '^format 15$'
+probe paste "$(winpath "$root/d")" >/dev/null
+expect_true "the system's file operation pastes it ($(on_disk "$root/d"))" cmp -s "$root/a/arc.dwg" "$root/d/arc.dwg"
+
+# 7. A wide list from another program: Paste is greyed in both menus (the screenshot; Wine closes a menu on
+# the key of a greyed entry, choosing nothing) and neither "p" there nor Ctrl+V pastes anything.
+rm -f "$root/c/arc.dwg"; cp "$root/a/donut.dwg" "$root/c/donut.dwg"
+script 'wait contains="donut.dwg" timeout=30000' \
+       "clipboard-put wide \"$(winpath "$root/a/helix.dwg")\"" 'clipboard-files' \
+       'right-click class=Edit text="donut.dwg" at=60,-50' 'sleep 300' \
+       "screenshot class=#32768 $(winpath "$WORK/thumb-menu-wide.png")" 'key p' 'sleep 500' \
+       "right-click $grid at=500,300" 'sleep 300' 'key p' 'sleep 500' \
+       'click class=Edit text="donut.dwg" at=60,-50' 'key ctrl+v' 'sleep 1000' \
+       'count class=Edit contains=".dwg"' 'key escape'
+run "$(call_at "$root/c")"
+expect_line "the other program's list is wide" "[script] clipboard-files 1 wide"
+expect_true "neither menu nor Ctrl+V pasted anything ($(on_disk "$root/c"))" [ "$(on_disk "$root/c")" == "donut.dwg" ]
+expect_line "the grid still shows the one drawing" "[script] count 1"
+
+# 8. The host's timer still ends a call while a menu or a message box runs its own loop.
+script 'wait contains="donut.dwg" timeout=30000' 'right-click class=Edit text="donut.dwg" at=60,-50' 'sleep 300' \
+       'exists class=#32768' 'sleep 6000' 'exists class=#32768'
+devhost --after-ms 4000 --post cancel --script "$(winpath "$WORK/script.txt")" --eval "$(call_at "$root/c")"
+expect_line "--after-ms ends the call while the thumbnail's menu is open" "=> nil"
+expect_true "the menu was open, then gone" [ "$(printf '%s\n' "$OUT" | grep '^\[script\] exists' | tr '\n' ' ')" == "[script] exists yes [script] exists no " ]
+script 'wait contains="donut.dwg" timeout=30000' 'double-click class=Edit text="donut.dwg"' 'type "notes.txt"' 'key enter' \
+       "wait $box timeout=10000" 'sleep 6000' "exists $box"
+devhost --after-ms 4000 --post cancel --script "$(winpath "$WORK/script.txt")" --eval "$(call_at "$root/c")"
+expect_line "--after-ms ends the call while a message box is open" "=> nil"
+expect_line "and the box is gone" "[script] exists no"
 
 finish
