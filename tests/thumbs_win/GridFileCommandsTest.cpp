@@ -1,0 +1,157 @@
+// The file commands as the grid offers them: its own context menu (what is greyed when, what each entry
+// runs), the thumbnail menu's entries, the frame's copy, cut and paste commands, and the refresh after a
+// change. The file operations themselves are the owner's (the handlers); fileops_win_tests test them.
+#include "GridTestSupport.h"
+
+#include "res/resource.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+namespace {
+
+// What the handlers were asked.
+struct FileCalls {
+    std::vector<std::string> calls;
+    bool holdsDrawings = false;
+    bool pasteSucceeds = true;
+    int refreshes = 0;
+};
+
+void Wire(CTessel3View& view, FileCalls& record) {
+    view.onClipboardHoldsDrawings = [&record] { return record.holdsDrawings; };
+    view.onCopySelection = [&record](bool cut) { record.calls.push_back(cut ? "cut" : "copy"); };
+    view.onPaste = [&record] {
+        record.calls.push_back("paste");
+        return record.pasteSucceeds;
+    };
+    view.onDeleteSelection = [&record] { record.calls.push_back("delete"); };
+    view.onShowProperties = [&record](const std::string& path) { record.calls.push_back("properties " + path); };
+    view.onRefreshFolder = [&record] {
+        ++record.refreshes;
+        return true;
+    };
+}
+
+// The states of the grid's menu while it is open, read through the menu window; then the entry with this
+// number is chosen (0: dismissed).
+struct MenuProbe {
+    static std::vector<std::string> s_items; // "text:state" in menu order
+    static UINT s_choose;
+    static void CALLBACK Tick(HWND, UINT, UINT_PTR timer, DWORD) {
+        HWND menuWindow = ::FindWindowA("#32768", nullptr);
+        if (!menuWindow || !::IsWindowVisible(menuWindow))
+            return;
+        ::KillTimer(nullptr, timer);
+        auto menu = reinterpret_cast<HMENU>(::SendMessageA(menuWindow, MN_GETHMENU, 0, 0));
+        s_items.clear();
+        for (int i = 0; menu && i < ::GetMenuItemCount(menu); ++i) {
+            char text[64] = "";
+            ::GetMenuStringA(menu, static_cast<UINT>(i), text, sizeof text, MF_BYPOSITION);
+            const UINT state = ::GetMenuState(menu, static_cast<UINT>(i), MF_BYPOSITION);
+            s_items.push_back(std::string(text) + ":" + std::to_string(::GetMenuItemID(menu, i)) +
+                              ((state & MF_GRAYED) ? ":grey" : ":on"));
+        }
+        if (s_choose) {
+            // The entry's key, as a person would press it.
+            ::PostMessageA(menuWindow, WM_KEYDOWN, s_choose, 0);
+            ::PostMessageA(menuWindow, WM_CHAR, s_choose + ('a' - 'A'), 0);
+        } else {
+            ::EndMenu();
+        }
+    }
+};
+std::vector<std::string> MenuProbe::s_items;
+UINT MenuProbe::s_choose = 0;
+
+int OpenGridMenu(CTessel3View& view, UINT chooseKey) {
+    MenuProbe::s_choose = chooseKey;
+    MenuProbe::s_items.clear();
+    const UINT_PTR timer = ::SetTimer(nullptr, 0, 100, &MenuProbe::Tick);
+    POINT at{300, 300};
+    ::ClientToScreen(view.m_hWnd, &at);
+    const int chosen = view.RunContextMenu(at);
+    ::KillTimer(nullptr, timer);
+    Pump();
+    return chosen;
+}
+
+} // namespace
+
+TEST(GridFileMenu, NothingSelectedAndNoDrawingsOnTheClipboardGreysAll) {
+    GridBench bench;
+    FileCalls record;
+    Wire(bench.view(), record);
+    FillList(3);
+    bench.view().Rebuild();
+    Pump();
+    EXPECT_EQ(OpenGridMenu(bench.view(), 0), 0);
+    EXPECT_EQ(MenuProbe::s_items,
+              (std::vector<std::string>{"&Copy:1:grey", "&Delete:3:grey", "&Paste:2:grey", "&Rename:4:grey"}));
+    EXPECT_TRUE(record.calls.empty());
+}
+
+TEST(GridFileMenu, ASelectionAndDrawingsOnTheClipboardEnableAllButRename) {
+    GridBench bench;
+    FileCalls record;
+    Wire(bench.view(), record);
+    FillList(3);
+    DwgList[1].Select();
+    record.holdsDrawings = true;
+    bench.view().Rebuild();
+    Pump();
+    EXPECT_EQ(OpenGridMenu(bench.view(), 0), 0);
+    EXPECT_EQ(MenuProbe::s_items,
+              (std::vector<std::string>{"&Copy:1:on", "&Delete:3:on", "&Paste:2:on", "&Rename:4:grey"}));
+}
+
+TEST(GridFileMenu, EachEntryRunsItsCommandAndChangesRefresh) {
+    GridBench bench;
+    FileCalls record;
+    Wire(bench.view(), record);
+    FillList(3);
+    DwgList[0].Select();
+    record.holdsDrawings = true;
+    bench.view().Rebuild();
+    Pump();
+    EXPECT_EQ(OpenGridMenu(bench.view(), 'C'), 1);
+    EXPECT_EQ(record.refreshes, 0) << "a copy changes no folder";
+    DwgList[0].Select(); // the rescans of the bench keep no selection
+    EXPECT_EQ(OpenGridMenu(bench.view(), 'P'), 2);
+    EXPECT_EQ(record.refreshes, 1);
+    DwgList[0].Select();
+    EXPECT_EQ(OpenGridMenu(bench.view(), 'D'), 3);
+    EXPECT_EQ(record.refreshes, 2);
+    EXPECT_EQ(record.calls, (std::vector<std::string>{"copy", "paste", "delete"}));
+    // A paste that did nothing leaves the folder as it was.
+    record.pasteSucceeds = false;
+    EXPECT_EQ(OpenGridMenu(bench.view(), 'P'), 2);
+    EXPECT_EQ(record.refreshes, 2);
+}
+
+TEST(GridFileMenu, TheFramesCopyCutAndPasteReachTheFileCommands) {
+    GridBench bench;
+    FileCalls record;
+    Wire(bench.view(), record);
+    FillList(2);
+    bench.view().Rebuild();
+    Pump();
+    bench.view().SendMessage(WM_COMMAND, ID_EDIT_COPY);
+    bench.view().SendMessage(WM_COMMAND, ID_EDIT_CUT);
+    bench.view().SendMessage(WM_COMMAND, ID_EDIT_PASTE);
+    Pump();
+    EXPECT_EQ(record.calls, (std::vector<std::string>{"copy", "cut", "paste"}));
+    EXPECT_EQ(record.refreshes, 1);
+}
+
+TEST(GridFileMenu, ThumbnailMenuGreysPasteUnlessTheClipboardHoldsDrawings) {
+    CMenu menu;
+    CMenu popup = BuildThumbnailMenu(menu, 0, false);
+    ASSERT_NE(popup.m_hMenu, nullptr);
+    EXPECT_TRUE(popup.GetMenuState(ID_THUMB_PASTE, MF_BYCOMMAND) & MF_GRAYED);
+    CMenu menu2;
+    CMenu popup2 = BuildThumbnailMenu(menu2, 0, true);
+    EXPECT_FALSE(popup2.GetMenuState(ID_THUMB_PASTE, MF_BYCOMMAND) & MF_GRAYED);
+}
