@@ -551,7 +551,8 @@ public:
                 Sleep(20);
         }
         if (!m_open)
-            throw ScriptError{L"the clipboard cannot be opened (error " + std::to_wstring(GetLastError()) + L")"};
+            throw ScriptError{L"the clipboard cannot be opened (error " + std::to_wstring(GetLastError()) +
+                              L")"};
     }
     ~OpenedClipboard() { CloseClipboard(); }
     OpenedClipboard(const OpenedClipboard&) = delete;

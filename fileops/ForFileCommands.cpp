@@ -125,7 +125,8 @@ bool ForFileCommands::PasteIntoCurrentFolder(HWND owner) const {
     return result == 0;
 }
 
-int ForFileCommands::RenameFile(const std::string& source, const std::string& destination, CEdit* label) const {
+int ForFileCommands::RenameFile(const std::string& source, const std::string& destination,
+                                CEdit* label) const {
     CShellFileOp op;
     op.AddName(CShellFileOp::kSource, source);
     op.AddName(CShellFileOp::kDestination, destination);

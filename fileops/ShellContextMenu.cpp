@@ -133,8 +133,8 @@ bool CShellContextMenu::ShowHelpText(UINT item, UINT flags, HMENU menu) {
     const UINT_PTR command = id - m_firstId;
     std::string text;
     wchar_t wide[260] = L"";
-    if (SUCCEEDED(m_pMenu->GetCommandString(command, GCS_HELPTEXTW, nullptr, reinterpret_cast<char*>(wide),
-                                            260)) &&
+    if (SUCCEEDED(
+            m_pMenu->GetCommandString(command, GCS_HELPTEXTW, nullptr, reinterpret_cast<char*>(wide), 260)) &&
         wide[0]) {
         char narrow[520] = "";
         ::WideCharToMultiByte(CP_ACP, 0, wide, -1, narrow, sizeof narrow, nullptr, nullptr);

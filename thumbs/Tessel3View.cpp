@@ -266,7 +266,8 @@ int CTessel3View::RenameFile(const std::string& source, const std::string& desti
     if (::MoveFileA(source.c_str(), destination.c_str()))
         return 0;
     const DWORD error = ::GetLastError();
-    TellUser("Cannot rename \"" + source + "\" to \"" + destination + "\" (error " + std::to_string(error) + ").");
+    TellUser("Cannot rename \"" + source + "\" to \"" + destination + "\" (error " + std::to_string(error) +
+             ").");
     return static_cast<int>(error ? error : 1);
 }
 
@@ -282,7 +283,8 @@ int CTessel3View::RunContextMenu(POINT screenPoint) {
     const UINT selection = AnySelected() ? MF_ENABLED : MF_GRAYED;
     menu.AppendMenu(MF_STRING | selection, kGridMenuCopy, "&Copy");
     menu.AppendMenu(MF_STRING | selection, kGridMenuDelete, "&Delete");
-    menu.AppendMenu(MF_STRING | (ClipboardHoldsDrawings() ? MF_ENABLED : MF_GRAYED), kGridMenuPaste, "&Paste");
+    menu.AppendMenu(MF_STRING | (ClipboardHoldsDrawings() ? MF_ENABLED : MF_GRAYED), kGridMenuPaste,
+                    "&Paste");
     menu.AppendMenu(MF_STRING | MF_GRAYED, kGridMenuRename, "&Rename");
     const int command = menu.TrackPopupMenu(TPM_RIGHTBUTTON | TPM_NONOTIFY | TPM_RETURNCMD, screenPoint.x,
                                             screenPoint.y, m_hWnd);

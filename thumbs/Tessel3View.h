@@ -43,10 +43,10 @@ public:
     std::function<bool()> onRefreshFolder;
     // The file commands, carried out by the owner's file operations; the grid offers them in its menus
     // and keys. Each looks at the records' selection and the current folder itself.
-    std::function<bool()> onClipboardHoldsDrawings;       // whether Paste is offered
-    std::function<void(bool cut)> onCopySelection;        // the selected drawings onto the clipboard
-    std::function<bool()> onPaste;                        // true when files were pasted
-    std::function<void()> onDeleteSelection;              // to the Recycle Bin, the shell confirming
+    std::function<bool()> onClipboardHoldsDrawings; // whether Paste is offered
+    std::function<void(bool cut)> onCopySelection;  // the selected drawings onto the clipboard
+    std::function<bool()> onPaste;                  // true when files were pasted
+    std::function<void()> onDeleteSelection;        // to the Recycle Bin, the shell confirming
     // Renames a file (full paths); the shell's result, 0 when it was renamed.
     std::function<int(const std::string& source, const std::string& destination)> onRenameFile;
     std::function<void(const std::string& path)> onShowProperties; // the shell's property sheet

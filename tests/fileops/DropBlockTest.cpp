@@ -10,7 +10,8 @@
 namespace {
 
 std::uint32_t U32(const std::vector<unsigned char>& block, std::size_t at) {
-    return block[at] | block[at + 1] << 8 | block[at + 2] << 16 | static_cast<std::uint32_t>(block[at + 3]) << 24;
+    return block[at] | block[at + 1] << 8 | block[at + 2] << 16 |
+           static_cast<std::uint32_t>(block[at + 3]) << 24;
 }
 
 std::vector<unsigned char> Header(unsigned char offset) {

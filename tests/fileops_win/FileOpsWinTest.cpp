@@ -187,8 +187,8 @@ TEST(ShellFileOp, AllInOneConstructorRunsItsCode) {
                       FOF_NOCONFIRMATION | FOF_SILENT, "Copying");
     EXPECT_EQ(copy.Result(), 0);
     EXPECT_EQ(ReadFile(folder.File("c.dwg")), "A");
-    CShellFileOp rename(nullptr, CShellFileOp::kRename, folder.File("c.dwg").c_str(), folder.File("d.dwg").c_str(),
-                        0, nullptr);
+    CShellFileOp rename(nullptr, CShellFileOp::kRename, folder.File("c.dwg").c_str(),
+                        folder.File("d.dwg").c_str(), 0, nullptr);
     EXPECT_EQ(rename.Result(), 0);
     EXPECT_TRUE(folder.Exists("d.dwg"));
     EXPECT_FALSE(folder.Exists("c.dwg"));
@@ -245,7 +245,8 @@ TEST(Clipboard, TheExplorersListIsOneAnsiBlockInStepsOf4096) {
     const auto* drop = static_cast<const DROPFILES*>(::GlobalLock(block));
     EXPECT_EQ(drop->pFiles, 20u);
     EXPECT_EQ(drop->fWide, FALSE);
-    EXPECT_EQ(std::memcmp(reinterpret_cast<const char*>(drop) + 20, "C:\\dwg\\a.dwg\0C:\\dwg\\b.dwg\0\0", 27), 0);
+    EXPECT_EQ(std::memcmp(reinterpret_cast<const char*>(drop) + 20, "C:\\dwg\\a.dwg\0C:\\dwg\\b.dwg\0\0", 27),
+              0);
     ::GlobalUnlock(block);
     char name[MAX_PATH] = "";
     EXPECT_EQ(::DragQueryFileA(static_cast<HDROP>(block), 0xFFFFFFFF, nullptr, 0), 2u);
@@ -451,7 +452,9 @@ struct SaveDialogDriver {
         }
         return TRUE;
     }
-    static void CALLBACK Tick(HWND, UINT, UINT_PTR, DWORD) { ::EnumThreadWindows(::GetCurrentThreadId(), &Visit, 0); }
+    static void CALLBACK Tick(HWND, UINT, UINT_PTR, DWORD) {
+        ::EnumThreadWindows(::GetCurrentThreadId(), &Visit, 0);
+    }
 };
 std::string SaveDialogDriver::s_name;
 int SaveDialogDriver::s_answer = IDNO;
@@ -501,9 +504,11 @@ TEST(ShellContextMenu, GetsTheItemsMenuAndSubclassesItsOwner) {
     ASSERT_EQ(::SHGetDesktopFolder(&desktop), S_OK);
     PIDLIST_RELATIVE folderId = nullptr;
     std::wstring wideFolder = Wide(folder.Dir());
-    ASSERT_EQ(desktop->ParseDisplayName(nullptr, nullptr, wideFolder.data(), nullptr, &folderId, nullptr), S_OK);
+    ASSERT_EQ(desktop->ParseDisplayName(nullptr, nullptr, wideFolder.data(), nullptr, &folderId, nullptr),
+              S_OK);
     IShellFolder* parent = nullptr;
-    ASSERT_EQ(desktop->BindToObject(folderId, nullptr, IID_IShellFolder, reinterpret_cast<void**>(&parent)), S_OK);
+    ASSERT_EQ(desktop->BindToObject(folderId, nullptr, IID_IShellFolder, reinterpret_cast<void**>(&parent)),
+              S_OK);
     PIDLIST_RELATIVE item = nullptr;
     std::wstring name = L"a.dwg";
     ASSERT_EQ(parent->ParseDisplayName(nullptr, nullptr, name.data(), nullptr, &item, nullptr), S_OK);
@@ -516,7 +521,8 @@ TEST(ShellContextMenu, GetsTheItemsMenuAndSubclassesItsOwner) {
     EXPECT_GT(::GetMenuItemCount(popup), 0);
     ::DestroyMenu(popup);
 
-    HWND owner = ::CreateWindowExA(0, "STATIC", "owner", WS_POPUP, 0, 0, 10, 10, nullptr, nullptr, nullptr, nullptr);
+    HWND owner =
+        ::CreateWindowExA(0, "STATIC", "owner", WS_POPUP, 0, 0, 10, 10, nullptr, nullptr, nullptr, nullptr);
     const LONG_PTR before = ::GetWindowLongPtrA(owner, GWLP_WNDPROC);
     ASSERT_TRUE(menu.Attach(owner));
     EXPECT_EQ(::GetPropA(owner, "ShellContextMenu"), &menu);

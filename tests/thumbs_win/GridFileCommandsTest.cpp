@@ -28,7 +28,9 @@ void Wire(CTessel3View& view, FileCalls& record) {
         return record.pasteSucceeds;
     };
     view.onDeleteSelection = [&record] { record.calls.push_back("delete"); };
-    view.onShowProperties = [&record](const std::string& path) { record.calls.push_back("properties " + path); };
+    view.onShowProperties = [&record](const std::string& path) {
+        record.calls.push_back("properties " + path);
+    };
     view.onRefreshFolder = [&record] {
         ++record.refreshes;
         return true;
@@ -88,8 +90,8 @@ TEST(GridFileMenu, NothingSelectedAndNoDrawingsOnTheClipboardGreysAll) {
     bench.view().Rebuild();
     Pump();
     EXPECT_EQ(OpenGridMenu(bench.view(), 0), 0);
-    EXPECT_EQ(MenuProbe::s_items,
-              (std::vector<std::string>{"&Copy:1:grey", "&Delete:3:grey", "&Paste:2:grey", "&Rename:4:grey"}));
+    EXPECT_EQ(MenuProbe::s_items, (std::vector<std::string>{"&Copy:1:grey", "&Delete:3:grey", "&Paste:2:grey",
+                                                            "&Rename:4:grey"}));
     EXPECT_TRUE(record.calls.empty());
 }
 
