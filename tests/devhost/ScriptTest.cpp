@@ -153,3 +153,19 @@ TEST(Script, KeyNames) {
 }
 
 } // namespace
+
+TEST(Script, ClipboardCommands) {
+    const auto commands =
+        Read(L"clipboard-put ansi \"Z:\\\\a b\\\\x.dwg\" Z:\\y.txt\nclipboard-put wide Z:\\w.dwg\n"
+             L"clipboard-put ansi\nclipboard-files\n");
+    ASSERT_EQ(commands.size(), 4u);
+    EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::ClipboardPut);
+    EXPECT_FALSE(commands[0].wide);
+    EXPECT_EQ(commands[0].files, (std::vector<std::wstring>{L"Z:\\a b\\x.dwg", L"Z:\\y.txt"}));
+    EXPECT_TRUE(commands[1].wide);
+    EXPECT_EQ(commands[1].files, std::vector<std::wstring>{L"Z:\\w.dwg"});
+    EXPECT_TRUE(commands[2].files.empty()); // an empty list
+    EXPECT_EQ(commands[3].kind, ScriptCommand::Kind::ClipboardFiles);
+    EXPECT_NE(Error(L"clipboard-put Z:\\a.dwg\n").find(L"ansi or wide"), std::wstring::npos);
+    EXPECT_NE(Error(L"clipboard-put\n").find(L"ansi or wide"), std::wstring::npos);
+}

@@ -102,7 +102,7 @@ box='class=#32770 text="Drawing explorer"'
 # 4. Rename in the label: from the menu to a new name; by a double click on the label to a name that is
 # taken (refused with a message, the old name back, both files intact); to ..\x.dwg (refused).
 script 'wait contains="cone.dwg" timeout=30000' \
-       'right-click class=Edit text="cone.dwg" at=60,-50' 'sleep 300' 'key r' \
+       'right-click class=Edit text="cone.dwg" at=60,-50' 'sleep 300' "$(shot thumb-menu)" 'key r' \
        'type "cylinder.dwg"' 'key enter' 'wait class=Edit text="cylinder.dwg" timeout=10000' 'sleep 300' \
        'double-click class=Edit text="donut.dwg"' 'type "arc.dwg"' 'key enter' \
        "wait $box timeout=10000" "text $box > class=Static contains=\"Cannot\"" \
@@ -131,7 +131,8 @@ grid='id=59649'
 script 'wait contains="arc.dwg" timeout=30000' \
        'click class=Edit text="arc.dwg" at=60,-50' 'key ctrl+c' \
        "tree-select $tree path=\"$c_path\"" 'sleep 500' 'count class=Edit contains=".dwg"' \
-       "right-click $grid at=300,200" 'sleep 300' "screenshot class=#32768 $(winpath "$WORK/grid-menu.png")" 'key p' \
+       "right-click $grid at=300,200" 'sleep 300' "screenshot class=#32768 $(winpath "$WORK/grid-menu.png")" \
+       "$(shot grid-menu-frame)" 'key p' \
        'wait class=Edit text="arc.dwg" timeout=10000' 'sleep 300' 'count class=Edit contains=".dwg"' 'key escape'
 run "$(call_at "$root/a")"
 expect_true "the background menu's Paste put arc in c ($(on_disk "$root/c"))" [ "$(on_disk "$root/c")" == "arc.dwg" ]
