@@ -1,12 +1,14 @@
 #include "fileops/ForFileCommands.h"
 
 #include "fileops/DropBlock.h"
+#include "fileops/ShellContextMenu.h"
 #include "fileops/ShellFileOp.h"
 #include "framework/afxfiledlg.h"
 #include "framework/afxwin.h"
 #include "thumbs/DwgList.h"
 
 #include <shellapi.h>
+#include <shlobj.h>
 
 #include <cstring>
 #include <io.h>
@@ -184,13 +186,52 @@ int DeleteSelection(HWND owner, const std::string& folder) {
     return op.Delete();
 }
 
+namespace {
+
+// Runs a verb of the item's own shell menu, as its right-click menu in the file manager would.
+bool InvokeItemVerb(const std::string& path, const char* verb) {
+    const HRESULT com = ::CoInitializeEx(nullptr, COINIT_APARTMENTTHREADED);
+    bool invoked = false;
+    {
+        wchar_t wide[MAX_PATH * 2] = L"";
+        PIDLIST_ABSOLUTE absolute = nullptr;
+        IShellFolder* parent = nullptr;
+        PCUITEMID_CHILD child = nullptr;
+        if (::MultiByteToWideChar(CP_ACP, 0, path.c_str(), -1, wide, MAX_PATH * 2) &&
+            SUCCEEDED(::SHParseDisplayName(wide, nullptr, &absolute, 0, nullptr)) &&
+            SUCCEEDED(::SHBindToParent(absolute, IID_IShellFolder, reinterpret_cast<void**>(&parent), &child))) {
+            CShellContextMenu menu;
+            if (menu.SetObject(parent, child)) {
+                CMINVOKECOMMANDINFO command{};
+                command.cbSize = sizeof command;
+                command.lpVerb = verb;
+                command.nShow = SW_SHOW;
+                invoked = SUCCEEDED(menu.Menu()->InvokeCommand(&command));
+            }
+        }
+        if (parent)
+            parent->Release();
+        ::CoTaskMemFree(absolute);
+    }
+    if (SUCCEEDED(com))
+        ::CoUninitialize();
+    return invoked;
+}
+
+} // namespace
+
 bool ShowFileProperties(const std::string& path) {
     SHELLEXECUTEINFOA info{};
     info.cbSize = sizeof info;
-    info.fMask = SEE_MASK_INVOKEIDLIST;
+    // Without the shell's own error box: when it cannot route the verb, the item's menu is asked instead.
+    info.fMask = SEE_MASK_INVOKEIDLIST | SEE_MASK_FLAG_NO_UI;
     info.hwnd = nullptr;
     info.lpVerb = "properties";
     info.lpFile = path.c_str();
     info.nShow = SW_SHOW;
-    return ::ShellExecuteExA(&info) != FALSE;
+    if (::ShellExecuteExA(&info))
+        return true;
+    // Some shells (Wine's) do not pass "properties" on to the item's menu from ShellExecuteEx; the menu
+    // itself shows the same sheet.
+    return InvokeItemVerb(path, "properties");
 }

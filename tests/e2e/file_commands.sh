@@ -176,4 +176,14 @@ devhost --after-ms 4000 --post cancel --script "$(winpath "$WORK/script.txt")" -
 expect_line "--after-ms ends the call while a message box is open" "=> nil"
 expect_line "and the box is gone" "[script] exists no"
 
+# 9. Property: the shell's property sheet of the drawing, for its full path; the explorer goes on.
+sheet='class=#32770 text="Properties for donut.dwg"'
+script 'wait contains="donut.dwg" timeout=30000' 'right-click class=Edit text="donut.dwg" at=60,-50' 'sleep 300' \
+       'key up' 'key enter' "wait $sheet timeout=10000" "screenshot $sheet $(winpath "$WORK/properties.png")" \
+       "text $sheet > contains=\"orvexfiles\"" "click $sheet > class=Button text=Cancel" "gone $sheet" \
+       'click class=Edit text="donut.dwg" at=60,-50' 'sleep 300' "text $frame" 'key escape'
+run "$(call_at "$root/c")"
+expect_true "the sheet names the drawing's folder" has "$OUT" '^\[script\] text .*orvexfiles..c$'
+expect_true "and the explorer goes on: the drawing is chosen" has "$OUT" '^\[script\] text .*\\\\c\\\\donut.dwg$'
+
 finish

@@ -547,3 +547,24 @@ TEST(ShellContextMenu, GetsTheItemsMenuAndSubclassesItsOwner) {
     parent->Release();
     desktop->Release();
 }
+
+TEST(Properties, TheShellsSheetOfTheFullPathOpens) {
+    TempFolder folder("orvex-props");
+    const std::string a = folder.Write("a.dwg", "A");
+    {
+        DialogAnswer cancel(IDCANCEL);
+        EXPECT_TRUE(ShowFileProperties(a));
+        MSG msg;
+        const ULONGLONG until = ::GetTickCount64() + 1500;
+        while (::GetTickCount64() < until && DialogAnswer::Seen().empty()) {
+            while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
+                ::TranslateMessage(&msg);
+                ::DispatchMessageA(&msg);
+            }
+            ::Sleep(20);
+        }
+        ASSERT_FALSE(DialogAnswer::Seen().empty());
+        EXPECT_NE(DialogAnswer::Seen()[0].find("a.dwg"), std::string::npos) << DialogAnswer::Seen()[0];
+    }
+    EXPECT_FALSE(ShowFileProperties(folder.File("missing.dwg")));
+}
