@@ -133,15 +133,18 @@ script 'wait contains="arc.dwg" timeout=30000' \
        "tree-select $tree path=\"$c_path\"" 'sleep 500' 'count class=Edit contains=".dwg"' \
        "right-click $grid at=300,200" 'sleep 300' "screenshot class=#32768 $(winpath "$WORK/grid-menu.png")" \
        "$(shot grid-menu-frame)" 'key p' \
-       'wait class=Edit text="arc.dwg" timeout=10000' 'sleep 300' 'count class=Edit contains=".dwg"' 'key escape'
+       'wait class=Edit text="arc.dwg" timeout=10000' 'sleep 300' 'count class=Edit contains=".dwg"' \
+       'click class=Edit text="arc.dwg" at=60,-50' 'key shift+delete' 'clipboard-files' 'key escape'
 run "$(call_at "$root/a")"
 expect_true "the background menu's Paste put arc in c ($(on_disk "$root/c"))" [ "$(on_disk "$root/c")" == "arc.dwg" ]
 expect_true "the grid of c: empty, then one drawing (got $(labels))" [ "$(labels)" == "0 1" ]
+expect_true "Shift+Delete cuts: c's arc is on the clipboard" has "$OUT" 'clipboard-file .*\\\\c\\\\arc.dwg$'
+expect_true "and stays in c until it is pasted ($(on_disk "$root/c"))" [ "$(on_disk "$root/c")" == "arc.dwg" ]
 
 # 6. Another program reads the list the explorer left on the clipboard, after the library is unloaded:
 # through the system's DragQueryFileA and DragQueryFileW, and pastes it with the system's file operation.
 probe() { "$WINE_RUN" "$CLIPBOARD_PROBE" "$@" 2>/dev/null | tr -d '\r'; }
-arc_win=$(winpath "$root/a/arc.dwg")
+arc_win=$(winpath "$root/c/arc.dwg")
 expect_true "DragQueryFileA and W in another process read the explorer's list" \
   [ "$(probe read)" == "$(printf 'count-a 1\na %s\ncount-w 1\nw %s' "$arc_win" "$arc_win")" ]
 expect_true "the clipboard holds the file list and nothing of the library (formats: $(probe formats | tr '\n' ' '))" \
