@@ -544,9 +544,12 @@ void DriveTree(HWND tree, const ScriptCommand& command) {
 // or wide names), and the list read back through the system's DragQueryFileW.
 class OpenedClipboard {
 public:
-    OpenedClipboard() {
+    // A message-only window of the script thread owns the clipboard while it is open: after
+    // EmptyClipboard, SetClipboardData needs an owner.
+    OpenedClipboard()
+        : m_owner(CreateWindowExW(0, L"STATIC", L"", 0, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr, nullptr)) {
         for (int attempt = 0; attempt < 50 && !m_open; ++attempt) {
-            m_open = OpenClipboard(nullptr) != FALSE;
+            m_open = OpenClipboard(m_owner) != FALSE;
             if (!m_open)
                 Sleep(20);
         }
@@ -554,11 +557,16 @@ public:
             throw ScriptError{L"the clipboard cannot be opened (error " + std::to_wstring(GetLastError()) +
                               L")"};
     }
-    ~OpenedClipboard() { CloseClipboard(); }
+    ~OpenedClipboard() {
+        CloseClipboard();
+        if (m_owner)
+            DestroyWindow(m_owner);
+    }
     OpenedClipboard(const OpenedClipboard&) = delete;
     OpenedClipboard& operator=(const OpenedClipboard&) = delete;
 
 private:
+    HWND m_owner;
     bool m_open = false;
 };
 

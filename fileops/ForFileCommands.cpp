@@ -81,8 +81,19 @@ bool PutFileListOnClipboard(const std::vector<std::string>& paths, bool cut) {
         std::memcpy(data, block.data(), block.size());
         ::GlobalUnlock(handle);
     }
+    // The clipboard needs an owner window for SetClipboardData to follow EmptyClipboard: a message-only
+    // window of the library's own lives for the moment the list is put there, so no window of the
+    // explorer (nor the library) is tied to the clipboard afterwards.
+    HWND owner = ::CreateWindowExA(0, "STATIC", "", 0, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr, nullptr);
+    struct OwnerGone {
+        HWND hwnd;
+        ~OwnerGone() {
+            if (hwnd)
+                ::DestroyWindow(hwnd);
+        }
+    } ownerGone{owner};
     {
-        ClipboardOpen clipboard(nullptr);
+        ClipboardOpen clipboard(owner);
         if (!clipboard) {
             ::GlobalFree(handle);
             return false;
@@ -199,7 +210,8 @@ bool InvokeItemVerb(const std::string& path, const char* verb) {
         PCUITEMID_CHILD child = nullptr;
         if (::MultiByteToWideChar(CP_ACP, 0, path.c_str(), -1, wide, MAX_PATH * 2) &&
             SUCCEEDED(::SHParseDisplayName(wide, nullptr, &absolute, 0, nullptr)) &&
-            SUCCEEDED(::SHBindToParent(absolute, IID_IShellFolder, reinterpret_cast<void**>(&parent), &child))) {
+            SUCCEEDED(
+                ::SHBindToParent(absolute, IID_IShellFolder, reinterpret_cast<void**>(&parent), &child))) {
             CShellContextMenu menu;
             if (menu.SetObject(parent, child)) {
                 CMINVOKECOMMANDINFO command{};

@@ -15,9 +15,16 @@
 
 namespace {
 
+// SetClipboardData after EmptyClipboard needs an owner window: a message-only one.
+HWND Owner() {
+    static HWND owner =
+        CreateWindowExW(0, L"STATIC", L"", 0, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr, nullptr);
+    return owner;
+}
+
 bool Open() {
     for (int i = 0; i < 50; ++i) {
-        if (OpenClipboard(nullptr))
+        if (OpenClipboard(Owner()))
             return true;
         Sleep(20);
     }

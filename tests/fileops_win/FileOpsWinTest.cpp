@@ -44,10 +44,12 @@ void PutWideList(const std::vector<std::wstring>& names) {
     header->fWide = TRUE;
     std::memcpy(header + 1, text.data(), text.size() * 2);
     ::GlobalUnlock(block);
-    ASSERT_TRUE(::OpenClipboard(nullptr));
+    HWND owner = ::CreateWindowExA(0, "STATIC", "", 0, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr, nullptr);
+    ASSERT_TRUE(::OpenClipboard(owner));
     ::EmptyClipboard();
     ::SetClipboardData(CF_HDROP, block);
     ::CloseClipboard();
+    ::DestroyWindow(owner);
 }
 
 std::wstring Wide(const std::string& text) {
