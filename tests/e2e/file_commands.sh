@@ -178,6 +178,12 @@ script 'wait contains="donut.dwg" timeout=30000' 'double-click class=Edit text="
 devhost --after-ms 4000 --post cancel --script "$(winpath "$WORK/script.txt")" --eval "$(call_at "$root/c")"
 expect_line "--after-ms ends the call while a message box is open" "=> nil"
 expect_line "and the box is gone" "[script] exists no"
+script 'wait contains="donut.dwg" timeout=30000' 'right-click class=Edit text="donut.dwg" at=60,-50' 'sleep 300' \
+       'key d' 'wait class=#32770 text="Confirm file deletion" timeout=10000' 'sleep 6000' \
+       'exists class=#32770 text="Confirm file deletion"'
+devhost --after-ms 4000 --post cancel --script "$(winpath "$WORK/script.txt")" --eval "$(call_at "$root/c")"
+expect_line "--after-ms ends the call while the shell asks about a delete" "=> nil"
+expect_true "answered No: the drawing stays ($(on_disk "$root/c"))" [ "$(on_disk "$root/c")" == "donut.dwg" ]
 
 # 9. Property: the shell's property sheet of the drawing, for its full path; the explorer goes on.
 sheet='class=#32770 text="Properties for donut.dwg"'
