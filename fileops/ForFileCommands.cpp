@@ -143,8 +143,7 @@ int ForFileCommands::RenameFile(const std::string& source, const std::string& de
     CShellFileOp op;
     op.AddName(CShellFileOp::kSource, source);
     op.AddName(CShellFileOp::kDestination, destination);
-    // The shell asks nothing before a rename; a name that is taken fails instead of replacing.
-    op.SetFlags(FOF_ALLOWUNDO | FOF_NOCONFIRMMKDIR);
+    // No flags: a name that is taken fails (the shell says why) instead of replacing the other file.
     const int result = op.Rename();
     if (result != 0 && label && label->m_hWnd) {
         const auto separator = source.find_last_of('\\');
