@@ -1,6 +1,7 @@
 #include "devhost/ScriptRunner.h"
 
 #include "devhost/Bitmap.h"
+#include "devhost/ColorDialog.h"
 #include "devhost/HostObjects.h"
 #include "devhost/HostWindows.h"
 #include "devhost/Output.h"
@@ -622,6 +623,7 @@ void ScriptRunner::Run() {
             // Do not leave the LISP call waiting for input that will not come.
             if (HWND dialog = FindRunDialog(m_uiThreadId))
                 PostMessageW(dialog, WM_ORVEX_RESULT, kAppCancel, 0);
+            CancelColorDialog();
             return;
         }
     }

@@ -1,5 +1,6 @@
 #include "devhost/Session.h"
 
+#include "devhost/ColorDialog.h"
 #include "devhost/HostObjects.h"
 #include "devhost/HostWindows.h"
 #include "devhost/Lisp.h"
@@ -81,6 +82,7 @@ void CALLBACK PostTimer(HWND, UINT, UINT_PTR timer, DWORD) {
         return;
     if (HWND dialog = FindRunDialog(GetCurrentThreadId())) {
         PostMessageW(dialog, WM_ORVEX_RESULT, g_postValue, 0);
+        CancelColorDialog(); // a call waiting in the colour dialog ends too
         g_posted = true;
         KillTimer(nullptr, timer);
         if (Host().options.verbose)

@@ -93,6 +93,8 @@ private:
     CView* MakeGridView();
     CView* MakeFolderPane();
     void WireFolderTree();
+    // The folder tree's right-click menu, "&Folder settings", and the dialog it opens.
+    void ShowFolderMenu(HTREEITEM item);
     bool ForwardToGrid(UINT id);
     void SetSortMode(int mode);
     void ShowHelp();
@@ -114,6 +116,9 @@ private:
     CTessel3View* m_pGridView = nullptr;    // the right pane
     CLeftView* m_pFolderPane = nullptr;     // the left pane
 };
+
+// The one command of the folder tree's right-click menu.
+constexpr int kFolderMenuSettings = 1;
 
 // Id of the bottom toolbar's window (the top one has the standard toolbar id).
 constexpr UINT kPickToolBarId = AFX_IDW_TOOLBAR + 4;
