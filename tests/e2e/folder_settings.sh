@@ -1,0 +1,112 @@
+#!/usr/bin/env bash
+# A folder's insertion parameters as a person sets them: right click on the folder in the tree, "Folder
+# settings", a layer typed, a colour chosen in the host's colour dialog, a LISP command typed, Accept.
+# datains.ini holds them (keys of its own kept), the toolbar shows the layer and the next pick in the
+# folder returns them. Then "Use current layer" with no command removes the file again.
+. "$(dirname "$0")/lib.sh"
+
+root="$WORK/orvexsettings"
+doors="$root/doors"
+gen_dwg "$doors" 1 --variant 3
+for f in "$doors"/*; do mv "$f" "$doors/x.dwg"; done
+[ -f "$doors/x.dwg" ] && pass "a folder with one drawing, x.dwg" || fail "generator: $(cat "$WORK/gen.err")"
+# A settings file that already holds a section of its own: the dialog keeps it.
+printf '[Mine]\r\nKeep=1\r\n\r\n' >"$doors/datains.ini"
+
+tree='class=SysTreeView32'
+dialog='class=#32770 text="Folder settings"'
+colors='class=DevhostColorDialog'
+call=$(printf '(Orvex 1 2 "%s\\\\" "Insert" "Close")' "$(lisppath "$doors")")
+script() { printf '%s\n' "$@" >"$WORK/script.txt"; }
+run() { devhost --script "$(winpath "$WORK/script.txt")" --eval "$1"; }
+has() { printf '%s\n' "$1" | grep -q -- "$2"; }
+ini_value() { tr -d '\r' <"$WORK/lib/Orvex1.ini" 2>/dev/null | sed -n "s/^$1=//p"; }
+shot() { winpath "$WORK/$1"; }
+
+# A double click on the picture, above the label, picks (one on the label would rename).
+# 1. Open the explorer on the folder once: the tree's label path of the folder is kept in Orvex1.ini.
+script 'wait contains="x.dwg" timeout=30000' 'text contains="Layer name:"' 'key escape'
+run "$call"
+expect_line "the folder opens with no layer of its own" "[script] text  Layer name: Current"
+label=$(ini_value ShellPath)
+expect_true "the tree's label path of the folder is known ($label)" [ "${label##*\\}" == "doors" ]
+
+# 2. Right click, "Folder settings", fill it in, Accept; then pick the drawing.
+script 'wait contains="x.dwg" timeout=30000' \
+       "tree-right-click $tree path=\"$label\"" \
+       'wait class=#32768 timeout=5000' \
+       "screenshot class=#32768 $(shot folder-menu.png)" \
+       'click class=#32768 at=30,10' \
+       "wait $dialog timeout=5000" \
+       'echo opened' "enabled $dialog > id=1017" "enabled $dialog > id=200" "text $dialog > id=201" \
+       "screenshot $dialog $(shot folder-settings-new.png)" \
+       "click $dialog > id=1081" \
+       'echo unchecked' "enabled $dialog > id=1017" "enabled $dialog > id=200" \
+       "click $dialog > id=1017" 'type "DOORS"' \
+       "click $dialog > id=200" \
+       "wait $colors timeout=5000" \
+       'echo palette' "text $colors > id=1302" "enabled $colors > id=1301" "enabled $colors > id=1300" \
+       "click $colors > id=1030" \
+       'echo chosen' "text $colors > id=1302" \
+       "screenshot $colors $(shot color-dialog.png)" \
+       "click $colors > id=1" \
+       "gone $colors timeout=5000" \
+       "click $dialog > id=201" 'type "(c:fixdoor)"' \
+       "screenshot $dialog $(shot folder-settings-filled.png)" \
+       "click $dialog > id=1" \
+       "gone $dialog timeout=5000" \
+       'sleep 300' 'echo label' 'text contains="Layer name:"' \
+       'double-click text="x.dwg" at=40,-40'
+run "$call"
+section() { printf '%s\n' "$OUT" | sed -n "/^\[script\] $1\$/,/^\[script\] [a-z]*\$/p" | sed -n 's/^\[script\] \(text\|enabled\) //p' |
+            tr '\n' '|'; }
+expect_true "a datains.ini without a layer opens with the layer edit and the swatch off, no command (got $(section opened))" \
+  [ "$(section opened)" == "no|no||" ]
+expect_true "clearing Use current layer enables the layer and the swatch (got $(section unchecked))" \
+  [ "$(section unchecked)" == "yes|yes|" ]
+expect_true "the palette opens on colour 7 with ByLayer and ByBlock disabled (got $(section palette))" \
+  [ "$(section palette)" == "Color 7|no|no|" ]
+expect_true "a click on swatch 30 chooses it (got $(section chosen))" [ "$(section chosen)" == "Color 30|" ]
+expect_line "the toolbar shows the folder's layer after Accept" "[script] text  Layer name: DOORS"
+expect_line "the pick returns the drawing with the folder's layer, colour and command" \
+  "=> (\"$(lisppath "$doors")\\\\x.dwg\" (\"DOORS\" \"30\" \"(c:fixdoor)\"))"
+ini=$(tr -d '\r' <"$doors/datains.ini" 2>/dev/null)
+expect_true "datains.ini holds the three keys after the section it had (got: $(printf '%s' "$ini" | tr '\n' '|'))" \
+  [ "$(printf '%s' "$ini" | tr '\n' '|')" == "[Mine]|Keep=1||[Default Parameters]|Layer=DOORS|Lisp command=(c:fixdoor)|Color=30" ]
+
+# 3. Reopen: the dialog shows what was saved. Use current layer with no command removes the file.
+script 'wait contains="x.dwg" timeout=30000' \
+       "tree-right-click $tree path=\"$label\"" \
+       'wait class=#32768 timeout=5000' 'click class=#32768 at=30,10' \
+       "wait $dialog timeout=5000" \
+       'echo reopened' "text $dialog > id=1017" "text $dialog > id=201" "enabled $dialog > id=200" \
+       "click $dialog > id=1081" \
+       "click $dialog > id=201" 'key end' 'key shift+home' 'key delete' \
+       'echo cleared' "text $dialog > id=201" "enabled $dialog > id=1017" 'echo end' \
+       "click $dialog > id=1" \
+       "gone $dialog timeout=5000" \
+       'sleep 300' 'text contains="Layer name:"' \
+       'key escape'
+run "$call"
+expect_true "the dialog reopens with the layer and the command (got $(section reopened))" \
+  [ "$(section reopened)" == "DOORS|(c:fixdoor)|yes|" ]
+expect_true "the command is cleared and the layer edit disabled (got $(section cleared))" \
+  [ "$(section cleared)" == "|no|" ]
+expect_true "Use current layer with no command deletes datains.ini" [ ! -e "$doors/datains.ini" ]
+expect_line "the toolbar says Current again" "[script] text  Layer name: Current"
+expect_line "Escape still cancels the pick" "=> nil"
+
+# 4. Cancel leaves the folder as it was; the next pick returns three empty strings.
+script 'wait contains="x.dwg" timeout=30000' \
+       "tree-right-click $tree path=\"$label\"" \
+       'wait class=#32768 timeout=5000' 'click class=#32768 at=30,10' \
+       "wait $dialog timeout=5000" \
+       "click $dialog > id=201" 'type "(c:never)"' \
+       "click $dialog > id=2" "gone $dialog timeout=5000" \
+       'double-click text="x.dwg" at=40,-40'
+run "$call"
+expect_true "Cancel writes nothing" [ ! -e "$doors/datains.ini" ]
+expect_line "a pick in a folder without settings returns three empty strings" \
+  "=> (\"$(lisppath "$doors")\\\\x.dwg\" (\"\" \"\" \"\"))"
+
+finish
