@@ -73,7 +73,7 @@ void WaitPumping(HANDLE thread) {
 }
 
 // --after-ms: a thread timer (it fires inside the library's modal loop) that posts the accept or cancel
-// message to the run dialog once it is there.
+// message to the run dialog once it is there, and cancels the colour dialog if one is open.
 WPARAM g_postValue = 0;
 bool g_posted = false;
 
@@ -89,7 +89,9 @@ void CALLBACK PostTimer(HWND, UINT, UINT_PTR timer, DWORD) {
             WriteLine(g_postValue == kAppAccept ? L"[host] posted accept" : L"[host] posted cancel");
         return;
     }
-    SetTimer(nullptr, timer, kPostRetryMs, &PostTimer); // not there yet: look again shortly
+    // Not there yet: look again shortly. A call waiting in the colour dialog meanwhile has had its time.
+    CancelColorDialog();
+    SetTimer(nullptr, timer, kPostRetryMs, &PostTimer);
 }
 
 class Session {
