@@ -16,6 +16,7 @@ printf '[Mine]\r\nKeep=1\r\n\r\n' >"$doors/datains.ini"
 tree='class=SysTreeView32'
 dialog='class=#32770 text="Folder settings"'
 colors='class=DevhostColorDialog'
+frame='contains="orvexsettings" nth=0' # the explorer's title shows the folder
 call=$(printf '(Orvex 1 2 "%s\\\\" "Insert" "Close")' "$(lisppath "$doors")")
 script() { printf '%s\n' "$@" >"$WORK/script.txt"; }
 run() { devhost --script "$(winpath "$WORK/script.txt")" --eval "$1"; }
@@ -35,7 +36,7 @@ expect_true "the tree's label path of the folder is known ($label)" [ "${label##
 script 'wait contains="x.dwg" timeout=30000' \
        "tree-right-click $tree path=\"$label\"" \
        'wait class=#32768 timeout=5000' \
-       "screenshot class=#32768 $(shot folder-menu.png)" \
+       "screenshot class=#32768 $(shot folder-menu.png)" "screenshot $frame $(shot folder-menu-frame.png)" \
        'click class=#32768 at=30,10' \
        "wait $dialog timeout=5000" \
        'echo opened' "enabled $dialog > id=1017" "enabled $dialog > id=200" "text $dialog > id=201" \
@@ -52,7 +53,7 @@ script 'wait contains="x.dwg" timeout=30000' \
        "click $colors > id=1" \
        "gone $colors timeout=5000" \
        "click $dialog > id=201" 'type "(c:fixdoor)"' \
-       "screenshot $dialog $(shot folder-settings-filled.png)" \
+       "screenshot $dialog $(shot folder-settings-filled.png)" "screenshot $frame $(shot folder-settings-frame.png)" \
        "click $dialog > id=1" \
        "gone $dialog timeout=5000" \
        'sleep 300' 'echo label' 'text contains="Layer name:"' \
