@@ -208,8 +208,8 @@ void CreateControls(HWND dialog, const DialogState& state) {
                          kButtonHeight, kByBlockId);
     EnableWindow(byLayer, state.allowMeta);
     EnableWindow(byBlock, state.allowMeta);
-    Child(dialog, L"STATIC", ChosenText(state.chosen).c_str(), SS_LEFT | SS_CENTERIMAGE, kMargin + 190, y, 110,
-          kButtonHeight, kChosenTextId);
+    Child(dialog, L"STATIC", ChosenText(state.chosen).c_str(), SS_LEFT | SS_CENTERIMAGE, kMargin + 190, y,
+          110, kButtonHeight, kChosenTextId);
     Child(dialog, kSwatchClass, L"", 0, kMargin + 300, y, 48, kButtonHeight, kChosenSampleId);
     const int buttons = y + kButtonHeight + 8;
     Child(dialog, L"BUTTON", L"OK", BS_DEFPUSHBUTTON | WS_TABSTOP, kClientWidth - kMargin - 168, buttons, 80,
@@ -227,7 +227,8 @@ bool RunColorDialog(int* colorIndex, bool allowMetaColor, int currentLayerColor)
     DialogState state;
     state.allowMeta = allowMetaColor;
     state.chosen = *colorIndex;
-    if (state.chosen < 0 || state.chosen > 256 || (!allowMetaColor && (state.chosen == 0 || state.chosen == 256)))
+    if (state.chosen < 0 || state.chosen > 256 ||
+        (!allowMetaColor && (state.chosen == 0 || state.chosen == 256)))
         state.chosen = 7;
 
     HWND owner = GetActiveWindow();
@@ -240,10 +241,11 @@ bool RunColorDialog(int* colorIndex, bool allowMetaColor, int currentLayerColor)
     RECT ownerRect{0, 0, GetSystemMetrics(SM_CXSCREEN), GetSystemMetrics(SM_CYSCREEN)};
     if (owner)
         GetWindowRect(owner, &ownerRect);
-    const int x = (ownerRect.left + ownerRect.right - width) / 2, y = (ownerRect.top + ownerRect.bottom - height) / 2;
-    HWND dialog = CreateWindowExW(WS_EX_DLGMODALFRAME | WS_EX_CONTROLPARENT, kColorDialogClass, L"Select Color",
-                                  style, x > 0 ? x : 0, y > 0 ? y : 0, width, height, owner, nullptr, instance,
-                                  &state);
+    const int x = (ownerRect.left + ownerRect.right - width) / 2,
+              y = (ownerRect.top + ownerRect.bottom - height) / 2;
+    HWND dialog =
+        CreateWindowExW(WS_EX_DLGMODALFRAME | WS_EX_CONTROLPARENT, kColorDialogClass, L"Select Color", style,
+                        x > 0 ? x : 0, y > 0 ? y : 0, width, height, owner, nullptr, instance, &state);
     if (!dialog)
         return false;
     CreateControls(dialog, state);

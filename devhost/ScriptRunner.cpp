@@ -621,9 +621,10 @@ void ScriptRunner::Run() {
             WriteLine(L"[script] error: line " + std::to_wstring(command.line) + L": " +
                       EscapeControls(error.message));
             // Do not leave the LISP call waiting for input that will not come.
+            // The colour dialog first, so that its loop does not take the result message.
+            CancelColorDialog();
             if (HWND dialog = FindRunDialog(m_uiThreadId))
                 PostMessageW(dialog, WM_ORVEX_RESULT, kAppCancel, 0);
-            CancelColorDialog();
             return;
         }
     }

@@ -81,8 +81,10 @@ void CALLBACK PostTimer(HWND, UINT, UINT_PTR timer, DWORD) {
     if (g_posted)
         return;
     if (HWND dialog = FindRunDialog(GetCurrentThreadId())) {
+        // A call waiting in the colour dialog ends too. The dialog goes first: its loop would dispatch the
+        // result message to the run dialog, which takes it only from the library's own loop.
+        CancelColorDialog();
         PostMessageW(dialog, WM_ORVEX_RESULT, g_postValue, 0);
-        CancelColorDialog(); // a call waiting in the colour dialog ends too
         g_posted = true;
         KillTimer(nullptr, timer);
         if (Host().options.verbose)

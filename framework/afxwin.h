@@ -346,6 +346,9 @@ public:
     virtual void OnCancel() { EndDialog(IDCANCEL); }
 
     bool IsModalRunning() const { return m_bModalRunning; }
+    // Whether a modal run that this one's run interrupted has been ended: the nested run then ends as
+    // cancelled at once.
+    bool OuterRunEnded() const;
 
 protected:
     bool OnCommand(WPARAM wParam, LPARAM lParam) override;
@@ -361,6 +364,7 @@ private:
     friend INT_PTR CALLBACK AfxDlgProc(HWND, UINT, WPARAM, LPARAM);
     bool m_bModalRunning = false;
     INT_PTR m_nModalResult = -1;
+    CDialog* m_pOuterModal = nullptr; // the modal run this one's run interrupted, while it runs
 };
 
 // ---- controls ---------------------------------------------------------------------------------------

@@ -29,10 +29,10 @@ std::string FolderPathTooLongMessage(const std::string& folder);
 
 // What the dialog shows when it opens.
 struct FolderSettingsView {
-    bool useCurrentLayer = true;    // the "&Use current layer" box
-    bool layerEditEnabled = false;  // the layer edit
-    bool swatchEnabled = true;      // the colour swatch
-    bool colorFromFile = false;     // colorIndex was read from the file (else the swatch keeps its own)
+    bool useCurrentLayer = true;   // the "&Use current layer" box
+    bool layerEditEnabled = false; // the layer edit
+    bool swatchEnabled = true;     // the colour swatch
+    bool colorFromFile = false;    // colorIndex was read from the file (else the swatch keeps its own)
     int colorIndex = kDefaultColorIndex;
     std::string layer;
     std::string command;

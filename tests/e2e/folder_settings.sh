@@ -110,4 +110,56 @@ expect_true "Cancel writes nothing" [ ! -e "$doors/datains.ini" ]
 expect_line "a pick in a folder without settings returns three empty strings" \
   "=> (\"$(lisppath "$doors")\\\\x.dwg\" (\"\" \"\" \"\"))"
 
+# 5. A folder whose path leaves no room for "\datains.ini" in the dialog's 260-character buffer: the menu
+# says so in a message box and no dialog opens. The folder (250 characters) is reached in the tree from a
+# shorter one, since its label path is longer than a start path may be.
+top="$WORK/long"
+long=$top
+while [ ${#long} -lt 228 ]; do n=$((228 - ${#long} > 60 ? 60 : 228 - ${#long})); long="$long/$(printf 'd%.0s' $(seq 1 $n))"; done
+long="$long/$(printf 'e%.0s' $(seq 1 $((250 - 2 - 1 - ${#long}))))"
+mkdir -p "$long" && cp "$doors/x.dwg" "$long/x.dwg" && cp "$doors/x.dwg" "$top/x.dwg"
+expect_true "a folder of 250 characters (got $(winpath "$long" | wc -c | tr -d ' '))" [ "$(winpath "$long" | wc -c)" -eq 250 ]
+topcall=$(printf '(Orvex 1 2 "%s\\\\" "Insert" "Close")' "$(lisppath "$top")")
+script 'wait contains="x.dwg" timeout=30000' 'key escape'
+run "$topcall"
+toplabel=$(ini_value ShellPath)
+# A wide window and folder pane, so that the long labels leave the expand buttons in view.
+sed -i -e 's/^SplitterSize=[0-9]*/SplitterSize=1100/' -e 's/^WindowWidth=[0-9]*/WindowWidth=1500/' "$WORK/lib/Orvex1.ini"
+steps=('wait contains="x.dwg" timeout=30000')
+path=$toplabel
+for part in $(printf '%s' "${long#"$top"/}" | tr '/' ' '); do
+  path="$path\\$part"
+  [ "$part" != "${long##*/}" ] && steps+=("tree-expand $tree path=\"$path\"")
+done
+box='class=#32770 text="Drawing explorer"'
+script "${steps[@]}" "tree-right-click $tree path=\"$path\"" \
+       'wait class=#32768 timeout=5000' 'click class=#32768 at=30,10' \
+       "wait $box timeout=5000" "text $box > id=65535" "screenshot $box $(shot folder-too-long.png)" \
+       'key enter' "gone $box timeout=5000" \
+       "exists $dialog" \
+       'key escape'
+run "$topcall"
+expect_true "a message box says the folder is too long for its settings" \
+  has "$OUT" '^\[script\] text The folder.s path is too long for its settings (262 characters'
+expect_line "and no settings dialog opens" "[script] exists no"
+expect_true "nothing is written in the long folder" [ ! -e "$long/datains.ini" ]
+expect_line "the explorer goes on: Escape cancels" "=> nil"
+
+# 6. The call ends while the folder settings dialog and the host's colour dialog are open (devhost's
+# --after-ms, as a host that ends the call): both close, nothing is written, the call returns nil.
+script 'wait contains="x.dwg" timeout=30000' \
+       "tree-right-click $tree path=\"$label\"" \
+       'wait class=#32768 timeout=5000' 'click class=#32768 at=30,10' \
+       "wait $dialog timeout=5000" "click $dialog > id=1081" "click $dialog > id=1017" 'type "LATE"' \
+       "click $dialog > id=200" "wait $colors timeout=5000" 'echo waiting' \
+       'returned timeout=30000' "exists $colors visible=any" "exists $dialog visible=any" \
+       "${HOST_CHECKS[@]:1}"
+devhost --script "$(winpath "$WORK/script.txt")" --after-ms 6000 --post cancel --eval "$call"
+expect_host_usable "a call ended in the colour dialog"
+expect_true "the colour dialog was open when the call ended" has "$OUT" '^\[script\] waiting$'
+expect_line "the call returns nil" "=> nil"
+expect_true "both dialogs are gone (got $(printf '%s\n' "$OUT" | grep -c '^\[script\] exists no$') of 2)" \
+  [ "$(printf '%s\n' "$OUT" | grep -c '^\[script\] exists no$')" -eq 2 ]
+expect_true "nothing is written" [ ! -e "$doors/datains.ini" ]
+
 finish

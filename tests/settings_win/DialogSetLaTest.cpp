@@ -57,7 +57,9 @@ public:
     int changes = 0;
     bool timedOut = false;
 
-    TestDialog() { onChanged = [this] { ++changes; }; }
+    TestDialog() {
+        onChanged = [this] { ++changes; };
+    }
 
     bool OnInitDialog() override {
         const bool result = CDialogSetLa::OnInitDialog();
@@ -247,7 +249,8 @@ TEST_F(FolderSettingsDialog, AFileWithALayerOpensWithLayerColourAndCommand) {
     EXPECT_EQ(layer, "DOORS");
     EXPECT_EQ(command, "(c:go)");
     EXPECT_EQ(index, 30);
-    EXPECT_EQ(pixel, static_cast<COLORREF>(FakeRgb(30))) << "the swatch paints the host's colour of the index";
+    EXPECT_EQ(pixel, static_cast<COLORREF>(FakeRgb(30)))
+        << "the swatch paints the host's colour of the index";
     EXPECT_EQ(dialog.changes, 0) << "Cancel touches nothing";
 }
 
@@ -273,7 +276,8 @@ TEST_F(FolderSettingsDialog, TheBoxEnablesLayerAndSwatchExactlyWhenClear) {
     TestDialog dialog;
     std::vector<std::string> states;
     auto note = [&](TestDialog& d) {
-        states.push_back(std::string(d.Checked() ? "checked" : "clear") + (d.Enabled(IDC_SETLA_LAYER) ? " layer" : "") +
+        states.push_back(std::string(d.Checked() ? "checked" : "clear") +
+                         (d.Enabled(IDC_SETLA_LAYER) ? " layer" : "") +
                          (d.Enabled(IDC_SETLA_COLOR) ? " swatch" : ""));
     };
     Run(dialog, [&](TestDialog& d) {
