@@ -4,7 +4,9 @@
 //
 // Wiring. The frame makes its two views (through the splitter, with the creation context that carries
 // the document) and sets their handlers: the grid tells the frame about the pick, the title, the status
-// and the folder; Tab in the grid focuses the folder pane; the search edit runs the grid's search.
+// and the folder; Tab in the grid focuses the folder pane; the search edit runs the grid's search; a right
+// click on a folder of the tree opens its "&Folder settings" menu, whose dialog (settings/) tells the frame
+// when the folder's datains.ini changed, so the layer label is read again.
 //
 // Ownership. The frame is created with new and deletes itself when its window is destroyed; its bars,
 // labels, search edit and splitter are members, their windows children of the frame. The views delete
