@@ -64,3 +64,37 @@ focus
 SCRIPT
 tools/wine-run build/windows/bin/devhost.exe --script "$(win "$script")" --eval "$call" | tr -d '\r'
 echo "Screenshots: docs/explorer.png, docs/explorer-tooltip.png, docs/explorer-search.png"
+
+# The folder's insertion parameters: a right click on the folder in the tree opens its one-entry menu and
+# the "Folder settings" dialog; a layer, a colour from the host's palette and a LISP command are filled in
+# and shown, then cancelled, so the sample folder keeps what it had.
+label=$(tr -d '\r' <build/windows/bin/Orvex1.ini | sed -n 's/^ShellPath=//p')
+dialog='class=#32770 text="Folder settings"'
+if [ -n "$label" ] && [ ! -e "$samples/datains.ini" ]; then
+  cat >"$script" <<SCRIPT
+wait contains=".dwg" timeout=30000
+tree-right-click class=SysTreeView32 path="$label"
+wait class=#32768 timeout=5000
+screenshot class=#32768 $(win docs/folder-menu.png)
+click class=#32768 at=30,10
+wait $dialog timeout=5000
+click $dialog > id=1081
+click $dialog > id=1017
+type "DOORS"
+click $dialog > id=200
+wait class=DevhostColorDialog timeout=5000
+click class=DevhostColorDialog > id=1030
+sleep 300
+screenshot class=DevhostColorDialog $(win docs/devhost-color-dialog.png)
+click class=DevhostColorDialog > id=1
+click $dialog > id=201
+type "(c:fixdoor)"
+sleep 300
+screenshot $dialog $(win docs/folder-settings.png)
+click $dialog > id=2
+key escape
+returned timeout=30000
+SCRIPT
+  tools/wine-run build/windows/bin/devhost.exe --script "$(win "$script")" --eval "$call" | tr -d '\r'
+  echo "Screenshots: docs/folder-menu.png, docs/folder-settings.png, docs/devhost-color-dialog.png"
+fi
