@@ -429,3 +429,34 @@ TEST(FolderSettingsDialogPath, ATooLongFolderIsRefusedBeforeAnythingIsCopied) {
     EXPECT_FALSE(dialog.SetFolder(std::string(4000, 'x')));
     EXPECT_EQ(std::string(dialog.GetPathBuffer()), "C:\\" + std::string(244, 'd')) << "left as it was";
 }
+
+namespace {
+bool FakeLayerColor(const wchar_t* name, int* index) {
+    if (std::wstring(name) != L"WALLS")
+        return false;
+    *index = 12;
+    return true;
+}
+} // namespace
+
+TEST(StaticColorLayers, TakesTheColourOfALayerOfTheDrawingOrStaysAsItWas) {
+    HostApi api;
+    api.acdbGetLayerColor = FakeLayerColor;
+    api.acedGetRGB = FakeRgb;
+    SetHostApi(api);
+    CStaticColor swatch;
+    EXPECT_EQ(swatch.GetColorIndex(), 7);
+    EXPECT_EQ(swatch.GetFillColor(), 0xFFFFFFu);
+    int index = 0;
+    EXPECT_TRUE(CStaticColor::GetLayerColor("WALLS", index));
+    EXPECT_EQ(index, 12);
+    EXPECT_FALSE(CStaticColor::GetLayerColor("NONE", index));
+    EXPECT_EQ(index, 12);
+    EXPECT_FALSE(swatch.SetColorFromLayer("NONE"));
+    EXPECT_EQ(swatch.GetColorIndex(), 7);
+    EXPECT_EQ(swatch.GetFillColor(), 0xFFFFFFu);
+    EXPECT_TRUE(swatch.SetColorFromLayer("WALLS"));
+    EXPECT_EQ(swatch.GetColorIndex(), 12);
+    EXPECT_EQ(swatch.GetFillColor(), FakeRgb(12));
+    SetHostApi(HostApi{});
+}
