@@ -104,9 +104,12 @@ script 'wait contains="x.dwg" timeout=30000' \
        "wait $dialog timeout=5000" \
        "click $dialog > id=201" 'type "(c:never)"' \
        "click $dialog > id=2" "gone $dialog timeout=5000" \
+       "tree-right-click $tree path=\"Desktop\"" 'sleep 500' 'echo virtual' 'exists class=#32768' \
        'double-click text="x.dwg" at=40,-40'
 run "$call"
 expect_true "Cancel writes nothing" [ ! -e "$doors/datains.ini" ]
+expect_true "the Desktop, a folder without a path, gets no menu" \
+  [ "$(printf '%s\n' "$OUT" | sed -n '/^\[script\] virtual$/{n;p}')" == "[script] exists no" ]
 expect_line "a pick in a folder without settings returns three empty strings" \
   "=> (\"$(lisppath "$doors")\\\\x.dwg\" (\"\" \"\" \"\"))"
 
