@@ -57,11 +57,7 @@ bool MakeFolders(const std::string& dir, int count) {
 
 CShellPidl PidlOf(const std::string& path) {
     CDesktopFolderRef desktop;
-    std::wstring wide(path.begin(), path.end());
-    CShellPidl pidl;
-    if (desktop)
-        desktop.get()->ParseDisplayName(nullptr, nullptr, wide.data(), nullptr, pidl.Receive(), nullptr);
-    return pidl;
+    return ShellPidlOfPath(desktop.get(), path);
 }
 
 class Window : public CWnd {

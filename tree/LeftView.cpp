@@ -2,6 +2,7 @@
 
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
+#include "tree/ShellNamespace.h"
 #include "tree/StartShellPath.h"
 
 #include "res/resource.h"
@@ -10,22 +11,6 @@ namespace {
 
 constexpr UINT kTreeStyle = WS_CHILD | WS_VISIBLE | TVS_HASBUTTONS | TVS_HASLINES | TVS_LINESATROOT;
 constexpr UINT kAnimationPeriod = 125; // milliseconds
-
-// Parses a folder path into an item id list the way the shell would and frees it again: asks the shell
-// about the folder once before the tree walks to it (a network folder wakes up here). Failures do not
-// matter.
-void TouchFolder(IShellFolder* desktop, const std::string& path) {
-    if (!desktop || path.empty())
-        return;
-    const int n = ::MultiByteToWideChar(CP_THREAD_ACP, 0, path.c_str(), -1, nullptr, 0);
-    if (n <= 0)
-        return;
-    std::wstring wide(static_cast<std::size_t>(n), L'\0');
-    ::MultiByteToWideChar(CP_THREAD_ACP, 0, path.c_str(), -1, wide.data(), n);
-    CShellPidl parsed;
-    ULONG eaten = 0;
-    desktop->ParseDisplayName(nullptr, nullptr, wide.data(), &eaten, parsed.Receive(), nullptr);
-}
 
 } // namespace
 
@@ -72,7 +57,9 @@ bool CLeftView::Create(const char* className, const char* windowName, DWORD styl
     {
         CDesktopFolderRef desktop;
         if (doc)
-            TouchFolder(desktop.get(), doc->m_strPath);
+            // Asks the shell about the folder once before the tree walks to it (a network folder wakes
+            // up here); the answer does not matter.
+            ShellPidlOfPath(desktop.get(), doc->m_strPath);
     }
     m_wndTree.PopulateTree(nullptr, 0);
     if (!doc)
