@@ -56,7 +56,8 @@ struct ScriptCommand {
         TreeExpand,
         TreeCollapse,
         TreeRightClick,
-        TreeItems
+        TreeItems,
+        TreeCount
     };
     int line = 0;
     Kind kind = Kind::Echo;
@@ -71,6 +72,7 @@ struct ScriptCommand {
     std::wstring file;          // screenshot
     int ms = 0;                 // sleep
     std::wstring treePath;      // path=: a tree item's label path, labels joined by backslashes
+    int atLeast = 0;            // tree-count: at-least=N
 };
 
 // Reads a whole script. False with "line N: message" in `error` at the first bad line.

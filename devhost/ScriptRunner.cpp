@@ -541,6 +541,7 @@ void DriveTree(HWND tree, const ScriptCommand& command) {
 // Every item whose parents are open, from the top: "tree-item LEVEL LABEL [expanded] [selected]".
 void PrintTreeItems(HWND tree) {
     const HTREEITEM selected = TreeNext(tree, nullptr, TVGN_CARET);
+    const HTREEITEM dropTarget = TreeNext(tree, nullptr, TVGN_DROPHILITE);
     for (HTREEITEM item = TreeNext(tree, nullptr, TVGN_ROOT); item;
          item = TreeNext(tree, item, TVGN_NEXTVISIBLE)) {
         int level = 0;
@@ -553,6 +554,8 @@ void PrintTreeItems(HWND tree) {
             line += L" expanded";
         if (item == selected)
             line += L" selected";
+        if (item == dropTarget)
+            line += L" highlighted";
         Fact(line);
     }
 }
@@ -741,6 +744,22 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
     case Kind::TreeItems:
         PrintTreeItems(WaitForWindow(command));
         break;
+    case Kind::TreeCount: {
+        // The tree's items, waited for until there are at least N (a node being filled), at most timeout.
+        const HWND tree = WaitForWindow(command);
+        const DWORD begin = GetTickCount();
+        DWORD_PTR count = 0;
+        for (;;) {
+            if (!SendMessageTimeoutW(tree, TVM_GETCOUNT, 0, 0, SMTO_NORMAL, 1000, &count))
+                count = 0; // busy: asked again
+            if (static_cast<long long>(count) >= command.atLeast ||
+                GetTickCount() - begin >= static_cast<DWORD>(command.timeoutMs))
+                break;
+            Sleep(100);
+        }
+        Fact(L"tree-count " + std::to_wstring(count));
+        break;
+    }
     }
     return true;
 }
