@@ -11,17 +11,24 @@ tools/ensure-packages
 cmake --preset windows >/dev/null
 cmake --build --preset windows --target Orvex1 devhost gen-dwg-samples
 
-# Drawings to show: the real samples beside the project when they are there, else synthetic ones the
-# project generates (files in the drawing container layout with generated preview pictures).
-samples="$(cd .. && pwd)/shared/dwg-samples/2004"
-if [ ! -d "$samples" ]; then
-  samples="$PWD/build/demo-drawings"
-  if [ ! -d "$samples" ]; then
-    mkdir -p "$samples"
-    tools/wine-run build/windows/bin/gen-dwg-samples.exe "$(printf 'Z:%s' "$samples" | tr '/' '\\')" 60 >/dev/null
-  fi
+# Drawings to show: the real samples beside the project when they are there (one folder for each format
+# version), else synthetic ones the project generates (files in the drawing container layout with generated
+# preview pictures) in two folders. The explorer opens on their root: the tree shows the folders.
+root="$(cd .. && pwd)/shared/dwg-samples"
+if [ ! -d "$root/2004" ]; then
+  root="$PWD/build/demo-drawings"
+  for version in 2004 2010; do
+    if [ ! -d "$root/$version" ]; then
+      mkdir -p "$root/$version"
+      tools/wine-run build/windows/bin/gen-dwg-samples.exe "$(printf 'Z:%s' "$root/$version" | tr '/' '\\')" 40 \
+        --variant "${version: -2}" >/dev/null
+    fi
+  done
 fi
-folder=$(printf 'Z:%s\\' "$samples" | tr '/' '\\')
+# The folders in the tree's order; the demo walks into the second one.
+folders=$(find "$root" -mindepth 1 -maxdepth 1 -type d -printf '%f\n' | LC_ALL=C sort)
+samples="$root/$(printf '%s\n' "$folders" | sed -n 2p)"
+folder=$(printf 'Z:%s\\' "$root" | tr '/' '\\')
 lisp_folder=$(printf '%s' "$folder" | sed 's/\\/\\\\/g')
 call="(Orvex 1 2 \"$lisp_folder\" \"Insert\" \"Close\")"
 echo "Command: $call"
@@ -31,8 +38,9 @@ if [ -n "${DISPLAY:-}" ] && [ -z "${CI:-}" ] && [ -z "${DEMO_HEADLESS:-}" ]; the
   exit 0
 fi
 
-# Headless: a person's session, scripted, from fresh explorer settings.
-rm -f build/windows/bin/Orvex1.ini
+# Headless: a person's session, scripted, from fresh explorer settings with a left pane wide enough for
+# the tree's labels.
+printf '[Size]\r\nSplitterSize=240\r\n' >build/windows/bin/Orvex1.ini
 mkdir -p docs
 names=$(ls "$samples" | grep -i '\.dwg' | tr 'A-Z' 'a-z' | sort)
 first=$(printf '%s\n' "$names" | head -1)
@@ -41,10 +49,22 @@ prefix=${pick:0:2}
 frame="contains=\"$(basename "$samples")\" nth=0"   # the frame's title shows the folder
 script=build/demo-script.txt
 win() { printf 'Z:%s/%s' "$PWD" "$1" | tr '/' '\\'; }
+root_frame="contains=\"$(basename "$root")\" nth=0"
 cat >"$script" <<SCRIPT
-# Look at the explorer, hover a drawing for its tooltip, type the start of a name, pick that drawing.
+# The tree opens on the root of the drawings, its folders shown. Right selects the first folder, Down the
+# second: the grid shows its drawings.
+wait $root_frame timeout=30000
+sleep 800
+screenshot $root_frame $(win docs/explorer-tree.png)
+key right
 wait contains=".dwg" timeout=30000
 sleep 800
+key down
+wait $frame timeout=30000
+wait contains=".dwg" timeout=30000
+sleep 1000
+tree-items class=SysTreeView32
+# Look at the explorer, hover a drawing for its tooltip, type the start of a name, pick that drawing.
 screenshot $frame $(win docs/explorer.png)
 move text="$first" at=60,-50
 sleep 200
@@ -62,5 +82,42 @@ returned timeout=30000
 enabled class=DevhostFrame
 focus
 SCRIPT
-tools/wine-run build/windows/bin/devhost.exe --script "$(win "$script")" --eval "$call" | tr -d '\r'
-echo "Screenshots: docs/explorer.png, docs/explorer-tooltip.png, docs/explorer-search.png"
+tools/wine-run build/windows/bin/devhost.exe --script "$(win "$script")" --eval "$call" | tr -d '\r' |
+  grep -v '^\[script\] tree-item [0-9]* [^ ]*$' # the tree's lines, less the folders neither open nor chosen
+echo "Screenshots: docs/explorer-tree.png, docs/explorer.png, docs/explorer-tooltip.png, docs/explorer-search.png"
+
+# The folder's insertion parameters: a right click on the folder in the tree opens its one-entry menu and
+# the "Folder settings" dialog; a layer, a colour from the host's palette and a LISP command are filled in
+# and shown, then cancelled, so the sample folder keeps what it had. The tree opens on the root again,
+# the folder the first call picked in among its children.
+label=$(tr -d '\r' <build/windows/bin/Orvex1.ini | sed -n 's/^ShellPath=//p')
+dialog='class=#32770 text="Folder settings"'
+if [ -n "$label" ] && [ ! -e "$samples/datains.ini" ]; then
+  cat >"$script" <<SCRIPT
+wait $root_frame timeout=30000
+sleep 800
+tree-right-click class=SysTreeView32 path="$label"
+wait class=#32768 timeout=5000
+screenshot class=#32768 $(win docs/folder-menu.png)
+click class=#32768 at=30,10
+wait $dialog timeout=5000
+click $dialog > id=1081
+click $dialog > id=1017
+type "DOORS"
+click $dialog > id=200
+wait class=DevhostColorDialog timeout=5000
+click class=DevhostColorDialog > id=1030
+sleep 300
+screenshot class=DevhostColorDialog $(win docs/devhost-color-dialog.png)
+click class=DevhostColorDialog > id=1
+click $dialog > id=201
+type "(c:fixdoor)"
+sleep 300
+screenshot $dialog $(win docs/folder-settings.png)
+click $dialog > id=2
+key escape
+returned timeout=30000
+SCRIPT
+  tools/wine-run build/windows/bin/devhost.exe --script "$(win "$script")" --eval "$call" | tr -d '\r'
+  echo "Screenshots: docs/folder-menu.png, docs/folder-settings.png, docs/devhost-color-dialog.png"
+fi

@@ -3,6 +3,7 @@
 #   bench_sort, bench_preview   (Windows build, under Wine)
 #   bench_first_paint.sh        LISP call -> first complete paint of the explorer
 #   bench_scroll.sh             one scroll step at the top and at the bottom of the grid
+#   bench_tree_expand           the folder tree expanding a folder of 2,000 and of 20,000 sub-folders
 #   bench_scan                  folder scan against a bare FindFirstFile loop (last: it makes its folders)
 # Builds go to build/bench-win (mingw-w64, Release) and build/bench-native (the generator, to make the big
 # folders of drawings quickly); drawings to build/bench-data, kept between runs. BENCH_RUNS sets the runs
@@ -14,7 +15,7 @@ source bench/explorer-lib.sh
 
 {
   cmake -S . -B "$win_build" -G Ninja --toolchain cmake/mingw-w64-x86_64.cmake -DCMAKE_BUILD_TYPE=Release
-  cmake --build "$win_build" --target Orvex1 devhost gen-dwg-samples bench_sort bench_preview bench_scan
+  cmake --build "$win_build" --target Orvex1 devhost gen-dwg-samples bench_sort bench_preview bench_scan bench_tree_expand
   cmake -S . -B "$native_build" -G Ninja -DCMAKE_BUILD_TYPE=Release
   cmake --build "$native_build" --target gen-dwg-samples make_scan_folder
 } >"$root/build/bench-build.log" 2>&1 || {
@@ -36,6 +37,17 @@ bench/bench_first_paint.sh
 echo
 echo "== bench_scroll.sh"
 bench/bench_scroll.sh
+echo
+echo "== bench_tree_expand"
+# Its folders of empty sub-folders are made here (natively: much faster than through Wine), marked complete.
+for count in 2000 20000; do
+  dir="$data/tree/folders-$count"
+  if [ ! -f "$dir/.complete" ]; then
+    rm -rf "$dir" && mkdir -p "$dir"
+    (cd "$dir" && seq -f 'd%05g' 1 "$count" | xargs mkdir && touch .complete)
+  fi
+done
+run_wine "$win_build/bin/bench_tree_expand.exe" "$(winpath "$data/tree")" 2000 20000
 echo
 echo "== bench_scan"
 # bench_scan makes its folders itself when they lack their ".complete" marker; natively is much faster.

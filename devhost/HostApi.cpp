@@ -1,5 +1,6 @@
 // The host operations, exported by name from devhost.exe: the library finds them with GetProcAddress.
 // None lets an exception out: the caller is the library, across a module boundary.
+#include "devhost/ColorDialog.h"
 #include "devhost/HostObjects.h"
 #include "devhost/HostPrintf.h"
 #include "devhost/Output.h"
@@ -204,8 +205,15 @@ bool acdbGetLayerColor(const wchar_t* layerName, int* colorIndex) {
 }
 
 bool acedSetColorDialog(int* colorIndex, bool allowMetaColor, int currentLayerColor) {
-    Verbose(L"acedSetColorDialog: no colour dialog in devhost, answering no colour chosen");
-    return false;
+    return Guarded(false, [&] {
+        if (!colorIndex)
+            return false;
+        Verbose(L"acedSetColorDialog " + std::to_wstring(*colorIndex) + (allowMetaColor ? L" logical" : L""));
+        const bool chosen = RunColorDialog(colorIndex, allowMetaColor, currentLayerColor);
+        Verbose(chosen ? L"acedSetColorDialog chose " + std::to_wstring(*colorIndex)
+                       : std::wstring(L"acedSetColorDialog cancelled"));
+        return chosen;
+    });
 }
 
 std::uint32_t acedGetRGB(int colorIndex) {

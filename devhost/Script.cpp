@@ -153,6 +153,7 @@ const CommandName kCommands[] = {
     {L"tree-collapse", ScriptCommand::Kind::TreeCollapse, true, true},
     {L"tree-right-click", ScriptCommand::Kind::TreeRightClick, true, true},
     {L"tree-items", ScriptCommand::Kind::TreeItems, true, true},
+    {L"tree-count", ScriptCommand::Kind::TreeCount, true, true},
     {L"clipboard-put", ScriptCommand::Kind::ClipboardPut, false, false},
     {L"clipboard-files", ScriptCommand::Kind::ClipboardFiles, false, false},
 };
@@ -247,6 +248,13 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
                 return false;
             }
             command.treePath = value;
+            continue;
+        }
+        if (key == L"at-least" && command.kind == ScriptCommand::Kind::TreeCount) {
+            if (!ParseInt(value, command.atLeast)) {
+                error = L"at-least= takes a number: " + token;
+                return false;
+            }
             continue;
         }
         if (key == L"with" && name->window) {

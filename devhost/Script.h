@@ -57,6 +57,7 @@ struct ScriptCommand {
         TreeCollapse,
         TreeRightClick,
         TreeItems,
+        TreeCount,
         ClipboardPut,
         ClipboardFiles
     };
@@ -73,6 +74,7 @@ struct ScriptCommand {
     std::wstring file;          // screenshot
     int ms = 0;                 // sleep
     std::wstring treePath;      // path=: a tree item's label path, labels joined by backslashes
+    int atLeast = 0;            // tree-count: at-least=N
     bool wide = false;               // clipboard-put wide: the names as UTF-16
     std::vector<std::wstring> files; // clipboard-put: the names of the list
 };

@@ -1,6 +1,7 @@
 #include "devhost/ScriptRunner.h"
 
 #include "devhost/Bitmap.h"
+#include "devhost/ColorDialog.h"
 #include "devhost/HostObjects.h"
 #include "devhost/HostWindows.h"
 #include "devhost/Output.h"
@@ -626,6 +627,7 @@ void PrintClipboardFiles() {
 
 void PrintTreeItems(HWND tree) {
     const HTREEITEM selected = TreeNext(tree, nullptr, TVGN_CARET);
+    const HTREEITEM dropTarget = TreeNext(tree, nullptr, TVGN_DROPHILITE);
     for (HTREEITEM item = TreeNext(tree, nullptr, TVGN_ROOT); item;
          item = TreeNext(tree, item, TVGN_NEXTVISIBLE)) {
         int level = 0;
@@ -638,6 +640,8 @@ void PrintTreeItems(HWND tree) {
             line += L" expanded";
         if (item == selected)
             line += L" selected";
+        if (item == dropTarget)
+            line += L" highlighted";
         Fact(line);
     }
 }
@@ -752,8 +756,9 @@ void ScriptRunner::Run() {
                       EscapeControls(error.message));
             // Do not leave the LISP call waiting for input that will not come.
             // A menu or a box left open by the failed step would take the message and hold the call: end
-            // them first, then post, until the call has returned.
+            // them first (the colour dialog too), then post, until the call has returned.
             for (int round = 0; round < 200; ++round) {
+                CancelColorDialog();
                 if (EndNestedLoops(m_uiThreadId) == 0)
                     if (HWND dialog = FindRunDialog(m_uiThreadId))
                         PostMessageW(dialog, WM_ORVEX_RESULT, kAppCancel, 0);
@@ -877,6 +882,22 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
     case Kind::TreeItems:
         PrintTreeItems(WaitForWindow(command));
         break;
+    case Kind::TreeCount: {
+        // The tree's items, waited for until there are at least N (a node being filled), at most timeout.
+        const HWND tree = WaitForWindow(command);
+        const DWORD begin = GetTickCount();
+        DWORD_PTR count = 0;
+        for (;;) {
+            if (!SendMessageTimeoutW(tree, TVM_GETCOUNT, 0, 0, SMTO_NORMAL, 1000, &count))
+                count = 0; // busy: asked again
+            if (static_cast<long long>(count) >= command.atLeast ||
+                GetTickCount() - begin >= static_cast<DWORD>(command.timeoutMs))
+                break;
+            Sleep(100);
+        }
+        Fact(L"tree-count " + std::to_wstring(count));
+        break;
+    }
     case Kind::ClipboardPut:
         PutClipboardFiles(command);
         break;

@@ -1,5 +1,6 @@
 #include "devhost/Session.h"
 
+#include "devhost/ColorDialog.h"
 #include "devhost/HostObjects.h"
 #include "devhost/HostWindows.h"
 #include "devhost/Lisp.h"
@@ -73,7 +74,7 @@ void WaitPumping(HANDLE thread) {
 }
 
 // --after-ms: a thread timer (it fires inside the library's modal loop) that posts the accept or cancel
-// message to the run dialog once it is there.
+// message to the run dialog once it is there, and cancels the colour dialog if one is open.
 WPARAM g_postValue = 0;
 bool g_posted = false;
 
@@ -88,6 +89,9 @@ void CALLBACK PostTimer(HWND, UINT, UINT_PTR timer, DWORD) {
         return;
     }
     if (HWND dialog = FindRunDialog(GetCurrentThreadId())) {
+        // A call waiting in the colour dialog ends too. The dialog goes first: its loop would dispatch the
+        // result message to the run dialog, which takes it only from the library's own loop.
+        CancelColorDialog();
         PostMessageW(dialog, WM_ORVEX_RESULT, g_postValue, 0);
         if (!g_posted && Host().options.verbose)
             WriteLine(g_postValue == kAppAccept ? L"[host] posted accept" : L"[host] posted cancel");
@@ -96,7 +100,9 @@ void CALLBACK PostTimer(HWND, UINT, UINT_PTR timer, DWORD) {
         SetTimer(nullptr, timer, kRepostMs, &PostTimer);
         return;
     }
-    SetTimer(nullptr, timer, kPostRetryMs, &PostTimer); // not there yet: look again shortly
+    // Not there yet: look again shortly. A call waiting in the colour dialog meanwhile has had its time.
+    CancelColorDialog();
+    SetTimer(nullptr, timer, kPostRetryMs, &PostTimer);
 }
 
 class Session {

@@ -2,6 +2,8 @@
 
 #include "frame/AboutDlgArx.h"
 #include "fileops/ForFileCommands.h"
+#include "settings/DialogSetLa.h"
+#include "settings/FolderSettings.h"
 #include "settings/IniFile.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
@@ -74,10 +76,10 @@ std::string HelpFilePath() {
 
 std::string LayerLabelText(const std::string& folder) {
     // The separator is always added: datains.ini lies in the folder itself.
-    CIniFile ini(folder + "\\datains.ini");
+    CIniFile ini(FolderSettingsFilePath(folder));
     std::string layer;
     if (ini.ReadFile())
-        layer = ini.GetValue("Default Parameters", "Layer");
+        layer = ini.GetValue(kFolderSettingsSection, kFolderSettingsLayer);
     if (layer.empty())
         layer = "Current";
     return " Layer name: " + layer;
@@ -210,6 +212,7 @@ void CMainFrame::WireFolderTree() {
         if (m_hWnd && !text.empty())
             SetMessageText(text);
     };
+    tree->onFolderMenu = [this](HTREEITEM item, CPoint) { ShowFolderMenu(item); };
     tree->onFocusGrid = [this] {
         if (m_pGridView && m_pGridView->m_hWnd)
             m_pGridView->SetFocus();
@@ -222,6 +225,37 @@ void CMainFrame::WireFolderTree() {
             }
             return false;
         };
+}
+
+void CMainFrame::ShowFolderMenu(HTREEITEM item) {
+    CChildView* tree = GetFolderTree();
+    if (!tree || !item)
+        return;
+    // Virtual folders (Desktop, My Computer) keep no settings: no menu.
+    const std::string folder = tree->FolderPathOf(item);
+    if (folder.empty())
+        return;
+    CMenu menu;
+    if (!menu.CreatePopupMenu() || !menu.AppendMenu(MF_STRING, kFolderMenuSettings, "&Folder settings"))
+        return;
+    CRect text;
+    if (!tree->GetItemRect(item, &text, true))
+        return;
+    tree->ClientToScreen(&text);
+    const int chosen = menu.TrackPopupMenu(TPM_RETURNCMD | TPM_RIGHTBUTTON | TPM_NONOTIFY, text.right,
+                                           text.bottom, tree->m_hWnd);
+    if (chosen != kFolderMenuSettings)
+        return;
+    CDialogSetLa dialog(this);
+    if (!dialog.SetFolder(folder)) {
+        TellUser(FolderPathTooLongMessage(folder));
+        return;
+    }
+    // The label shows the current folder's layer, which a write or a delete may have changed.
+    dialog.onChanged = [this] { UpdateLayerLabel(); };
+    dialog.DoModal();
+    if (CChildView* again = GetFolderTree())
+        again->SetFocus();
 }
 
 CView* CMainFrame::MakeGridView() {

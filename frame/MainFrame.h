@@ -4,7 +4,9 @@
 //
 // Wiring. The frame makes its two views (through the splitter, with the creation context that carries
 // the document) and sets their handlers: the grid tells the frame about the pick, the title, the status
-// and the folder; Tab in the grid focuses the folder pane; the search edit runs the grid's search.
+// and the folder; Tab in the grid focuses the folder pane; the search edit runs the grid's search; a right
+// click on a folder of the tree opens its "&Folder settings" menu, whose dialog (settings/) tells the frame
+// when the folder's datains.ini changed, so the layer label is read again.
 //
 // Ownership. The frame is created with new and deletes itself when its window is destroyed; its bars,
 // labels, search edit and splitter are members, their windows children of the frame. The views delete
@@ -94,6 +96,8 @@ private:
     CView* MakeFolderPane();
     void WireFolderTree();
     void WireFileCommands(CTessel3View& grid);
+    // The folder tree's right-click menu, "&Folder settings", and the dialog it opens.
+    void ShowFolderMenu(HTREEITEM item);
     bool ForwardToGrid(UINT id);
     void SetSortMode(int mode);
     void ShowHelp();
@@ -115,6 +119,9 @@ private:
     CTessel3View* m_pGridView = nullptr;    // the right pane
     CLeftView* m_pFolderPane = nullptr;     // the left pane
 };
+
+// The one command of the folder tree's right-click menu.
+constexpr int kFolderMenuSettings = 1;
 
 // Id of the bottom toolbar's window (the top one has the standard toolbar id).
 constexpr UINT kPickToolBarId = AFX_IDW_TOOLBAR + 4;

@@ -49,9 +49,33 @@ bool CDialog::Create(UINT templateId, CWnd* parent) {
     return hwnd != nullptr && m_hWnd == hwnd;
 }
 
+namespace {
+// The innermost modal run of this thread; each run keeps the one it interrupted.
+thread_local CDialog* t_pInnermostModal = nullptr;
+} // namespace
+
+bool CDialog::OuterRunEnded() const {
+    for (const CDialog* outer = m_pOuterModal; outer; outer = outer->m_pOuterModal)
+        if (!outer->m_bModalRunning)
+            return true;
+    return false;
+}
+
 INT_PTR CDialog::DoModal() {
     if (m_hWnd || m_bModalRunning)
         return -1;
+    // Unwinds the modal chain on every way out.
+    struct ModalLink {
+        CDialog* self;
+        explicit ModalLink(CDialog* dialog) : self(dialog) {
+            self->m_pOuterModal = t_pInnermostModal;
+            t_pInnermostModal = self;
+        }
+        ~ModalLink() {
+            t_pInnermostModal = self->m_pOuterModal;
+            self->m_pOuterModal = nullptr;
+        }
+    } link(this);
     HWND owner = OwnerWindow();
     // Whether the owner takes input is read before the dialog exists: its initialisation may disable the
     // owner itself (the explorer disables the host's frame), and the owner gets back what it had.
@@ -74,6 +98,13 @@ INT_PTR CDialog::DoModal() {
     bool idle = true;
     long idleCount = 0;
     while (m_bModalRunning && m_hWnd) {
+        // A run this one interrupted has been ended (its owner's result came in meanwhile): this one
+        // ends too, as cancelled, so that the outer loop can return.
+        if (OuterRunEnded()) {
+            if (m_nModalResult == -1)
+                m_nModalResult = IDCANCEL;
+            break;
+        }
         MSG msg;
         // Idle work once the queue has emptied: update handlers grey and check buttons.
         while (idle && !::PeekMessageA(&msg, nullptr, 0, 0, PM_NOREMOVE)) {

@@ -195,6 +195,9 @@ public:
     HWND GetDlgItem(int id) const { return ::GetDlgItem(m_hWnd, id); }
     std::string GetDlgItemText(int id) const;
     void SetDlgItemText(int id, const std::string& text) { ::SetDlgItemTextA(m_hWnd, id, text.c_str()); }
+    // The check state of a dialog's check box or radio button (BST_CHECKED, ...).
+    UINT IsDlgButtonChecked(int id) const { return ::IsDlgButtonChecked(m_hWnd, id); }
+    void CheckDlgButton(int id, UINT check) { ::CheckDlgButton(m_hWnd, id, check); }
     int GetDlgCtrlID() const { return ::GetDlgCtrlID(m_hWnd); }
     DWORD GetStyle() const { return static_cast<DWORD>(::GetWindowLongPtrA(m_hWnd, GWL_STYLE)); }
     DWORD GetExStyle() const { return static_cast<DWORD>(::GetWindowLongPtrA(m_hWnd, GWL_EXSTYLE)); }
@@ -343,6 +346,9 @@ public:
     virtual void OnCancel() { EndDialog(IDCANCEL); }
 
     bool IsModalRunning() const { return m_bModalRunning; }
+    // Whether a modal run that this one's run interrupted has been ended: the nested run then ends as
+    // cancelled at once.
+    bool OuterRunEnded() const;
 
 protected:
     bool OnCommand(WPARAM wParam, LPARAM lParam) override;
@@ -358,6 +364,7 @@ private:
     friend INT_PTR CALLBACK AfxDlgProc(HWND, UINT, WPARAM, LPARAM);
     bool m_bModalRunning = false;
     INT_PTR m_nModalResult = -1;
+    CDialog* m_pOuterModal = nullptr; // the modal run this one's run interrupted, while it runs
 };
 
 // ---- controls ---------------------------------------------------------------------------------------
@@ -394,6 +401,18 @@ public:
     bool Create(const char* text, DWORD style, const RECT& rect, CWnd* parent, UINT id = 0xFFFF) {
         return CreateEx(0, "STATIC", text, style, rect, parent, id);
     }
+};
+
+// A push button, check box or radio button. The check state is BST_UNCHECKED, BST_CHECKED or
+// BST_INDETERMINATE.
+class CButton : public CWnd {
+public:
+    bool Create(const char* text, DWORD style, const RECT& rect, CWnd* parent, UINT id) {
+        return CreateEx(0, "BUTTON", text, style, rect, parent, id);
+    }
+    int GetCheck() const { return static_cast<int>(SendMessage(BM_GETCHECK)); }
+    void SetCheck(int check) { SendMessage(BM_SETCHECK, static_cast<WPARAM>(check)); }
+    bool IsChecked() const { return GetCheck() == BST_CHECKED; }
 };
 
 // ---- CMenu ------------------------------------------------------------------------------------------

@@ -12,6 +12,11 @@
 #define IDR_TOOLBAR2 204  // bottom toolbar: accept and cancel
 #define IDR_THUMB_MENU 208 // context menu of a thumbnail
 #define IDC_ABOUT_TEXT 1000
+// Folder settings dialog (IDD_SETLA)
+#define IDC_SETLA_COLOR 200        // the colour swatch
+#define IDC_SETLA_COMMAND 201      // the LISP command edit
+#define IDC_SETLA_LAYER 1017       // the layer name edit
+#define IDC_SETLA_USE_CURRENT 1081 // "&Use current layer"
 
 // Standard commands
 #define ID_FILE_NEW 57600

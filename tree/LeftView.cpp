@@ -2,6 +2,7 @@
 
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
+#include "tree/ShellNamespace.h"
 #include "tree/StartShellPath.h"
 
 #include "res/resource.h"
@@ -11,22 +12,6 @@ namespace {
 constexpr UINT kTreeStyle = WS_CHILD | WS_VISIBLE | TVS_HASBUTTONS | TVS_HASLINES | TVS_LINESATROOT;
 constexpr UINT kAnimationPeriod = 125; // milliseconds
 
-// Parses a folder path into an item id list the way the shell would and frees it again: asks the shell
-// about the folder once before the tree walks to it (a network folder wakes up here). Failures do not
-// matter.
-void TouchFolder(IShellFolder* desktop, const std::string& path) {
-    if (!desktop || path.empty())
-        return;
-    const int n = ::MultiByteToWideChar(CP_THREAD_ACP, 0, path.c_str(), -1, nullptr, 0);
-    if (n <= 0)
-        return;
-    std::wstring wide(static_cast<std::size_t>(n), L'\0');
-    ::MultiByteToWideChar(CP_THREAD_ACP, 0, path.c_str(), -1, wide.data(), n);
-    CShellPidl parsed;
-    ULONG eaten = 0;
-    desktop->ParseDisplayName(nullptr, nullptr, wide.data(), &eaten, parsed.Receive(), nullptr);
-}
-
 } // namespace
 
 CChildView::CChildView() {
@@ -34,6 +19,10 @@ CChildView::CChildView() {
     SetAnimationPeriod(kAnimationPeriod);
     m_hHourglassCursor = static_cast<HCURSOR>(::LoadCursorW(AfxGetInstanceHandle(), MAKEINTRESOURCEW(IDC_HOURGLASS)));
     SetHourglass(m_hHourglassCursor);
+    // The system icons are asked for when an item is first shown, not at insertion: the shell takes
+    // milliseconds for each (under Wine about 8 ms for a folder's two icons), which made a folder of
+    // 20,000 sub-folders a minutes-long filling. Labels and child indicators stay computed at insertion.
+    SetCallbackMask(kCallbackImage | kCallbackSelectedImage);
 }
 
 CChildView::~CChildView() {
@@ -68,7 +57,9 @@ bool CLeftView::Create(const char* className, const char* windowName, DWORD styl
     {
         CDesktopFolderRef desktop;
         if (doc)
-            TouchFolder(desktop.get(), doc->m_strPath);
+            // Asks the shell about the folder once before the tree walks to it (a network folder wakes
+            // up here); the answer does not matter.
+            ShellPidlOfPath(desktop.get(), doc->m_strPath);
     }
     m_wndTree.PopulateTree(nullptr, 0);
     if (!doc)

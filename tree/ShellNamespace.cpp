@@ -71,6 +71,20 @@ IShellFolder* BindShellFolder(IShellFolder* desktop, LPCITEMIDLIST absoluteId) {
     return folder;
 }
 
+CShellPidl ShellPidlOfPath(IShellFolder* desktop, const std::string& path) {
+    CShellPidl parsed;
+    if (!desktop || path.empty())
+        return parsed;
+    const int n = ::MultiByteToWideChar(CP_THREAD_ACP, 0, path.c_str(), -1, nullptr, 0);
+    if (n <= 0)
+        return parsed;
+    std::wstring wide(static_cast<std::size_t>(n), L'\0');
+    ::MultiByteToWideChar(CP_THREAD_ACP, 0, path.c_str(), -1, wide.data(), n);
+    ULONG eaten = 0;
+    desktop->ParseDisplayName(nullptr, nullptr, wide.data(), &eaten, parsed.Receive(), nullptr);
+    return parsed;
+}
+
 int CompareShellIds(IShellFolder* folder, LPCITEMIDLIST a, LPCITEMIDLIST b) {
     const HRESULT result = folder->CompareIDs(0, a, b);
     if (FAILED(result))

@@ -24,6 +24,10 @@ bool ShellHasChildren(IShellFolder* parentFolder, LPCITEMIDLIST relativeId, std:
 // for paths that do not fit `capacity` characters with their terminator.
 bool ShellFileSystemPath(LPCITEMIDLIST absoluteId, std::string& path, std::size_t capacity = MAX_PATH);
 
+// The absolute id the shell parses a file-system path into (text in the thread's code page); empty when
+// the shell does not know the path.
+CShellPidl ShellPidlOfPath(IShellFolder* desktop, const std::string& path);
+
 // The folder of an absolute id, with one reference for the caller: the desktop folder itself for the
 // empty list, otherwise bound through it. Null when it cannot be bound.
 IShellFolder* BindShellFolder(IShellFolder* desktop, LPCITEMIDLIST absoluteId);

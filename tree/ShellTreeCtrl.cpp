@@ -301,6 +301,12 @@ void CShellTreeCtrl::OnSelChanged(HTREEITEM item) {
     const int scanned = ScanFolder(item, ".dwg", &problem);
     // Stays highlighted while the focus is in the grid.
     SelectDropTarget(item);
+    if (GetDropHilightItem() != item) {
+        // A control that will not highlight its selected item (Wine's) would keep the highlight on the
+        // item before: none stays elsewhere, and the selection itself shows while the focus is away.
+        SelectDropTarget(nullptr);
+        ModifyStyle(0, TVS_SHOWSELALWAYS);
+    }
     ShowScanned(item, scanned, problem);
     SetFocus();
 }
@@ -316,8 +322,11 @@ bool CShellTreeCtrl::OnNotifyReflect(NMHDR* hdr, LRESULT* result) {
     }
     case TVN_GETDISPINFOA: {
         auto* info = reinterpret_cast<NMTVDISPINFOA*>(hdr);
-        if (const auto* node = reinterpret_cast<const CShellNode*>(info->item.lParam))
+        if (const auto* node = reinterpret_cast<const CShellNode*>(info->item.lParam)) {
             FillDisplayInfo(info->item, *node, info->item.mask, hdr->code == TVN_GETDISPINFOW);
+            // The control keeps what it was given: each attribute is asked for once, when first shown.
+            info->item.mask |= TVIF_DI_SETITEM;
+        }
         *result = 0;
         return true;
     }

@@ -112,15 +112,22 @@ protected:
         m_rcFrame.right = m_rcFrame.left + 56;
         m_brFrame.Attach(::CreateSolidBrush(RGB(0, 0, 0)));
         m_brBar.Attach(::CreateSolidBrush(RGB(255, 0, 0)));
+        m_nDrawnWidth = -1;
     }
     void DoAnimation(bool tick, int total, int count) override {
         T::DoAnimation(tick, total, count);
         if (tick || !m_brFrame.GetSafeHandle() || !m_brBar.GetSafeHandle())
             return;
+        // Drawn again only when the bar grew: a report for every one of many thousand items would
+        // otherwise cost a drawing each, and drawing into another thread's window is slow.
+        const int width = orvex::tree::ProgressWidth(total, count);
+        if (width == m_nDrawnWidth)
+            return;
+        m_nDrawnWidth = width;
         if (HDC dc = this->GetAnimationDC()) {
             ::FrameRect(dc, &m_rcFrame, m_brFrame);
             CRect bar = m_rcBar;
-            bar.right = bar.left + orvex::tree::ProgressWidth(total, count);
+            bar.right = bar.left + width;
             ::FillRect(dc, &bar, m_brBar);
             this->ReleaseAnimationDC(dc);
         }
@@ -133,6 +140,7 @@ protected:
 
     CRect m_rcFrame, m_rcBar;
     CGdiObjectT<HBRUSH> m_brFrame, m_brBar;
+    int m_nDrawnWidth = -1; // the bar's width on the screen; -1 before the first drawing
 };
 
 // An animated hourglass in the loading item's icon place, one step a timer tick, over the progress bar

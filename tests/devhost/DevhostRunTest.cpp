@@ -212,12 +212,53 @@ TEST(Devhost, LayersPaletteAndWindows) {
     const RunResult run =
         RunDevhost({L"--layer", L"WALLS=1", L"--layer", L"Doors=20", L"--eval", L"(layer \"walls\")",
                     L"--eval", L"(layer \"DOORS\")", L"--eval", L"(layer \"0\")", L"--eval",
-                    L"(layer \"none\")", L"--eval", L"(windows)", L"--eval", L"(misc)"});
+                    L"(layer \"none\")", L"--eval", L"(windows)"});
     EXPECT_EQ(run.exitCode, 0u) << run.errors;
     EXPECT_EQ(
         run.lines,
         WithCalls({"=> (\"walls\" 1 255)", "=> (\"DOORS\" 20 16383)", "=> (\"0\" 7 16777215)", "=> nil",
-                   "=> (\"DevhostFrame\" \"DevhostFrame\" \"DevhostDrawingView\" 1 1)", "=> (0 3 0 8)"}));
+                   "=> (\"DevhostFrame\" \"DevhostFrame\" \"DevhostDrawingView\" 1 1)"}));
+}
+
+// (misc) opens the colour dialog on index 3 without logical colours and returns (chosen index drawn code).
+TEST(Devhost, ColourDialogChosenWithClicks) {
+    const std::wstring script = TempFile(L"colour.txt");
+    WriteFileText(script, "wait class=DevhostColorDialog timeout=10000\n"
+                          "text class=DevhostColorDialog > id=1302\n"
+                          "enabled class=DevhostColorDialog > text=ByLayer\n"
+                          "enabled class=DevhostColorDialog > text=ByBlock\n"
+                          "count class=DevhostColorDialog > class=DevhostSwatch\n"
+                          "enabled class=DevhostFrame\n"
+                          "click class=DevhostColorDialog > id=1005\n"
+                          "text class=DevhostColorDialog > id=1302\n"
+                          "click class=DevhostColorDialog > id=1\n"
+                          "gone class=DevhostColorDialog visible=any\n");
+    const RunResult run = RunDevhost({L"--script", script, L"--eval", L"(misc)"});
+    EXPECT_EQ(run.exitCode, 0u) << run.errors << run.output;
+    // 255 palette swatches and the sample of the chosen colour; the host's frame is disabled meanwhile.
+    EXPECT_EQ(run.lines, WithCalls({"[script] text Color 3", "[script] enabled no", "[script] enabled no",
+                                    "[script] count 256", "[script] enabled no", "[script] text Color 5",
+                                    "=> (1 5 0 8)"}));
+}
+
+TEST(Devhost, ColourDialogCancelled) {
+    const std::wstring script = TempFile(L"colour-cancel.txt");
+    WriteFileText(script, "wait class=DevhostColorDialog timeout=10000\n"
+                          "click class=DevhostColorDialog > id=1200\n"
+                          "click class=DevhostColorDialog > text=Cancel\n"
+                          "returned\n"
+                          "exists class=DevhostColorDialog visible=any\n"
+                          "enabled class=DevhostFrame\n");
+    const RunResult run = RunDevhost({L"--script", script, L"--eval", L"(misc)"});
+    EXPECT_EQ(run.exitCode, 0u) << run.errors << run.output;
+    EXPECT_EQ(run.lines, WithCalls({"=> (0 3 0 8)", "[script] returned", "[script] exists no",
+                                    "[script] enabled yes"}));
+}
+
+TEST(Devhost, AfterMsEndsACallWaitingInTheColourDialog) {
+    const RunResult run = RunDevhost({L"--after-ms", L"300", L"--post", L"cancel", L"--eval", L"(misc)"});
+    EXPECT_EQ(run.exitCode, 0u) << run.errors;
+    EXPECT_EQ(run.lines, WithCalls({"=> (0 3 0 8)"}));
 }
 
 TEST(Devhost, PostsAcceptAndCancelToTheRunDialog) {

@@ -27,8 +27,11 @@ nocall='(Orvex 1 2 "" "Insert" "Close")'
 counts() { printf '%s\n' "$OUT" | sed -n 's/^\[script\] count //p' | while read -r n; do echo $((n - 1)); done |
            tr '\n' ' ' | sed 's/ $//'; }
 titles() { printf '%s\n' "$OUT" | sed -n 's/^\[script\] text //p' | sed 's/.*\\//' | tr '\n' ' ' | sed 's/ $//'; }
-selected() { printf '%s\n' "$OUT" | sed -n 's/^\[script\] tree-item [0-9]* \(.*\) selected$/\1/p' |
+selected() { printf '%s\n' "$OUT" | sed 's/ highlighted$//' |
+             sed -n 's/^\[script\] tree-item [0-9]* \(.*\) selected$/\1/p' |
              sed 's/ expanded$//' | tr '\n' ' ' | sed 's/ $//'; }
+# The items highlighted but not selected: the highlight must follow the selection (none).
+stray_highlights() { printf '%s\n' "$OUT" | grep '^\[script\] tree-item .* highlighted$' | grep -v ' selected highlighted$'; }
 ini_value() { tr -d '\r' <"$WORK/lib/Orvex1.ini" 2>/dev/null | sed -n "s/^$1=//p"; }
 frame='contains="orvextree" nth=0'
 has() { printf '%s\n' "$1" | grep -q -- "$2"; } # has TEXT PATTERN
@@ -53,7 +56,8 @@ expect_true "the grid follows the selection: c 4, Up b 3, Up a 2, Down x3 side 1
 expect_true "the title names the selected folder (got $(titles))" [ "$(titles)" == "c b a side a b" ]
 sel=$(selected)
 expect_true "the start folder and then b are the selected tree items (got $sel)" [ "$sel" == "c b" ]
-expect_true "c is selected in the tree, opened from the start path" has "$OUT" ' tree-item [0-9]* c \(expanded \)\?selected$'
+expect_true "c is selected in the tree, opened from the start path" has "$OUT" ' tree-item [0-9]* c \(expanded \)\?selected highlighted$'
+expect_true "only the selected item is highlighted after keys ($(stray_highlights | tr '\n' ' '))" [ -z "$(stray_highlights)" ]
 foci=$(printf '%s\n' "$OUT" | sed -n 's/^\[script\] focus //p' | tr '\n' '|')
 expect_true "Tab moves from the tree to the grid, the right pane (got $foci)" has "${foci%%|*}" ' id=59649$'
 expect_true "Tab in the grid moves back to the tree (got $foci)" [ "${foci#*|}" == "SysTreeView32 id=59648|" ]
@@ -74,7 +78,7 @@ script 'wait contains="bravo-1.dwg" timeout=30000' \
        "tree-collapse $tree path=\"$a_path\"" 'echo collapsed' "tree-items $tree" 'echo end' \
        "tree-expand $tree path=\"$a_path\"" \
        "tree-select $tree path=\"$a_path\\side\"" "${look[@]}" \
-       "tree-select $tree path=\"$shellpath\\c\"" "${look[@]}" \
+       "tree-select $tree path=\"$shellpath\\c\"" "${look[@]}" "tree-items $tree" \
        "screenshot $frame $(winpath "$WORK/tree-clicked.png")" 'key escape'
 run "$nocall"
 expect_true "clicks select side and then c (got $(counts) / $(titles))" \
@@ -82,7 +86,8 @@ expect_true "clicks select side and then c (got $(counts) / $(titles))" \
 collapsed=$(printf '%s\n' "$OUT" | sed -n '/^\[script\] collapsed$/,/^\[script\] end$/p')
 expect_true "a click on a's button hides its sub-folders" \
   [ "$(printf '%s\n' "$collapsed" | grep -c ' tree-item [0-9]* \(b\|side\)\( \|$\)')" -eq 0 ]
-expect_true "and a is selected then" has "$collapsed" ' tree-item [0-9]* a selected$'
+expect_true "and a is selected then" has "$collapsed" ' tree-item [0-9]* a selected\( highlighted\)\?$'
+expect_true "only the selected item is highlighted after clicks ($(stray_highlights | tr '\n' ' '))" [ -z "$(stray_highlights)" ]
 
 # 4. A start path whose middle folder is missing: the walk stops there and the explorer still opens.
 script "wait $frame timeout=30000" 'count contains=".dwg" visible=any' "tree-items $tree" 'key escape'

@@ -288,3 +288,41 @@ TEST(Dialog, ModelessDialogsAreCreatedAndBound) {
     EXPECT_EQ(dlg.edit.m_hWnd, nullptr);
     PumpPending();
 }
+
+TEST(Dialog, ANestedRunEndsAsCancelledWhenTheRunItInterruptedIsEnded) {
+    // The outer dialog's step runs an inner dialog; the inner one's step ends the outer run, as a result
+    // message for the outer dialog would while the inner loop runs.
+    TestDialog outer;
+    INT_PTR innerResult = 0;
+    bool innerSawOuterEnd = false;
+    outer.onStep = [&](TestDialog& o, int step) {
+        if (step != 0)
+            return;
+        TestDialog inner;
+        inner.onStep = [&](TestDialog&, int) {
+            o.EndDialog(2);
+            innerSawOuterEnd = true;
+        };
+        innerResult = inner.DoModal();
+    };
+    EXPECT_EQ(outer.DoModal(), 2);
+    EXPECT_TRUE(innerSawOuterEnd);
+    EXPECT_EQ(innerResult, IDCANCEL);
+}
+
+TEST(Dialog, ANestedRunEndingItselfLeavesTheOuterRunGoing) {
+    TestDialog outer;
+    INT_PTR innerResult = 0;
+    outer.onStep = [&](TestDialog& o, int step) {
+        if (step == 0) {
+            TestDialog inner;
+            inner.onStep = [](TestDialog& i, int) { i.EndDialog(7); };
+            innerResult = inner.DoModal();
+            o.PostMessage(WM_TEST_STEP, 1);
+        } else {
+            o.EndDialog(3);
+        }
+    };
+    EXPECT_EQ(outer.DoModal(), 3);
+    EXPECT_EQ(innerResult, 7);
+}

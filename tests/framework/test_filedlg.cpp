@@ -1,6 +1,5 @@
 // The framework's check box, save-file dialog and message box in real windows under Wine. The dialogs are
 // answered by a thread timer that finds them and presses a button, as a person would.
-#include "afxbutton.h"
 #include "afxfiledlg.h"
 #include "test_support.h"
 

@@ -25,11 +25,7 @@ private:
 // The absolute id of a file-system path, or empty.
 inline CShellPidl PidlOfPath(const std::string& path) {
     CDesktopFolderRef desktop;
-    std::wstring wide(path.begin(), path.end());
-    CShellPidl pidl;
-    if (desktop)
-        desktop.get()->ParseDisplayName(nullptr, nullptr, wide.data(), nullptr, pidl.Receive(), nullptr);
-    return pidl;
+    return ShellPidlOfPath(desktop.get(), path);
 }
 
 } // namespace treetest

@@ -1,0 +1,49 @@
+// "Folder settings": the modal dialog that edits a drawing folder's insertion parameters (layer, LISP
+// command, colour) in the folder's "datains.ini".
+//
+// Use. SetFolder first (it refuses a folder whose settings file would not fit the path buffer, before
+// copying anything), then DoModal. Accept deletes the file (box "Use current layer" checked, no command),
+// keeps the dialog open with an alert (box clear, no layer name), or writes Layer, Lisp command and Color
+// and keeps every other key the file had. After a write or a delete onChanged tells the owner, which
+// shows the folder's layer again.
+//
+// Ownership. The controls are dialog items subclassed by the members below; they go with the dialog.
+#pragma once
+
+#include "framework/afxwin.h"
+#include "settings/IniFile.h"
+#include "settings/FolderSettings.h"
+#include "settings/StaticColor.h"
+
+#include <functional>
+#include <string>
+
+class CDialogSetLa : public CDialog {
+public:
+    explicit CDialogSetLa(CWnd* parent = nullptr);
+
+    // Copies the folder into the path buffer; false, and nothing copied, when the folder and
+    // "\datains.ini" would not fit it.
+    bool SetFolder(const std::string& folder);
+    // The buffer: the folder, or the settings file's path once the dialog is initialised.
+    const char* GetPathBuffer() const { return m_szPath; }
+
+    // Set by the owner: the folder's file was written or deleted.
+    std::function<void()> onChanged;
+
+    bool OnInitDialog() override;
+    void OnOK() override;
+
+protected:
+    bool OnCommand(WPARAM wParam, LPARAM lParam) override;
+
+private:
+    void OnUseCurrentLayer();
+    bool UseCurrentLayer() const;
+
+    CIniFile m_IniFile;
+    char m_szPath[kFolderPathBufferSize] = "";
+    CEdit m_LispCommand;
+    CStaticColor m_StaticColor;
+    CEdit m_LayerName;
+};

@@ -1,0 +1,58 @@
+#include "settings/FolderSettings.h"
+
+#include "settings/IniFile.h"
+
+#include <cstdio>
+
+std::string FolderSettingsFilePath(const std::string& folder) {
+    return folder + "\\" + kFolderSettingsFile;
+}
+
+bool FolderSettingsPathFits(const std::string& folder) {
+    return FolderSettingsFilePath(folder).size() < static_cast<std::size_t>(kFolderPathBufferSize);
+}
+
+std::string FolderPathTooLongMessage(const std::string& folder) {
+    const std::size_t length = FolderSettingsFilePath(folder).size();
+    return "The folder's path is too long for its settings (" + std::to_string(length) +
+           " characters with \\" + kFolderSettingsFile + ", at most " +
+           std::to_string(kFolderPathBufferSize - 1) + "); they cannot be edited here:\n" + folder;
+}
+
+FolderSettingsView ReadFolderSettingsView(CIniFile& store, bool fileRead) {
+    FolderSettingsView view;
+    if (!fileRead)
+        return view; // the defaults: box checked, layer edit disabled, swatch enabled and untouched
+    view.layer = store.GetValue(kFolderSettingsSection, kFolderSettingsLayer);
+    view.command = store.GetValue(kFolderSettingsSection, kFolderSettingsCommand);
+    if (view.layer.empty()) {
+        view.useCurrentLayer = true;
+        view.layerEditEnabled = false;
+        view.swatchEnabled = false;
+    } else {
+        view.useCurrentLayer = false;
+        view.layerEditEnabled = true;
+        view.swatchEnabled = true;
+        view.colorFromFile = true;
+        view.colorIndex = store.GetValueI(kFolderSettingsSection, kFolderSettingsColor);
+    }
+    return view;
+}
+
+FolderSettingsAction DecideFolderSettingsAccept(bool useCurrentLayer, const std::string& layer,
+                                                const std::string& command) {
+    if (useCurrentLayer)
+        return command.empty() ? FolderSettingsAction::DeleteFile : FolderSettingsAction::Write;
+    return layer.empty() ? FolderSettingsAction::AskLayer : FolderSettingsAction::Write;
+}
+
+bool WriteFolderSettings(CIniFile& store, const std::string& filePath, const std::string& layer,
+                         const std::string& command, int colorIndex) {
+    char color[16];
+    std::snprintf(color, sizeof color, "%i", colorIndex);
+    store.SetPath(filePath);
+    store.SetValue(kFolderSettingsSection, kFolderSettingsLayer, layer, true);
+    store.SetValue(kFolderSettingsSection, kFolderSettingsCommand, command, true);
+    store.SetValue(kFolderSettingsSection, kFolderSettingsColor, color, true);
+    return store.WriteFile();
+}

@@ -1,0 +1,272 @@
+// The shell folder tree in a real window: the walk along a label path, display attributes supplied at
+// insertion or on demand, and what a selection does to the document, the drawing list and the highlight.
+#include "ShellTestSupport.h"
+#include "settings/Tessel3Doc.h"
+#include "thumbs/DwgList.h"
+#include "tree/ShellTreeCtrl.h"
+#include "tree/StartShellPath.h"
+#include "tests/support/TempFolder.h"
+
+#include <windows.h>
+
+#include <string>
+#include <vector>
+
+namespace {
+
+CWinApp theApp("ShellTreeTests");
+
+using treetest::ShellTest;
+using testsupport::TempFolder;
+
+constexpr DWORD kTreeStyle = WS_CHILD | WS_VISIBLE | TVS_HASBUTTONS | TVS_HASLINES | TVS_LINESATROOT;
+
+void PumpPending() {
+    MSG msg;
+    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
+        ::TranslateMessage(&msg);
+        ::DispatchMessageA(&msg);
+    }
+}
+
+bool SameText(const std::string& a, const std::string& b) { return lstrcmpiA(a.c_str(), b.c_str()) == 0; }
+
+// The Desktop's label, the first of every label path.
+std::string ShellDesktopLabel() {
+    const std::string path = StartShellPathOf("C:\\");
+    return path.substr(0, path.find('\\'));
+}
+
+class ParentWnd : public CWnd {
+public:
+    bool CreateShown() {
+        return CreateEx(0, nullptr, "shell tree", WS_POPUP | WS_VISIBLE, CRect(10, 10, 610, 710), nullptr, 0);
+    }
+};
+
+// Counts the attributes the control asks for on demand.
+class CountingTree : public CShellTreeCtrl {
+public:
+    int imageRequests = 0;
+    int textRequests = 0;
+
+protected:
+    bool OnNotifyReflect(NMHDR* hdr, LRESULT* result) override {
+        if (AfxTreeNotifyCode(hdr->code) == TVN_GETDISPINFOA) {
+            const auto* info = reinterpret_cast<const NMTVDISPINFOA*>(hdr);
+            imageRequests += (info->item.mask & (TVIF_IMAGE | TVIF_SELECTEDIMAGE)) != 0;
+            textRequests += (info->item.mask & TVIF_TEXT) != 0;
+        }
+        return CShellTreeCtrl::OnNotifyReflect(hdr, result);
+    }
+};
+
+class ShellTree : public ShellTest {
+protected:
+    void SetUp() override {
+        ShellTest::SetUp();
+        ASSERT_TRUE(parent.CreateShown());
+        // base\a\b (two drawings), base\a\side, base\a\b\c
+        a = folder.MakeDir("a");
+        b = a + "\\b";
+        c = b + "\\c";
+        side = a + "\\side";
+        for (const std::string& dir : {b, c, side})
+            ASSERT_TRUE(CreateDirectoryA(dir.c_str(), nullptr)) << dir;
+        testsupport::WriteBytes(b + "\\one.dwg", "AC1018");
+        testsupport::WriteBytes(b + "\\two.dwg", "AC1018");
+    }
+    void TearDown() override {
+        parent.DestroyWindow();
+        ::SetCurrentDirectoryA(originalDirectory.c_str());
+        ShellTest::TearDown();
+    }
+    // A tree of the whole namespace from the Desktop, opened along b's label path.
+    void OpenAt(CountingTree& tree, const std::string& dir, UINT callbackMask = 0, int id = 1) {
+        tree.SetCallbackMask(callbackMask);
+        ASSERT_TRUE(tree.Create(kTreeStyle, CRect(0, 0, 600, 700), &parent, id));
+        tree.PopulateTree(nullptr, 0);
+        tree.ExpandToLabelPath(StartShellPathOf(dir + "\\"));
+        PumpPending();
+    }
+    HTREEITEM ChildNamed(CShellTreeCtrl& tree, HTREEITEM node, const std::string& label) {
+        for (HTREEITEM child = tree.GetChildItem(node); child; child = tree.GetNextSiblingItem(child))
+            if (SameText(tree.GetItemText(child), label))
+                return child;
+        return nullptr;
+    }
+
+    std::string originalDirectory = [] {
+        char dir[MAX_PATH] = "";
+        ::GetCurrentDirectoryA(MAX_PATH, dir);
+        return std::string(dir);
+    }();
+    TempFolder folder{"orvex-shelltree"};
+    std::string a, b, c, side;
+    ParentWnd parent;
+};
+
+TEST_F(ShellTree, TheWalkOpensTheFolderOfALabelPathWhateverItsCaseAndMakesItThePathTarget) {
+    CountingTree tree;
+    tree.SetCallbackMask(0);
+    ASSERT_TRUE(tree.Create(kTreeStyle, CRect(0, 0, 600, 700), &parent, 1));
+    tree.PopulateTree(nullptr, 0);
+    ASSERT_NE(tree.GetRootItem(), nullptr);
+    EXPECT_EQ(tree.GetItemText(tree.GetRootItem()), ShellDesktopLabel());
+
+    const std::string labelPath = StartShellPathOf(b + "\\");
+    std::string shouted = labelPath;
+    CharUpperA(shouted.data());
+    tree.ExpandToLabelPath(shouted);
+    HTREEITEM target = tree.m_hPathTarget;
+    ASSERT_NE(target, nullptr);
+    EXPECT_TRUE(SameText(tree.FolderPathOf(target), b)) << tree.FolderPathOf(target);
+    // The tree's own label path of the node is the one the call built (less its final backslash).
+    EXPECT_TRUE(SameText(tree.GetLabelPath(target) + "\\", labelPath)) << tree.GetLabelPath(target);
+    EXPECT_TRUE(tree.GetItemState(target, TVIS_EXPANDED) & TVIS_EXPANDED);
+    // Selects nothing.
+    EXPECT_EQ(tree.GetSelectedItem(), nullptr);
+
+    // A missing middle folder: the folders before it are opened, the path target stays.
+    tree.ExpandToLabelPath(StartShellPathOf(a + "\\missing\\c\\"));
+    EXPECT_EQ(tree.m_hPathTarget, target);
+    HTREEITEM aNode = tree.GetParentItem(target);
+    ASSERT_NE(aNode, nullptr);
+    EXPECT_TRUE(SameText(tree.FolderPathOf(aNode), a));
+    EXPECT_NE(ChildNamed(tree, aNode, "side"), nullptr);
+    EXPECT_EQ(ChildNamed(tree, aNode, "missing"), nullptr);
+}
+
+TEST_F(ShellTree, SubFoldersComeSortedAndAnEmptyOneLosesItsButtonWhenOpened) {
+    CountingTree tree;
+    OpenAt(tree, a);
+    HTREEITEM aNode = tree.m_hPathTarget;
+    ASSERT_NE(aNode, nullptr);
+    std::vector<std::string> labels;
+    for (HTREEITEM child = tree.GetChildItem(aNode); child; child = tree.GetNextSiblingItem(child))
+        labels.push_back(tree.GetItemText(child));
+    EXPECT_EQ(labels, (std::vector<std::string>{"b", "side"}));
+    TVITEMA item{};
+    item.mask = TVIF_CHILDREN;
+    item.hItem = ChildNamed(tree, aNode, "b");
+    ASSERT_TRUE(tree.GetItem(&item));
+    EXPECT_EQ(item.cChildren, 1); // c
+    // An empty folder on a fixed drive loses its button once it was opened (the shell may announce
+    // sub-folders for a folder without any, as Wine's does).
+    HTREEITEM sideNode = ChildNamed(tree, aNode, "side");
+    ASSERT_NE(sideNode, nullptr);
+    tree.Expand(sideNode, TVE_EXPAND);
+    item.hItem = sideNode;
+    ASSERT_TRUE(tree.GetItem(&item));
+    EXPECT_EQ(item.cChildren, 0);
+    EXPECT_EQ(tree.GetChildItem(sideNode), nullptr);
+}
+
+TEST_F(ShellTree, AttributesSuppliedOnDemandEqualThoseComputedAtInsertion) {
+    CountingTree atInsertion, onDemand;
+    OpenAt(atInsertion, a, 0, 1);
+    OpenAt(onDemand, a, 0x63, 2);
+    ASSERT_NE(atInsertion.m_hPathTarget, nullptr);
+    ASSERT_NE(onDemand.m_hPathTarget, nullptr);
+    EXPECT_EQ(onDemand.GetCallbackMask(), 0x63u);
+    EXPECT_EQ(atInsertion.textRequests + atInsertion.imageRequests, 0);
+
+    HTREEITEM x = atInsertion.GetChildItem(atInsertion.m_hPathTarget);
+    HTREEITEM y = onDemand.GetChildItem(onDemand.m_hPathTarget);
+    int compared = 0;
+    for (; x && y; x = atInsertion.GetNextSiblingItem(x), y = onDemand.GetNextSiblingItem(y), ++compared) {
+        char textX[MAX_PATH] = "", textY[MAX_PATH] = "";
+        TVITEMA itemX{}, itemY{};
+        itemX.mask = itemY.mask = TVIF_TEXT | TVIF_IMAGE | TVIF_SELECTEDIMAGE | TVIF_CHILDREN;
+        itemX.hItem = x;
+        itemY.hItem = y;
+        itemX.pszText = textX;
+        itemY.pszText = textY;
+        itemX.cchTextMax = itemY.cchTextMax = MAX_PATH;
+        ASSERT_TRUE(atInsertion.GetItem(&itemX));
+        ASSERT_TRUE(onDemand.GetItem(&itemY));
+        EXPECT_STREQ(textX, textY);
+        EXPECT_EQ(itemX.iImage, itemY.iImage) << textX;
+        EXPECT_EQ(itemX.iSelectedImage, itemY.iSelectedImage) << textX;
+        EXPECT_EQ(itemX.cChildren, itemY.cChildren) << textX;
+    }
+    EXPECT_EQ(compared, 2);
+    EXPECT_EQ(x, nullptr);
+    EXPECT_EQ(y, nullptr);
+    EXPECT_GT(onDemand.textRequests, 0);
+}
+
+TEST_F(ShellTree, IconsOnDemandAreAskedForOnceWhenFirstShown) {
+    CountingTree tree;
+    OpenAt(tree, b, CShellTreeCtrl::kCallbackImage | CShellTreeCtrl::kCallbackSelectedImage);
+    tree.RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
+    PumpPending();
+    const int first = tree.imageRequests;
+    EXPECT_GT(first, 0);
+    tree.RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
+    PumpPending();
+    EXPECT_EQ(tree.imageRequests, first) << "the control keeps the icons it was given";
+    EXPECT_EQ(tree.textRequests, 0);
+}
+
+TEST_F(ShellTree, SelectingAFolderScansItAndTheHighlightFollowsTheSelection) {
+    CTessel3Doc doc(folder.File("Orvex1.ini"));
+    doc.m_strPath = "C:\\before";
+    CountingTree tree;
+    tree.SetDocument(&doc);
+    std::vector<std::string> shown;
+    tree.onFolderShown = [&](const std::string& path, const std::string& label) {
+        shown.push_back(path + "|" + label);
+    };
+    OpenAt(tree, b);
+    HTREEITEM bNode = tree.m_hPathTarget;
+    ASSERT_NE(bNode, nullptr);
+
+    ASSERT_TRUE(tree.SelectItem(bNode));
+    PumpPending();
+    EXPECT_TRUE(SameText(doc.m_strPath, b)) << doc.m_strPath;
+    EXPECT_TRUE(SameText(doc.m_strShellPath, tree.GetLabelPath(bNode)));
+    EXPECT_EQ(DwgList.GetSize(), 2);
+    char current[MAX_PATH] = "";
+    ::GetCurrentDirectoryA(MAX_PATH, current);
+    EXPECT_TRUE(SameText(current, b)) << current;
+    ASSERT_EQ(shown.size(), 1u);
+    EXPECT_TRUE(SameText(shown.back(), b + "|b")) << shown.back();
+
+    // The highlight never stays on a folder that is no longer the selected one.
+    HTREEITEM aNode = tree.GetParentItem(bNode);
+    ASSERT_TRUE(tree.SelectItem(aNode));
+    PumpPending();
+    EXPECT_TRUE(tree.GetDropHilightItem() == aNode || tree.GetDropHilightItem() == nullptr);
+    EXPECT_EQ(DwgList.GetSize(), 0);
+    EXPECT_TRUE(SameText(doc.m_strPath, a));
+
+    // The Desktop has no folder: the grid empties and the current folder stays.
+    ASSERT_TRUE(tree.SelectItem(tree.GetRootItem()));
+    PumpPending();
+    EXPECT_EQ(DwgList.GetSize(), 0);
+    EXPECT_TRUE(SameText(doc.m_strPath, a));
+    EXPECT_EQ(doc.m_strShellPath, ShellDesktopLabel());
+    ASSERT_EQ(shown.size(), 3u);
+    EXPECT_EQ(shown.back(), "|" + ShellDesktopLabel());
+    ::GetCurrentDirectoryA(MAX_PATH, current);
+    EXPECT_TRUE(SameText(current, a)) << current;
+}
+
+TEST_F(ShellTree, RefreshingRescansTheSelectedFolder) {
+    CTessel3Doc doc(folder.File("Orvex1.ini"));
+    CountingTree tree;
+    tree.SetDocument(&doc);
+    int shown = 0;
+    tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
+    OpenAt(tree, b);
+    ASSERT_TRUE(tree.SelectItem(tree.m_hPathTarget));
+    PumpPending();
+    EXPECT_EQ(DwgList.GetSize(), 2);
+    testsupport::WriteBytes(b + "\\three.dwg", "AC1018");
+    tree.RefreshCurrentFolder();
+    EXPECT_EQ(DwgList.GetSize(), 3);
+    EXPECT_EQ(shown, 2);
+}
+
+} // namespace
