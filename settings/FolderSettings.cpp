@@ -35,6 +35,10 @@ FolderSettingsView ReadFolderSettingsView(CIniFile& store, bool fileRead) {
         view.swatchEnabled = true;
         view.colorFromFile = true;
         view.colorIndex = store.GetValueI(kFolderSettingsSection, kFolderSettingsColor);
+        // A hand-edited number outside the palette would reach the host's colour table as an index:
+        // it reads as a missing colour does.
+        if (view.colorIndex < 0 || view.colorIndex > 255)
+            view.colorIndex = 0;
     }
     return view;
 }

@@ -90,6 +90,15 @@ TEST(FolderSettingsView, AMissingColourReadsAsZero) {
     EXPECT_EQ(view.command, "");
 }
 
+TEST(FolderSettingsView, AColourOutsideThePaletteReadsAsAMissingOne) {
+    for (const char* color : {"999", "-5", "256", "99999999999", "abc"}) {
+        ReadStore file(std::string("[Default Parameters]\r\nLayer=WALLS\r\nColor=") + color + "\r\n");
+        EXPECT_EQ(ReadFolderSettingsView(file.store, true).colorIndex, 0) << color;
+    }
+    ReadStore file("[Default Parameters]\r\nLayer=WALLS\r\nColor=255\r\n");
+    EXPECT_EQ(ReadFolderSettingsView(file.store, true).colorIndex, 255);
+}
+
 TEST(FolderSettingsAccept, TheRulesInTheirOrder) {
     using A = FolderSettingsAction;
     EXPECT_EQ(DecideFolderSettingsAccept(true, "", ""), A::DeleteFile);
