@@ -58,6 +58,20 @@ void CShellContextMenu::Detach() {
     m_oldProc = nullptr;
 }
 
+namespace {
+
+// Hands a message of the menu's own drawing and filling to the shell's menu; true when it took it.
+bool MenuHandles(IContextMenu* menu, UINT message, WPARAM wParam, LPARAM lParam) {
+    IContextMenu2* menu2 = nullptr;
+    if (FAILED(menu->QueryInterface(IID_IContextMenu2, reinterpret_cast<void**>(&menu2))) || !menu2)
+        return false;
+    const HRESULT hr = menu2->HandleMenuMsg(message, wParam, lParam);
+    menu2->Release();
+    return SUCCEEDED(hr);
+}
+
+} // namespace
+
 LRESULT CALLBACK CShellContextMenu::WindowProc(HWND hwnd, UINT message, WPARAM wParam, LPARAM lParam) {
     auto* self = static_cast<CShellContextMenu*>(::GetPropA(hwnd, kProperty));
     if (!self)
@@ -81,27 +95,14 @@ LRESULT CShellContextMenu::HandleMessage(UINT message, WPARAM wParam, LPARAM lPa
                                                      : reinterpret_cast<MEASUREITEMSTRUCT*>(lParam)->CtlType;
             if (type != ODT_MENU)
                 break;
-            IContextMenu2* menu2 = nullptr;
-            if (SUCCEEDED(m_pMenu->QueryInterface(IID_IContextMenu2, reinterpret_cast<void**>(&menu2))) &&
-                menu2) {
-                const HRESULT hr = menu2->HandleMenuMsg(message, wParam, lParam);
-                menu2->Release();
-                if (SUCCEEDED(hr))
-                    return TRUE;
-            }
+            if (MenuHandles(m_pMenu, message, wParam, lParam))
+                return TRUE;
             break;
         }
-        case WM_INITMENUPOPUP: {
-            IContextMenu2* menu2 = nullptr;
-            if (SUCCEEDED(m_pMenu->QueryInterface(IID_IContextMenu2, reinterpret_cast<void**>(&menu2))) &&
-                menu2) {
-                const HRESULT hr = menu2->HandleMenuMsg(message, wParam, lParam);
-                menu2->Release();
-                if (SUCCEEDED(hr))
-                    return 0;
-            }
+        case WM_INITMENUPOPUP:
+            if (MenuHandles(m_pMenu, message, wParam, lParam))
+                return 0;
             break;
-        }
         case WM_MENUSELECT:
             ShowHelpText(LOWORD(wParam), HIWORD(wParam), reinterpret_cast<HMENU>(lParam));
             break;
