@@ -166,8 +166,10 @@ bool DrawPng(HDC dc, const RECT& area, const DwgPreview& preview, COLORREF backg
                                      nullptr, 0.0, WICBitmapPaletteTypeCustom)))
         return false;
     UINT width = 0, height = 0;
-    if (FAILED(converter->GetSize(&width, &height)) || width == 0 || height == 0 || width > 8192 ||
-        height > 8192)
+    // The decoder's size must be the header's, which the reader kept within the limits.
+    if (FAILED(converter->GetSize(&width, &height)) || width == 0 || height == 0 ||
+        static_cast<int>(width) != preview.width || static_cast<int>(height) != preview.height ||
+        static_cast<std::uint64_t>(width) * height * 4 > kMaxDecodedBytes)
         return false;
     std::vector<BYTE> pixels(static_cast<std::size_t>(width) * height * 4);
     if (FAILED(converter->CopyPixels(nullptr, width * 4, static_cast<UINT>(pixels.size()), pixels.data())))

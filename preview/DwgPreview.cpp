@@ -90,8 +90,8 @@ bool LocateImage(const unsigned char* section, std::size_t size, std::uint64_t a
             continue;
         const std::uint64_t start = Le32(entry + 1);
         const std::uint32_t length = Le32(entry + 5);
-        if (length == 0 || start < dataBegin || start + length > sectionEnd)
-            continue; // an entry pointing outside its section is not trusted
+        if (length == 0 || length > kMaxPictureBytes || start < dataBegin || start + length > sectionEnd)
+            continue; // an entry pointing outside its section, or claiming more than a preview, is not trusted
         if (Preference(kind) > Preference(found.kind)) {
             found.kind = kind;
             found.start = start;
@@ -172,21 +172,48 @@ bool MeasurePng(const unsigned char* p, std::size_t size, int& width, int& heigh
         return false;
     const std::uint32_t w = Be32(p + 16);
     const std::uint32_t h = Be32(p + 20);
-    if (w == 0 || h == 0 || w > 0x7FFFFFFF || h > 0x7FFFFFFF)
+    // Decoded, the picture takes 4 bytes a pixel: a small file may claim a huge one.
+    if (w == 0 || h == 0 || w > kMaxPictureSide || h > kMaxPictureSide ||
+        static_cast<std::uint64_t>(w) * h * 4 > kMaxDecodedBytes)
         return false;
     width = static_cast<int>(w);
     height = static_cast<int>(h);
     return true;
 }
 
+// The metafile's header and its records, as the metafile player will read them: the header's own size,
+// a total size within the bytes present, and every record (size in 16-bit words, at least 3) inside that
+// total, up to the end record. The player trusts these sizes.
+bool MetafileRecordsFit(const unsigned char* p, std::size_t size) {
+    constexpr std::size_t kMetaHeaderBytes = 18;
+    if (size < kMetaHeaderBytes)
+        return false;
+    const unsigned type = Le16(p);
+    const unsigned headerWords = Le16(p + 2);
+    const std::uint64_t totalBytes = static_cast<std::uint64_t>(Le32(p + 6)) * 2;
+    if ((type != 1 && type != 2) || headerWords != kMetaHeaderBytes / 2 || totalBytes < kMetaHeaderBytes ||
+        totalBytes > size)
+        return false;
+    std::uint64_t at = kMetaHeaderBytes;
+    while (at + 6 <= totalBytes) {
+        const std::uint64_t recordBytes = static_cast<std::uint64_t>(Le32(p + at)) * 2;
+        const unsigned function = Le16(p + at + 4);
+        if (recordBytes < 6 || at + recordBytes > totalBytes)
+            return false;
+        if (function == 0)
+            return true; // the end record
+        at += recordBytes;
+    }
+    return at == totalBytes; // every record fits, though the end record is missing
+}
+
 bool MeasureWmf(const unsigned char* p, std::size_t size, int& width, int& height) {
     constexpr std::uint32_t kPlaceableKey = 0x9AC6CDD7;
     constexpr std::size_t kPlaceableBytes = 22;
-    constexpr std::size_t kMetaHeaderBytes = 18;
     width = 0;
     height = 0;
     if (size >= 4 && Le32(p) == kPlaceableKey) {
-        if (size < kPlaceableBytes + kMetaHeaderBytes)
+        if (size < kPlaceableBytes || !MetafileRecordsFit(p + kPlaceableBytes, size - kPlaceableBytes))
             return false;
         const int left = static_cast<std::int16_t>(Le16(p + 6));
         const int top = static_cast<std::int16_t>(Le16(p + 8));
@@ -196,7 +223,7 @@ bool MeasureWmf(const unsigned char* p, std::size_t size, int& width, int& heigh
         height = bottom > top ? bottom - top : top - bottom;
         return true;
     }
-    return size >= kMetaHeaderBytes;
+    return MetafileRecordsFit(p, size);
 }
 
 // Fills out from the located bytes once they are in memory.

@@ -18,6 +18,12 @@ struct DwgPreview {
 };
 
 // Layout of the container, shared with the sample generator.
+// Limits of what a preview may claim before anything is allocated or decoded: a picture entry's bytes,
+// a PNG's side and its decoded size (4 bytes a pixel).
+constexpr std::uint32_t kMaxPictureBytes = 16u << 20;
+constexpr std::uint32_t kMaxPictureSide = 4096;
+constexpr std::uint64_t kMaxDecodedBytes = 16u << 20;
+
 namespace dwgfmt {
 constexpr std::size_t kImageAddressOffset = 0x0D;
 constexpr std::size_t kFileHeaderBytes = kImageAddressOffset + 4;

@@ -5,6 +5,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <initializer_list>
+
 #include <sys/stat.h>
 
 #include <cstdio>
@@ -108,6 +111,19 @@ std::vector<unsigned char> MinimalPng(std::uint32_t w, std::uint32_t h) {
         png.push_back(b); // depth, colour type, methods, CRC (not checked here)
     return png;
 }
+
+// A metafile of little-endian 16-bit words.
+std::vector<unsigned char> Words(std::initializer_list<unsigned> words) {
+    std::vector<unsigned char> bytes;
+    for (unsigned w : words) {
+        bytes.push_back(static_cast<unsigned char>(w & 0xFF));
+        bytes.push_back(static_cast<unsigned char>(w >> 8));
+    }
+    return bytes;
+}
+
+// The smallest metafile: its header (12 words in all, largest record 3) and the end record.
+std::vector<unsigned char> MinimalWmf() { return Words({1, 9, 0x0300, 12, 0, 0, 3, 0, 0, 3, 0, 0}); }
 
 bool Parse(const std::vector<unsigned char>& file, DwgPreview& out) {
     return ParseDwgPreview(file.data(), file.size(), out);
@@ -249,7 +265,9 @@ TEST(DwgPreview, ReadsPngSize) {
 }
 
 TEST(DwgPreview, ReadsWmfWithAndWithoutPlaceableHeader) {
-    std::vector<unsigned char> placeable(22 + 18, 0);
+    std::vector<unsigned char> placeable(22, 0);
+    const std::vector<unsigned char> body = MinimalWmf();
+    placeable.insert(placeable.end(), body.begin(), body.end());
     PutLe32(placeable, 0, 0x9AC6CDD7);
     placeable[6] = 10;    // left
     placeable[8] = 20;    // top
@@ -264,14 +282,14 @@ TEST(DwgPreview, ReadsWmfWithAndWithoutPlaceableHeader) {
     EXPECT_EQ(p.height, 480);
 
     DwgPreview plain;
-    ASSERT_TRUE(Parse(Container({{dwgfmt::kWmf, std::vector<unsigned char>(18, 1)}}), plain));
+    ASSERT_TRUE(Parse(Container({{dwgfmt::kWmf, MinimalWmf()}}), plain));
     EXPECT_EQ(plain.width, 0);
     EXPECT_EQ(plain.height, 0);
     EXPECT_FALSE(Parse(Container({{dwgfmt::kWmf, std::vector<unsigned char>(10, 1)}}), plain));
 }
 
 TEST(DwgPreview, PrefersBitmapOverMetafile) {
-    std::vector<unsigned char> wmf(18, 1);
+    std::vector<unsigned char> wmf = MinimalWmf();
     DwgPreview p;
     ASSERT_TRUE(Parse(Container({{dwgfmt::kHeader, std::vector<unsigned char>(80)},
                                  {dwgfmt::kWmf, wmf},
@@ -413,6 +431,48 @@ TEST(DwgPreview, DamagedPngIsRejected) {
     auto shortPng = MinimalPng(10, 10);
     shortPng.resize(20);
     EXPECT_FALSE(Parse(Container({{dwgfmt::kPng, shortPng}}), p));
+}
+
+TEST(DwgPreview, MetafilesWhoseSizesLieAreRejected) {
+    DwgPreview p;
+    auto parses = [&](const std::vector<unsigned char>& wmf) { return Parse(Container({{dwgfmt::kWmf, wmf}}), p); };
+    // A rectangle between header and end: accepted, also without its end record.
+    EXPECT_TRUE(parses(Words({1, 9, 0x0300, 19, 0, 0, 7, 0, 0, 7, 0, 0x041B, 190, 290, 10, 10, 3, 0, 0})));
+    EXPECT_TRUE(parses(Words({1, 9, 0x0300, 16, 0, 0, 7, 0, 0, 7, 0, 0x041B, 190, 290, 10, 10})));
+    // The total claims more than the bytes present.
+    EXPECT_FALSE(parses(Words({1, 9, 0x0300, 0xFFFF, 0xFFFF, 0, 3, 0, 0, 3, 0, 0})));
+    // A record that runs past the total, or claims a huge size.
+    EXPECT_FALSE(parses(Words({1, 9, 0x0300, 16, 0, 0, 7, 0, 0, 9, 0, 0x041B, 190, 290, 10, 10})));
+    EXPECT_FALSE(parses(Words({1, 9, 0x0300, 16, 0, 0, 7, 0, 0, 0xFFFF, 0x7FFF, 0x041B, 190, 290, 10, 10})));
+    // A record smaller than its own size and function (which would never advance).
+    EXPECT_FALSE(parses(Words({1, 9, 0x0300, 12, 0, 0, 3, 0, 0, 0, 0, 0x041B})));
+    EXPECT_FALSE(parses(Words({1, 9, 0x0300, 12, 0, 0, 3, 0, 0, 2, 0, 0x041B})));
+    // A header of the wrong size or kind.
+    EXPECT_FALSE(parses(Words({1, 7, 0x0300, 12, 0, 0, 3, 0, 0, 3, 0, 0})));
+    EXPECT_FALSE(parses(Words({5, 9, 0x0300, 12, 0, 0, 3, 0, 0, 3, 0, 0})));
+    EXPECT_FALSE(parses(std::vector<unsigned char>(18, 1)));
+}
+
+TEST(DwgPreview, PngBombsAreRejectedFromTheirHeader) {
+    DwgPreview p;
+    // 16 MiB decoded at most: 2048 x 2048 x 4 bytes is the largest square.
+    EXPECT_TRUE(Parse(Container({{dwgfmt::kPng, MinimalPng(2048, 2048)}}), p));
+    EXPECT_TRUE(Parse(Container({{dwgfmt::kPng, MinimalPng(4096, 1024)}}), p));
+    EXPECT_FALSE(Parse(Container({{dwgfmt::kPng, MinimalPng(2048, 2049)}}), p));
+    EXPECT_FALSE(Parse(Container({{dwgfmt::kPng, MinimalPng(4096, 4096)}}), p));
+    EXPECT_FALSE(Parse(Container({{dwgfmt::kPng, MinimalPng(4097, 1)}}), p));
+    EXPECT_FALSE(Parse(Container({{dwgfmt::kPng, MinimalPng(1, 100000)}}), p));
+    EXPECT_FALSE(Parse(Container({{dwgfmt::kPng, MinimalPng(0x7FFFFFFF, 0x7FFFFFFF)}}), p));
+}
+
+TEST(DwgPreview, AnEntryClaimingMoreThanAPreviewIsRejected) {
+    std::vector<unsigned char> huge(kMaxPictureBytes + 1, 0);
+    const std::vector<unsigned char> dib = SmallDib();
+    std::copy(dib.begin(), dib.end(), huge.begin()); // a valid bitmap header, then far too many bytes
+    DwgPreview p;
+    EXPECT_FALSE(Parse(Container({{dwgfmt::kBmp, huge}}), p));
+    huge.resize(kMaxPictureBytes);
+    EXPECT_TRUE(Parse(Container({{dwgfmt::kBmp, huge}}), p));
 }
 
 TEST(DwgPreview, EveryTruncationIsSafe) {
