@@ -3,7 +3,9 @@
 #include "devhost/HostObjects.h"
 #include "devhost/Output.h"
 
+#include <cstdint>
 #include <cstdio>
+#include <cstring>
 #include <string>
 
 namespace devhost {
@@ -15,7 +17,10 @@ const wchar_t kDrawnProperty[] = L"DevhostPreviewDrawn";
 LARGE_INTEGER g_start{};
 LARGE_INTEGER g_frequency{};
 HHOOK g_hook = nullptr;
+HHOOK g_cbtHook = nullptr;
 bool g_afterKey = false;
+bool g_inCall = false;
+long g_scanEntries = 0;
 
 double Elapsed() {
     LARGE_INTEGER now;
@@ -50,6 +55,140 @@ LRESULT CALLBACK GetMessageHook(int code, WPARAM removal, LPARAM data) {
     return CallNextHookEx(g_hook, code, removal, data);
 }
 
+// Sees every window the user-interface thread creates during a call, before its first message: the
+// library's frame, bars, panes, thumbnails and tooltips, in the order they are made.
+LRESULT CALLBACK CreateWindowHook(int code, WPARAM wParam, LPARAM lParam) {
+    if (code == HCBT_CREATEWND && g_inCall) {
+        try {
+            const double ms = Elapsed();
+            wchar_t className[128] = L"";
+            GetClassNameW(reinterpret_cast<HWND>(wParam), className, 128);
+            const auto* create = reinterpret_cast<const CBT_CREATEWNDW*>(lParam);
+            wchar_t parentClass[128] = L"-";
+            if (create->lpcs->hwndParent)
+                GetClassNameW(create->lpcs->hwndParent, parentClass, 128);
+            Line(ms, L"create " + std::wstring(className) + L" in " + parentClass);
+        } catch (...) {
+            // out of memory while writing the line: the line is lost, the window is made
+        }
+    }
+    return CallNextHookEx(g_cbtHook, code, wParam, lParam);
+}
+
+// The library's own calls of a few system functions, seen through its import table (patched when the
+// library is loaded): opening its settings file and scanning a folder. Nothing in the library changes;
+// devhost's functions below call the system's and only print a line around them.
+using CreateFileAFn = HANDLE(WINAPI*)(LPCSTR, DWORD, DWORD, LPSECURITY_ATTRIBUTES, DWORD, DWORD, HANDLE);
+using FindFirstFn = std::intptr_t(__cdecl*)(const char*, void*);
+using FindNextFn = int(__cdecl*)(std::intptr_t, void*);
+using FindCloseFn = int(__cdecl*)(std::intptr_t);
+CreateFileAFn g_createFileA = nullptr;
+FindFirstFn g_findFirst = nullptr;
+FindNextFn g_findNext = nullptr;
+FindCloseFn g_findClose = nullptr;
+
+std::wstring Widen(const char* text) {
+    std::wstring wide;
+    for (; text && *text; ++text)
+        wide += static_cast<wchar_t>(static_cast<unsigned char>(*text));
+    return wide;
+}
+
+const char* LastComponent(const char* path) {
+    const char* last = path;
+    for (const char* p = path; *p; ++p)
+        if (*p == '\\' || *p == '/')
+            last = p + 1;
+    return last;
+}
+
+HANDLE WINAPI TimedCreateFileA(LPCSTR name, DWORD access, DWORD share, LPSECURITY_ATTRIBUTES security,
+                               DWORD disposition, DWORD flags, HANDLE templateFile) {
+    const bool reading = g_inCall && name && (access & GENERIC_READ) && !(access & GENERIC_WRITE);
+    const double before = reading ? Elapsed() : 0.0;
+    HANDLE file = g_createFileA(name, access, share, security, disposition, flags, templateFile);
+    if (reading) {
+        try {
+            Line(before, L"open " + Widen(LastComponent(name)));
+        } catch (...) {
+        }
+    }
+    return file;
+}
+
+std::intptr_t __cdecl TimedFindFirst(const char* pattern, void* found) {
+    if (g_inCall) {
+        try {
+            Line(Elapsed(), L"scan-begin " + Widen(pattern));
+        } catch (...) {
+        }
+    }
+    g_scanEntries = 0;
+    const std::intptr_t search = g_findFirst(pattern, found);
+    if (search != -1)
+        ++g_scanEntries;
+    return search;
+}
+
+int __cdecl TimedFindNext(std::intptr_t search, void* found) {
+    const int result = g_findNext(search, found);
+    if (result == 0)
+        ++g_scanEntries;
+    return result;
+}
+
+int __cdecl TimedFindClose(std::intptr_t search) {
+    const int result = g_findClose(search);
+    if (g_inCall) {
+        try {
+            Line(Elapsed(), L"scan-end " + std::to_wstring(g_scanEntries) + L" entries");
+        } catch (...) {
+        }
+    }
+    return result;
+}
+
+// Replaces the address of the imported function `name` in module's import table by `replacement` and
+// returns the address it held (nullptr when the module does not import it).
+void* PatchImport(HMODULE module, const char* name, void* replacement) {
+    auto* base = reinterpret_cast<unsigned char*>(module);
+    const auto* dos = reinterpret_cast<const IMAGE_DOS_HEADER*>(base);
+    const auto* nt = reinterpret_cast<const IMAGE_NT_HEADERS*>(base + dos->e_lfanew);
+    const IMAGE_DATA_DIRECTORY& directory = nt->OptionalHeader.DataDirectory[IMAGE_DIRECTORY_ENTRY_IMPORT];
+    if (!directory.VirtualAddress)
+        return nullptr;
+    for (auto* import = reinterpret_cast<const IMAGE_IMPORT_DESCRIPTOR*>(base + directory.VirtualAddress);
+         import->Name; ++import) {
+        const auto* names = reinterpret_cast<const IMAGE_THUNK_DATA*>(
+            base + (import->OriginalFirstThunk ? import->OriginalFirstThunk : import->FirstThunk));
+        auto* addresses = reinterpret_cast<IMAGE_THUNK_DATA*>(base + import->FirstThunk);
+        for (; names->u1.AddressOfData; ++names, ++addresses) {
+            if (IMAGE_SNAP_BY_ORDINAL(names->u1.Ordinal))
+                continue;
+            const auto* byName = reinterpret_cast<const IMAGE_IMPORT_BY_NAME*>(base + names->u1.AddressOfData);
+            if (std::strcmp(reinterpret_cast<const char*>(byName->Name), name) != 0)
+                continue;
+            DWORD protection = 0;
+            if (!VirtualProtect(&addresses->u1.Function, sizeof addresses->u1.Function, PAGE_READWRITE,
+                                &protection))
+                return nullptr;
+            void* original = reinterpret_cast<void*>(addresses->u1.Function);
+            addresses->u1.Function = reinterpret_cast<ULONG_PTR>(replacement);
+            VirtualProtect(&addresses->u1.Function, sizeof addresses->u1.Function, protection, &protection);
+            return original;
+        }
+    }
+    return nullptr;
+}
+
+template <class Fn> bool Watch(HMODULE module, const char* name, Fn replacement, Fn& original) {
+    void* was = PatchImport(module, name, reinterpret_cast<void*>(replacement));
+    if (!was)
+        return false;
+    original = reinterpret_cast<Fn>(was);
+    return true;
+}
+
 struct VisibleCount {
     HWND parent = nullptr;
     wchar_t className[128] = {};
@@ -79,6 +218,18 @@ BOOL CALLBACK CountSibling(HWND window, LPARAM data) {
 
 } // namespace
 
+void TimingWatchLibrary(HMODULE library) {
+    if (!Host().options.timing || !library)
+        return;
+    Watch(library, "CreateFileA", &TimedCreateFileA, g_createFileA);
+    // The scan goes through the runtime library's search; which of its names depends on the build.
+    if (!Watch(library, "_findfirst64", &TimedFindFirst, g_findFirst))
+        Watch(library, "_findfirst64i32", &TimedFindFirst, g_findFirst);
+    if (!Watch(library, "_findnext64", &TimedFindNext, g_findNext))
+        Watch(library, "_findnext64i32", &TimedFindNext, g_findNext);
+    Watch(library, "_findclose", &TimedFindClose, g_findClose);
+}
+
 void TimingCallBegins() {
     if (!Host().options.timing)
         return;
@@ -87,16 +238,23 @@ void TimingCallBegins() {
     g_afterKey = false;
     if (!g_hook)
         g_hook = SetWindowsHookExW(WH_GETMESSAGE, &GetMessageHook, nullptr, GetCurrentThreadId());
+    if (!g_cbtHook)
+        g_cbtHook = SetWindowsHookExW(WH_CBT, &CreateWindowHook, nullptr, GetCurrentThreadId());
+    g_inCall = true;
     Line(0.0, L"call");
 }
 
 void TimingCallEnded() {
     if (!Host().options.timing)
         return;
+    g_inCall = false;
     Line(Elapsed(), L"call-end");
     if (g_hook)
         UnhookWindowsHookEx(g_hook);
     g_hook = nullptr;
+    if (g_cbtHook)
+        UnhookWindowsHookEx(g_cbtHook);
+    g_cbtHook = nullptr;
 }
 
 void TimingPreviewDrawn(HWND window, const wchar_t* fileName) {

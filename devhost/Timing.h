@@ -11,12 +11,19 @@
 //   [timing] MS key-handled               the next message it took after that key: the key's handling
 //                                          had ended
 //   [timing] MS call-end                  the call returned
+//   [timing] MS create CLASS in PARENT    the thread is about to create a window of CLASS, child of a
+//                                          window of PARENT ("-": a top-level window)
+//   [timing] MS open NAME                 the library opened the file NAME (last part of its path) to read
+//   [timing] MS scan-begin PATTERN        the library began a folder search
+//   [timing] MS scan-end N entries        it closed the search after N entries
 #pragma once
 
 #include <windows.h>
 
 namespace devhost {
 
+// Watches the library's settings file reads and folder scans through its import table.
+void TimingWatchLibrary(HMODULE library);
 void TimingCallBegins();
 void TimingCallEnded();
 void TimingPreviewDrawn(HWND window, const wchar_t* fileName);
