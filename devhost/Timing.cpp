@@ -76,13 +76,15 @@ LRESULT CALLBACK CreateWindowHook(int code, WPARAM wParam, LPARAM lParam) {
 }
 
 // The library's own calls of a few system functions, seen through its import table (patched when the
-// library is loaded): opening its settings file and scanning a folder. Nothing in the library changes;
+// library is loaded): looking for and opening its settings files, and scanning a folder. Nothing in the library changes;
 // devhost's functions below call the system's and only print a line around them.
 using CreateFileAFn = HANDLE(WINAPI*)(LPCSTR, DWORD, DWORD, LPSECURITY_ATTRIBUTES, DWORD, DWORD, HANDLE);
+using GetFileAttributesAFn = DWORD(WINAPI*)(LPCSTR);
 using FindFirstFn = std::intptr_t(__cdecl*)(const char*, void*);
 using FindNextFn = int(__cdecl*)(std::intptr_t, void*);
 using FindCloseFn = int(__cdecl*)(std::intptr_t);
 CreateFileAFn g_createFileA = nullptr;
+GetFileAttributesAFn g_getFileAttributesA = nullptr;
 FindFirstFn g_findFirst = nullptr;
 FindNextFn g_findNext = nullptr;
 FindCloseFn g_findClose = nullptr;
@@ -102,14 +104,33 @@ const char* LastComponent(const char* path) {
     return last;
 }
 
+// Settings files: the library's own and the drawing insertion settings, "*.ini".
+bool IsSettingsFile(const char* name) {
+    const std::size_t length = name ? std::strlen(name) : 0;
+    return length > 4 && CompareStringOrdinal(Widen(name + length - 4).c_str(), 4, L".ini", 4, TRUE) == CSTR_EQUAL;
+}
+
+DWORD WINAPI TimedGetFileAttributesA(LPCSTR name) {
+    const bool settings = g_inCall && IsSettingsFile(name);
+    const double before = settings ? Elapsed() : 0.0;
+    const DWORD attributes = g_getFileAttributesA(name);
+    if (settings) {
+        try {
+            Line(before, L"settings-look " + Widen(LastComponent(name)));
+        } catch (...) {
+        }
+    }
+    return attributes;
+}
+
 HANDLE WINAPI TimedCreateFileA(LPCSTR name, DWORD access, DWORD share, LPSECURITY_ATTRIBUTES security,
                                DWORD disposition, DWORD flags, HANDLE templateFile) {
-    const bool reading = g_inCall && name && (access & GENERIC_READ) && !(access & GENERIC_WRITE);
+    const bool reading = g_inCall && IsSettingsFile(name) && (access & GENERIC_READ) && !(access & GENERIC_WRITE);
     const double before = reading ? Elapsed() : 0.0;
     HANDLE file = g_createFileA(name, access, share, security, disposition, flags, templateFile);
     if (reading) {
         try {
-            Line(before, L"open " + Widen(LastComponent(name)));
+            Line(before, L"settings-open " + Widen(LastComponent(name)));
         } catch (...) {
         }
     }
@@ -222,6 +243,7 @@ void TimingWatchLibrary(HMODULE library) {
     if (!Host().options.timing || !library)
         return;
     Watch(library, "CreateFileA", &TimedCreateFileA, g_createFileA);
+    Watch(library, "GetFileAttributesA", &TimedGetFileAttributesA, g_getFileAttributesA);
     // The scan goes through the runtime library's search; which of its names depends on the build.
     if (!Watch(library, "_findfirst64", &TimedFindFirst, g_findFirst))
         Watch(library, "_findfirst64i32", &TimedFindFirst, g_findFirst);

@@ -13,7 +13,9 @@
 //   [timing] MS call-end                  the call returned
 //   [timing] MS create CLASS in PARENT    the thread is about to create a window of CLASS, child of a
 //                                          window of PARENT ("-": a top-level window)
-//   [timing] MS open NAME                 the library opened the file NAME (last part of its path) to read
+//   [timing] MS settings-look NAME        the library asked for the attributes of the settings file NAME
+//                                          ("*.ini", last part of its path): the settings read begins
+//   [timing] MS settings-open NAME        it opened that file to read it
 //   [timing] MS scan-begin PATTERN        the library began a folder search
 //   [timing] MS scan-end N entries        it closed the search after N entries
 #pragma once
