@@ -1,5 +1,6 @@
 // --timing: "[timing] MS WHAT ..." lines that let a benchmark see how fast the library answers, MS being
-// milliseconds (three decimals) since the running LISP call began. Used on the user-interface thread only.
+// milliseconds (three decimals) since the running LISP call began, less the time devhost spent measuring
+// (counting windows, writing these lines). Used on the user-interface thread only.
 //
 //   [timing] 0.000 call                   the call begins (the clock starts)
 //   [timing] MS preview DRAWN/VISIBLE NAME a preview was drawn into a window: VISIBLE windows of that
