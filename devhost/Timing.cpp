@@ -13,11 +13,14 @@ namespace {
 
 // A window that has had a preview drawn carries this property; it goes with the window.
 const wchar_t kDrawnProperty[] = L"DevhostPreviewDrawn";
+// A window whose first WM_PAINT was marked carries this one.
+const wchar_t kPaintedProperty[] = L"DevhostPainted";
 
 LARGE_INTEGER g_start{};
 LARGE_INTEGER g_frequency{};
 HHOOK g_hook = nullptr;
 HHOOK g_cbtHook = nullptr;
+HHOOK g_sentHook = nullptr;
 bool g_afterKey = false;
 bool g_inCall = false;
 long g_scanEntries = 0;
@@ -55,6 +58,36 @@ void Line(double ms, const std::wstring& what) {
     WriteLine(L"[timing] " + std::wstring(number) + L" " + what);
 }
 
+std::wstring ClassOf(HWND window) {
+    wchar_t className[128] = L"-";
+    if (window)
+        GetClassNameW(window, className, 128);
+    return className;
+}
+
+// The first WM_PAINT of a window, however it comes: from the queue, or sent by UpdateWindow or a
+// redraw while the library works.
+void FirstPaint(HWND window, const wchar_t* how) {
+    if (!window || GetPropW(window, kPaintedProperty))
+        return;
+    SetPropW(window, kPaintedProperty, reinterpret_cast<HANDLE>(1));
+    Line(Elapsed(), L"paint " + ClassOf(window) + how);
+}
+
+LRESULT CALLBACK SentMessageHook(int code, WPARAM sentByThread, LPARAM data) {
+    if (code == HC_ACTION && g_inCall) {
+        const auto* message = reinterpret_cast<const CWPSTRUCT*>(data);
+        if (message->message == WM_PAINT) {
+            Overhead measuring;
+            try {
+                FirstPaint(message->hwnd, L" (sent)");
+            } catch (...) {
+            }
+        }
+    }
+    return CallNextHookEx(g_sentHook, code, sentByThread, data);
+}
+
 // Sees every message the user-interface thread takes from its queue, whoever's loop takes it.
 LRESULT CALLBACK GetMessageHook(int code, WPARAM removal, LPARAM data) {
     if (code == HC_ACTION && removal == PM_REMOVE && g_inCall) {
@@ -65,6 +98,8 @@ LRESULT CALLBACK GetMessageHook(int code, WPARAM removal, LPARAM data) {
                 g_afterKey = false;
                 Line(Elapsed(), L"key-handled");
             }
+            if (message->message == WM_PAINT)
+                FirstPaint(message->hwnd, L"");
             if (message->message == WM_KEYDOWN) {
                 Line(Elapsed(), L"key " + std::to_wstring(message->wParam));
                 g_afterKey = true;
@@ -79,6 +114,20 @@ LRESULT CALLBACK GetMessageHook(int code, WPARAM removal, LPARAM data) {
 // Sees every window the user-interface thread creates during a call, before its first message: the
 // library's frame, bars, panes, thumbnails and tooltips, in the order they are made.
 LRESULT CALLBACK CreateWindowHook(int code, WPARAM wParam, LPARAM lParam) {
+    if ((code == HCBT_ACTIVATE || code == HCBT_MINMAX || code == HCBT_SETFOCUS) && g_inCall) {
+        Overhead measuring;
+        try {
+            const HWND window = reinterpret_cast<HWND>(wParam);
+            if (code == HCBT_ACTIVATE)
+                Line(Elapsed(), L"activate " + ClassOf(window));
+            else if (code == HCBT_SETFOCUS)
+                Line(Elapsed(), L"focus " + ClassOf(window) + L" from " +
+                                    ClassOf(reinterpret_cast<HWND>(lParam)));
+            else
+                Line(Elapsed(), L"show " + ClassOf(window) + L" " + std::to_wstring(LOWORD(lParam)));
+        } catch (...) {
+        }
+    }
     if (code == HCBT_CREATEWND && g_inCall) {
         Overhead measuring;
         try {
@@ -289,6 +338,8 @@ void TimingCallBegins() {
         g_hook = SetWindowsHookExW(WH_GETMESSAGE, &GetMessageHook, nullptr, GetCurrentThreadId());
     if (!g_cbtHook)
         g_cbtHook = SetWindowsHookExW(WH_CBT, &CreateWindowHook, nullptr, GetCurrentThreadId());
+    if (!g_sentHook)
+        g_sentHook = SetWindowsHookExW(WH_CALLWNDPROC, &SentMessageHook, nullptr, GetCurrentThreadId());
     g_inCall = true;
     Line(0.0, L"call");
 }
@@ -304,6 +355,9 @@ void TimingCallEnded() {
     if (g_cbtHook)
         UnhookWindowsHookEx(g_cbtHook);
     g_cbtHook = nullptr;
+    if (g_sentHook)
+        UnhookWindowsHookEx(g_sentHook);
+    g_sentHook = nullptr;
 }
 
 void TimingPreviewDrawn(HWND window, const wchar_t* fileName) {

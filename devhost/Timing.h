@@ -14,6 +14,10 @@
 //   [timing] MS call-end                  the call returned
 //   [timing] MS create CLASS in PARENT    the thread is about to create a window of CLASS, child of a
 //                                          window of PARENT ("-": a top-level window)
+//   [timing] MS activate CLASS            a window of CLASS is about to be activated
+//   [timing] MS show CLASS SW             one is about to be minimised, maximised or restored (SW_ code)
+//   [timing] MS focus CLASS from OLD      the keyboard focus is about to move to a window of CLASS
+//   [timing] MS paint CLASS               the thread took the first WM_PAINT of a window of CLASS
 //   [timing] MS settings-look NAME        the library asked for the attributes of the settings file NAME
 //                                          ("*.ini", last part of its path): the settings read begins
 //   [timing] MS settings-open NAME        it opened that file to read it
