@@ -3,6 +3,7 @@
 #   bench_sort, bench_preview   (Windows build, under Wine)
 #   bench_first_paint.sh        LISP call -> first complete paint of the explorer
 #   bench_scroll.sh             one scroll step at the top and at the bottom of the grid
+#   bench_phases.sh             where the milliseconds of the first complete paint go
 #   bench_tree_expand           the folder tree expanding a folder of 2,000 and of 20,000 sub-folders
 #   bench_scan                  folder scan against a bare FindFirstFile loop (last: it makes its folders)
 # Builds go to build/bench-win (mingw-w64, Release) and build/bench-native (the generator, to make the big
@@ -42,6 +43,9 @@ bench/bench_first_paint.sh
 echo
 echo "== bench_scroll.sh"
 bench/bench_scroll.sh
+echo
+echo "== bench_phases.sh"
+bench/bench_phases.sh
 echo
 echo "== bench_tree_expand"
 # Its folders of empty sub-folders are made here (natively: much faster than through Wine), marked complete.
