@@ -63,6 +63,9 @@ TEST(Options, EveryOption) {
     EXPECT_TRUE(Parse({L"--check-heaps"}).checkHeaps);
     EXPECT_FALSE(Parse({}).checkHeaps);
     EXPECT_EQ(Parse({L"--preview", L"flat"}).preview, Options::Preview::Flat);
+    EXPECT_TRUE(Parse({L"--timing-sent"}).timing);
+    EXPECT_TRUE(Parse({L"--timing-sent"}).timingSent);
+    EXPECT_FALSE(Parse({L"--timing"}).timingSent);
     EXPECT_EQ(Parse({L"--preview", L"real"}).preview, Options::Preview::Real);
 }
 
