@@ -41,7 +41,7 @@ parse() {
     what == "create" && C == "" && rest ~ /^create SysTreeView32 / { C = t }
     what == "create" && D == "" && rest ~ /^create ToolbarWindow32 / { D = t }
     what == "create" && E == "" && rest ~ /^create msctls_statusbar32 / { E = t }
-    what == "scan-begin" && F == "" && index(rest, folder) { F = t; inscan = 1 }
+    what == "scan-begin" && F == "" && index(rest, folder "\\") { F = t; inscan = 1 }
     what == "scan-end" && inscan && G == "" { G = t; inscan = 0 }
     what == "create" && rest ~ /^create Orvex1Wnd / && J == "" { if (H == "") H = t; I = t; made++ }
     what == "preview" && J == "" { J = t }
@@ -64,7 +64,7 @@ for count in "${counts[@]}"; do
   for case in "${cases[@]}"; do
     folder=$(folder_of "$count" "$case")
     need_drawings "$folder"
-    name=$(basename "$folder")
+    name=$(winpath "$folder")
     declare -A cell=()
     for preview in real flat; do
       results=$(mktemp)

@@ -31,7 +31,8 @@ need_builds() {
   export BENCH_BUILT=1
 }
 
-# folder_of COUNT [CASE]: prints the folder of COUNT synthetic drawings whose names are in CASE, "mixed"
+# folder_of COUNT [CASE]: prints the folder (dwg-COUNT-CASE/drawings) of COUNT synthetic drawings whose
+# names are in CASE, "mixed"
 # (default: upper and lower case mixed, as the generator makes them) or "lower" (all lower case, what the
 # list asks for: Wine then opens a file by its name without searching the folder, as a Windows file
 # system always does). Made on first use and kept for later runs. The native generator is used (much
@@ -40,7 +41,10 @@ need_builds() {
 # folder. A folder marked done that has lost its drawings is made again.
 folder_of() {
   local count=$1 case=${2:-mixed} made=0
-  local dir="$data/dwg-$count-$case"
+  # Alone in a folder of its own: the tree asks each folder it shows whether it has sub-folders, which
+  # for a sibling of 100,000 drawings means reading it whole, and the figures would depend on what else
+  # lies in $data.
+  local dir="$data/dwg-$count-$case/drawings"
   case $case in
     mixed) flag=() ;;
     lower) flag=(--lower-case) ;;
@@ -51,7 +55,7 @@ folder_of() {
     rm -f "$dir.done"
   fi
   if [ ! -f "$dir.done" ]; then
-    rm -rf "$dir" && mkdir -p "$dir"
+    rm -rf "$(dirname "$dir")" && mkdir -p "$dir"
     echo "making $count drawings ($case-case names) in $dir ..." >&2
     "$native_build/tools/gen-dwg-samples/gen-dwg-samples" "$dir" "$count" --variant "$count" "${flag[@]}" \
       >/dev/null || made=$?
@@ -59,7 +63,7 @@ folder_of() {
     found=$(find "$dir" -maxdepth 1 -iname '*.dwg' | wc -l)
     if [ "$made" -ne 0 ] || [ "$found" -ne "$count" ]; then
       echo "the generator failed for $dir (exit $made, $found of $count drawings); nothing measured" >&2
-      rm -rf "$dir"
+      rm -rf "$(dirname "$dir")"
       exit 1
     fi
     touch "$dir.done"
