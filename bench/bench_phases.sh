@@ -33,7 +33,8 @@ phases=(
 
 # One run's output (FOLDER NAME as $1) -> one line of the phases' durations in ms, and the thumbnails made.
 parse() {
-  awk -v folder="$1" '
+  FOLDER=$1 awk 'BEGIN { folder = ENVIRON["FOLDER"] } # not -v, which would read its backslashes as escapes
+
     $1 != "[timing]" { next }
     { t = $2 + 0; what = $3; rest = $0; sub(/^[^ ]+ [^ ]+ /, "", rest) }
     what == "settings-look" && A == "" { A = t }
