@@ -121,8 +121,8 @@ LRESULT CALLBACK CreateWindowHook(int code, WPARAM wParam, LPARAM lParam) {
             if (code == HCBT_ACTIVATE)
                 Line(Elapsed(), L"activate " + ClassOf(window));
             else if (code == HCBT_SETFOCUS)
-                Line(Elapsed(), L"focus " + ClassOf(window) + L" from " +
-                                    ClassOf(reinterpret_cast<HWND>(lParam)));
+                Line(Elapsed(),
+                     L"focus " + ClassOf(window) + L" from " + ClassOf(reinterpret_cast<HWND>(lParam)));
             else
                 Line(Elapsed(), L"show " + ClassOf(window) + L" " + std::to_wstring(LOWORD(lParam)));
         } catch (...) {
@@ -147,8 +147,8 @@ LRESULT CALLBACK CreateWindowHook(int code, WPARAM wParam, LPARAM lParam) {
 }
 
 // The library's own calls of a few system functions, seen through its import table (patched when the
-// library is loaded): looking for and opening its settings files, and scanning a folder. Nothing in the library changes;
-// devhost's functions below call the system's and only print a line around them.
+// library is loaded): looking for and opening its settings files, and scanning a folder. Nothing in the
+// library changes; devhost's functions below call the system's and only print a line around them.
 using CreateFileAFn = HANDLE(WINAPI*)(LPCSTR, DWORD, DWORD, LPSECURITY_ATTRIBUTES, DWORD, DWORD, HANDLE);
 using GetFileAttributesAFn = DWORD(WINAPI*)(LPCSTR);
 using FindFirstFn = std::intptr_t(__cdecl*)(const char*, void*);
@@ -178,7 +178,8 @@ const char* LastComponent(const char* path) {
 // Settings files: the library's own and the drawing insertion settings, "*.ini".
 bool IsSettingsFile(const char* name) {
     const std::size_t length = name ? std::strlen(name) : 0;
-    return length > 4 && CompareStringOrdinal(Widen(name + length - 4).c_str(), 4, L".ini", 4, TRUE) == CSTR_EQUAL;
+    return length > 4 &&
+           CompareStringOrdinal(Widen(name + length - 4).c_str(), 4, L".ini", 4, TRUE) == CSTR_EQUAL;
 }
 
 DWORD WINAPI TimedGetFileAttributesA(LPCSTR name) {
@@ -197,7 +198,8 @@ DWORD WINAPI TimedGetFileAttributesA(LPCSTR name) {
 
 HANDLE WINAPI TimedCreateFileA(LPCSTR name, DWORD access, DWORD share, LPSECURITY_ATTRIBUTES security,
                                DWORD disposition, DWORD flags, HANDLE templateFile) {
-    const bool reading = g_inCall && IsSettingsFile(name) && (access & GENERIC_READ) && !(access & GENERIC_WRITE);
+    const bool reading =
+        g_inCall && IsSettingsFile(name) && (access & GENERIC_READ) && !(access & GENERIC_WRITE);
     const double before = reading ? Elapsed() : 0.0;
     HANDLE file = g_createFileA(name, access, share, security, disposition, flags, templateFile);
     if (reading) {
@@ -261,7 +263,8 @@ void* PatchImport(HMODULE module, const char* name, void* replacement) {
         for (; names->u1.AddressOfData; ++names, ++addresses) {
             if (IMAGE_SNAP_BY_ORDINAL(names->u1.Ordinal))
                 continue;
-            const auto* byName = reinterpret_cast<const IMAGE_IMPORT_BY_NAME*>(base + names->u1.AddressOfData);
+            const auto* byName =
+                reinterpret_cast<const IMAGE_IMPORT_BY_NAME*>(base + names->u1.AddressOfData);
             if (std::strcmp(reinterpret_cast<const char*>(byName->Name), name) != 0)
                 continue;
             DWORD protection = 0;

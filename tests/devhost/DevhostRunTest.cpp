@@ -429,7 +429,8 @@ TEST(Devhost, DrawsTheStoredPreviewOfADrawing) {
 // --preview flat: the preview operation fills the window with one colour (0x40 0x80 0xB0, as 0x00BBGGRR
 // 0xB08040 = 11567168) and says it drew, without opening the file, which here does not even exist.
 TEST(Devhost, FlatPreviewFillsTheWindowWithoutReadingTheFile) {
-    const RunResult run = RunDevhost({L"--preview", L"flat", L"--timing", L"--eval", L"(preview \"no-such-file.dwg\")"});
+    const RunResult run =
+        RunDevhost({L"--preview", L"flat", L"--timing", L"--eval", L"(preview \"no-such-file.dwg\")"});
     EXPECT_EQ(run.exitCode, 0u) << run.errors;
     std::vector<std::string> values, timing;
     for (const std::string& line : run.lines) {
