@@ -2,6 +2,9 @@
 # Time from the LISP call to the first complete paint of the explorer on a folder of synthetic drawings,
 # under Wine: median of BENCH_RUNS runs (default 5). Prints a table.
 #   bench/bench_first_paint.sh [COUNT...]        (default: 10000 100000)
+# Each size is measured on a folder of lower-case names and on one of mixed-case names (BENCH_CASES, default
+# "lower mixed"), each with real previews (devhost draws the picture stored in each file) and with flat ones
+# (devhost --preview flat: one colour, no file opened, so the time is the library's own).
 #
 # devhost --timing prints "[timing] MS preview DRAWN/VISIBLE NAME" after each preview it draws, MS being
 # milliseconds since the call began, VISIBLE the thumbnails shown inside the grid's client area at that
@@ -16,6 +19,7 @@ need_builds
 
 counts=("$@")
 [ ${#counts[@]} -gt 0 ] || counts=(10000 100000)
+read -r -a cases <<<"${BENCH_CASES:-lower mixed}"
 
 # One run's output -> "first complete settled previews visible" (ms, ms, ms, count, count).
 parse() {
@@ -34,20 +38,34 @@ parse() {
     }'
 }
 
-printf 'First complete paint under Wine (ms since the LISP call began), median of %d runs\n\n' "$runs"
-printf '%10s %14s %16s %10s %9s %9s\n' drawings "first preview" "complete paint" settled previews visible
-printf '%10s %14s %16s %10s %9s %9s\n' ---------- -------------- ---------------- ---------- --------- ---------
+row() { printf '%10s %6s %11s %11s %14s %14s %9s %8s\n' "$@"; }
+printf 'First complete paint under Wine (ms since the LISP call began), median of %d runs\n' "$runs"
+printf 'first: the first preview drawn; complete: every visible thumbnail has its picture\n'
+printf 'real: devhost draws the stored pictures; flat: --preview flat, one colour, no file opened\n\n'
+row drawings names "first real" "first flat" "complete real" "complete flat" previews visible
+row ---------- ------ ----------- ----------- -------------- -------------- --------- --------
 for count in "${counts[@]}"; do
-  folder=$(folder_of "$count")
-  firsts=() completes=() settles=() previews=() visibles=()
-  for ((r = 0; r < runs; r++)); do
-    read -r first complete settled n visible < <(explorer_run "$folder" --after-ms 8000 --post cancel | parse)
-    firsts+=("$first") completes+=("$complete") settles+=("$settled") previews+=("$n") visibles+=("$visible")
-    [ -z "${BENCH_VERBOSE:-}" ] ||
-      echo "  run $((r + 1)): first $first complete $complete settled $settled previews $n visible $visible" >&2
+  for case in "${cases[@]}"; do
+    folder=$(folder_of "$count" "$case")
+    need_drawings "$folder"
+    declare -A first=() complete=()
+    previews=() visibles=()
+    for preview in real flat; do
+      firsts=() completes=()
+      for ((r = 0; r < runs; r++)); do
+        read -r f c settled n visible < <(explorer_run "$folder" --preview "$preview" --after-ms 8000 --post cancel |
+          parse)
+        firsts+=("$f") completes+=("$c")
+        [ "$preview" == flat ] || { previews+=("$n"); visibles+=("$visible"); }
+        [ -z "${BENCH_VERBOSE:-}" ] ||
+          echo "  $count $case $preview run $((r + 1)): first $f complete $c settled $settled previews $n visible $visible" >&2
+      done
+      first[$preview]=$(printf '%s\n' "${firsts[@]}" | median)
+      complete[$preview]=$(printf '%s\n' "${completes[@]}" | median)
+      record first_paint "$count" "$case" "$preview" "${complete[$preview]}"
+    done
+    row "$count" "$case" "${first[real]}" "${first[flat]}" "${complete[real]}" "${complete[flat]}" \
+      "$(printf '%s\n' "${previews[@]}" | median 0)" "$(printf '%s\n' "${visibles[@]}" | median 0)"
+    unset first complete
   done
-  printf '%10s %14s %16s %10s %9s %9s\n' "$count" \
-    "$(printf '%s\n' "${firsts[@]}" | median)" "$(printf '%s\n' "${completes[@]}" | median)" \
-    "$(printf '%s\n' "${settles[@]}" | median)" "$(printf '%s\n' "${previews[@]}" | median 0)" \
-    "$(printf '%s\n' "${visibles[@]}" | median 0)"
 done

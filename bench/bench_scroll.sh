@@ -11,6 +11,10 @@
 # handling is over) and each preview drawn. A step lasts from its key to the later of key-handled and the
 # last preview drawn before the next key: the row is on the screen, pictures included. "previews" is how
 # many pictures a step draws. A step should cost the same whatever the folder's size.
+# Each size is measured on a folder of lower-case names and on one of mixed-case names (BENCH_CASES, default
+# "lower mixed"), each with real previews and with flat ones (devhost --preview flat: one colour, no file
+# opened, so the step's time is the library's own). The script's last key (Escape) cancels the explorer; if
+# it does not, devhost's timer cancels the call BENCH_CALL_LIMIT_MS after it began (default here 60 s).
 set -euo pipefail
 source "$(dirname "${BASH_SOURCE[0]}")/explorer-lib.sh"
 need_builds
@@ -18,11 +22,13 @@ need_builds
 counts=("$@")
 [ ${#counts[@]} -gt 0 ] || counts=(10000 100000)
 steps=${BENCH_STEPS:-5}
+read -r -a cases <<<"${BENCH_CASES:-lower mixed}"
+export BENCH_CALL_LIMIT_MS=${BENCH_CALL_LIMIT_MS:-60000}
 
 script="$data/scroll-script.txt"
 mkdir -p "$data"
 {
-  echo 'wait contains=".dwg" timeout=120000'
+  echo 'wait class=Orvex1Wnd timeout=120000' # the first thumbnail
   echo 'sleep 1000'
   echo 'click contains=".dwg" nth=0 at=60,-50'
   echo 'sleep 500'
@@ -54,24 +60,35 @@ parse() {
     END { flush() }'
 }
 
-printf 'One scroll step of the grid under Wine (ms from the key to the new row drawn), median of %d runs x %d steps\n\n' \
+row() { printf '%10s %6s %9s %6s %10s %10s %9s\n' "$@"; }
+printf 'One scroll step of the grid under Wine (ms from the key to the new row drawn), median of %d runs x %d steps\n' \
   "$runs" "$steps"
-printf '%10s %9s %6s %14s %12s %9s\n' drawings position key "key handled" "step done" previews
-printf '%10s %9s %6s %14s %12s %9s\n' ---------- --------- ------ -------------- ------------ ---------
+printf 'real: devhost draws the stored pictures; flat: --preview flat, one colour, no file opened\n\n'
+row drawings names position key "step real" "step flat" previews
+row ---------- ------ --------- ------ ---------- ---------- ---------
 for count in "${counts[@]}"; do
-  folder=$(folder_of "$count")
-  results=$(mktemp)
-  for ((r = 0; r < runs; r++)); do
-    explorer_run "$folder" --script "$(winpath "$script")" | parse >>"$results"
-  done
-  for where in top bottom; do
-    for key in Down Up; do
-      sel() { awk -v w="$where" -v k="$key" -v c="$1" '$1 == w && $2 == k { print $c }' "$results"; }
-      [ -n "$(sel 3)" ] || continue
-      printf '%10s %9s %6s %14s %12s %9s\n' "$count" "$where" "$key" "$(sel 3 | median)" "$(sel 4 | median)" \
-        "$(sel 5 | median 0)"
+  for case in "${cases[@]}"; do
+    folder=$(folder_of "$count" "$case")
+    need_drawings "$folder"
+    real=$(mktemp) flat=$(mktemp)
+    for ((r = 0; r < runs; r++)); do
+      explorer_run "$folder" --preview real --script "$(winpath "$script")" | parse >>"$real"
+      explorer_run "$folder" --preview flat --script "$(winpath "$script")" | parse >>"$flat"
     done
+    for where in top bottom; do
+      for key in Down Up; do
+        sel() { awk -v w="$where" -v k="$key" -v c="$2" '$1 == w && $2 == k { print $c }' "$1"; }
+        [ -n "$(sel "$real" 3)$(sel "$flat" 3)" ] || continue
+        r=$(sel "$real" 4 | median) f=$(sel "$flat" 4 | median)
+        row "$count" "$case" "$where" "$key" "$r" "$f" "$(sel "$real" 5 | median 0)"
+        record scroll "$count" "$case" "$where" "$key" real "$r"
+        record scroll "$count" "$case" "$where" "$key" flat "$f"
+      done
+    done
+    if [ -n "${BENCH_VERBOSE:-}" ]; then
+      sed 's/^/  real /' "$real" >&2
+      sed 's/^/  flat /' "$flat" >&2
+    fi
+    rm -f "$real" "$flat"
   done
-  [ -z "${BENCH_VERBOSE:-}" ] || sed 's/^/  /' "$results" >&2
-  rm -f "$results"
 done

@@ -24,6 +24,8 @@ using namespace devhost;
 
 namespace {
 
+const COLORREF kFlatPreviewColor = RGB(0x40, 0x80, 0xB0);
+
 void Verbose(const std::wstring& line) {
     if (Host().options.verbose)
         WriteLine(L"[host] " + line);
@@ -37,6 +39,25 @@ template <class Result, class Body> Result Guarded(Result fallback, Body body) {
         return fallback;
     }
 }
+
+#ifndef DEVHOST_WITHOUT_PREVIEW_OPERATION
+// --preview flat: the whole client area in one colour, whatever the file (which is not opened), so that
+// every picture costs the same small time and a benchmark sees the library's own share.
+bool FillWithFlatPreview(HWND window) {
+    RECT client;
+    if (!GetClientRect(window, &client))
+        return false;
+    HDC dc = GetDC(window);
+    if (!dc)
+        return false;
+    HBRUSH brush = CreateSolidBrush(kFlatPreviewColor);
+    const bool filled = brush && FillRect(dc, &client, brush) != 0;
+    if (brush)
+        DeleteObject(brush);
+    ReleaseDC(window, dc);
+    return filled;
+}
+#endif
 
 std::wstring Text(const wchar_t* text) {
     return text ? std::wstring(text) : std::wstring();
@@ -224,18 +245,23 @@ std::uint32_t acedGetRGB(int colorIndex) {
 // the operation plays a host that lacks it.
 #ifndef DEVHOST_WITHOUT_PREVIEW_OPERATION
 bool acdbDisplayPreviewFromDwg(const wchar_t* fileName, HWND window, const std::uint32_t* bgColor) {
-#ifdef DEVHOST_HAVE_DWGPREVIEW
     return Guarded(false, [&] {
         if (!fileName || !window || !IsWindow(window))
             return false;
-        const COLORREF background = bgColor ? static_cast<COLORREF>(*bgColor) : GetSysColor(COLOR_WINDOW);
-        const bool drawn = DrawDwgPreviewInWindow(window, fileName, background);
+        bool drawn = false;
+        if (Host().options.preview == Options::Preview::Flat) {
+            drawn = FillWithFlatPreview(window);
+        } else {
+#ifdef DEVHOST_HAVE_DWGPREVIEW
+            const COLORREF background = bgColor ? static_cast<COLORREF>(*bgColor) : GetSysColor(COLOR_WINDOW);
+            drawn = DrawDwgPreviewInWindow(window, fileName, background);
+#else
+            return false;
+#endif
+        }
         TimingPreviewDrawn(window, fileName);
         return drawn;
     });
-#else
-    return false;
-#endif
 }
 #endif
 

@@ -7,7 +7,8 @@ namespace devhost {
 const wchar_t* const kUsage =
     L"usage: devhost.exe [--arx PATH] [--order entry-first|module-first] [--drawings N]\n"
     L"                   [--layer NAME=ACI]... [--alert-box] [--after-ms MS --post accept|cancel]\n"
-    L"                   [--eval EXPR]... [--script FILE] [--verbose] [--timing]\n"
+    L"                   [--eval EXPR]... [--script FILE] [--verbose] [--timing] [--timing-sent]\n"
+    L"                   [--preview real|flat]\n"
     L"                   [--check-heaps] [--refuse-window CLASS-PREFIX]\n";
 
 namespace {
@@ -114,6 +115,20 @@ bool ParseOptions(const std::vector<std::wstring>& args, Options& options, std::
             options.verbose = true;
         } else if (option == L"--timing") {
             options.timing = true;
+        } else if (option == L"--timing-sent") {
+            options.timing = true;
+            options.timingSent = true;
+        } else if (option == L"--preview") {
+            if (!value(text))
+                return false;
+            if (text == L"real") {
+                options.preview = Options::Preview::Real;
+            } else if (text == L"flat") {
+                options.preview = Options::Preview::Flat;
+            } else {
+                error = L"--preview takes real or flat, not " + text;
+                return false;
+            }
         } else if (option == L"--check-heaps") {
             options.checkHeaps = true;
         } else if (option == L"--refuse-window") {

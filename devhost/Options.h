@@ -25,8 +25,11 @@ struct Options {
     std::vector<std::wstring> evals;
     std::wstring script;
     bool verbose = false;
-    bool timing = false; // [timing] lines: when previews are drawn and keys are taken, in ms
-    bool checkHeaps = false;   // validate every heap of the process after each call
+    bool timing = false;     // [timing] lines: when previews are drawn and keys are taken, in ms
+    bool timingSent = false; // with timing: also first paints sent while the library works (slower)
+    enum class Preview { Real, Flat };
+    Preview preview = Preview::Real; // flat: the preview operation fills the window, reads no file
+    bool checkHeaps = false;         // validate every heap of the process after each call
     std::wstring refuseWindow; // top-level windows whose class begins with this are refused (a test aid)
     bool help = false;
 };

@@ -240,6 +240,7 @@ bool Session::LoadLibraryAndEntryPoints() {
     }
     if (m_options.verbose)
         WriteLine(L"[host] loaded " + m_libraryPath);
+    TimingWatchLibrary(m_library);
     return true;
 }
 

@@ -1,5 +1,6 @@
 // --timing: "[timing] MS WHAT ..." lines that let a benchmark see how fast the library answers, MS being
-// milliseconds (three decimals) since the running LISP call began. Used on the user-interface thread only.
+// milliseconds (three decimals) since the running LISP call began, less the time devhost spent measuring
+// (counting windows, writing these lines). Used on the user-interface thread only.
 //
 //   [timing] 0.000 call                   the call begins (the clock starts)
 //   [timing] MS preview DRAWN/VISIBLE NAME a preview was drawn into a window: VISIBLE windows of that
@@ -11,12 +12,25 @@
 //   [timing] MS key-handled               the next message it took after that key: the key's handling
 //                                          had ended
 //   [timing] MS call-end                  the call returned
+//   [timing] MS create CLASS in PARENT    the thread is about to create a window of CLASS, child of a
+//                                          window of PARENT ("-": a top-level window)
+//   [timing] MS activate CLASS            a window of CLASS is about to be activated
+//   [timing] MS show CLASS SW             one is about to be minimised, maximised or restored (SW_ code)
+//   [timing] MS focus CLASS from OLD      the keyboard focus is about to move to a window of CLASS
+//   [timing] MS paint CLASS               the thread took the first WM_PAINT of a window of CLASS
+//   [timing] MS settings-look NAME        the library asked for the attributes of the settings file NAME
+//                                          ("*.ini", last part of its path): the settings read begins
+//   [timing] MS settings-open NAME        it opened that file to read it
+//   [timing] MS scan-begin PATTERN        the library began a folder search
+//   [timing] MS scan-end N entries        it closed the search after N entries
 #pragma once
 
 #include <windows.h>
 
 namespace devhost {
 
+// Watches the library's settings file reads and folder scans through its import table.
+void TimingWatchLibrary(HMODULE library);
 void TimingCallBegins();
 void TimingCallEnded();
 void TimingPreviewDrawn(HWND window, const wchar_t* fileName);

@@ -463,8 +463,26 @@ TEST(Devhost, DrawsTheStoredPreviewOfADrawing) {
         {L"--eval", L"(preview \"" + escaped + L"\")", L"--eval", L"(preview \"no-such-file.dwg\")"});
     EXPECT_EQ(run.exitCode, 0u) << run.errors;
     ASSERT_EQ(run.lines.size(), Opening().size() + 2 + Closing().size()) << run.output;
-    EXPECT_EQ(run.lines[Opening().size()], "=> (1 1)"); // drawn, and more than the background shows
+    EXPECT_EQ(run.lines[Opening().size()].rfind("=> (1 1 ", 0), 0u) << run.output; // more than the background
     EXPECT_EQ(run.lines[Opening().size() + 1].rfind("=> (0 ", 0), 0u) << run.output; // nothing to draw
+}
+
+// --preview flat: the preview operation fills the window with one colour (0x40 0x80 0xB0, as 0x00BBGGRR
+// 0xB08040 = 11567168) and says it drew, without opening the file, which here does not even exist.
+TEST(Devhost, FlatPreviewFillsTheWindowWithoutReadingTheFile) {
+    const RunResult run =
+        RunDevhost({L"--preview", L"flat", L"--timing", L"--eval", L"(preview \"no-such-file.dwg\")"});
+    EXPECT_EQ(run.exitCode, 0u) << run.errors;
+    std::vector<std::string> values, timing;
+    for (const std::string& line : run.lines) {
+        if (line.rfind("=> ", 0) == 0)
+            values.push_back(line);
+        if (line.rfind("[timing] ", 0) == 0 && line.find(" preview ") != std::string::npos)
+            timing.push_back(line);
+    }
+    EXPECT_EQ(values, (std::vector<std::string>{"=> (1 0 11567168)"})) << run.output;
+    ASSERT_EQ(timing.size(), 1u) << run.output; // the benchmark still sees each picture drawn
+    EXPECT_NE(timing[0].find("no-such-file.dwg"), std::string::npos) << run.output;
 }
 
 TEST(Devhost, BadScriptIsAUsageError) {

@@ -33,6 +33,7 @@ TEST(Options, Defaults) {
     EXPECT_TRUE(options.script.empty());
     EXPECT_FALSE(options.verbose);
     EXPECT_FALSE(options.timing);
+    EXPECT_EQ(options.preview, Options::Preview::Real);
 }
 
 TEST(Options, EveryOption) {
@@ -61,6 +62,11 @@ TEST(Options, EveryOption) {
     EXPECT_EQ(Parse({L"--refuse-window", L"Orvex1:"}).refuseWindow, L"Orvex1:");
     EXPECT_TRUE(Parse({L"--check-heaps"}).checkHeaps);
     EXPECT_FALSE(Parse({}).checkHeaps);
+    EXPECT_EQ(Parse({L"--preview", L"flat"}).preview, Options::Preview::Flat);
+    EXPECT_TRUE(Parse({L"--timing-sent"}).timing);
+    EXPECT_TRUE(Parse({L"--timing-sent"}).timingSent);
+    EXPECT_FALSE(Parse({L"--timing"}).timingSent);
+    EXPECT_EQ(Parse({L"--preview", L"real"}).preview, Options::Preview::Real);
 }
 
 TEST(Options, BadUsage) {
@@ -75,6 +81,8 @@ TEST(Options, BadUsage) {
     EXPECT_EQ(Error({L"--after-ms", L"10"}), L"--after-ms and --post go together");
     EXPECT_EQ(Error({L"--post", L"accept"}), L"--after-ms and --post go together");
     EXPECT_EQ(Error({L"--refuse-window", L""}), L"--refuse-window needs the beginning of a window class name");
+    EXPECT_EQ(Error({L"--preview", L"blurry"}), L"--preview takes real or flat, not blurry");
+    EXPECT_EQ(Error({L"--preview"}), L"--preview needs a value");
     EXPECT_EQ(Error({L"--after-ms", L"10", L"--post", L"maybe"}),
               L"--post takes accept or cancel, not maybe");
 }

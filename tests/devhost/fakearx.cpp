@@ -150,8 +150,8 @@ void Misc() {
     Host().acutRelRb(list);
 }
 
-// Draws a drawing's preview into the view and tells whether it was drawn and how many colours a grid of
-// the view's pixels then shows.
+// Draws a drawing's preview into the view and tells whether it was drawn, whether a grid of the view's
+// pixels then shows more than one colour, and the colour of its centre (0x00BBGGRR, as a long).
 void Preview() {
     resbuf* args = Host().acedGetArgs();
     HWND view = Host().acedGetAcadDwgView();
@@ -172,9 +172,10 @@ void Preview() {
                 colours.push_back(c);
         }
     }
+    const COLORREF centre = GetPixel(dc, client.right / 2, client.bottom / 2);
     ReleaseDC(view, dc);
-    resbuf* list =
-        Host().acutBuildList(RTSHORT, drawn ? 1 : 0, RTSHORT, static_cast<int>(colours.size() > 1), 0);
+    resbuf* list = Host().acutBuildList(RTSHORT, drawn ? 1 : 0, RTSHORT, static_cast<int>(colours.size() > 1),
+                                        RTLONG, static_cast<std::int32_t>(centre), 0);
     Host().acedRetList(list);
     Host().acutRelRb(list);
     Host().acutRelRb(args);

@@ -3,6 +3,7 @@
 #include "preview/DwgPreview.h"
 
 #include <algorithm>
+#include <cctype>
 #include <cstdio>
 #include <cstring>
 #include <memory>
@@ -282,7 +283,11 @@ std::uint64_t GenerateSamples(const GenerateOptions& options, std::string& error
         const std::vector<unsigned char> file = BuildDwg(dib, target > core ? target - core : 0, rng.Next());
 
         path.resize(dirLength);
-        path += SampleName(i, options.variant);
+        std::string name = SampleName(i, options.variant);
+        if (options.lowerCase)
+            for (char& c : name)
+                c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+        path += name;
         std::FILE* f = std::fopen(path.c_str(), "wb");
         if (f == nullptr) {
             error = "cannot create " + path;

@@ -54,6 +54,7 @@ struct GenerateOptions {
     std::uint64_t count = 0;
     std::uint64_t variant = 1;
     PictureOptions picture;
+    bool lowerCase = false; // names all in lower case (else mixed, as SampleName makes them)
     // Modification times are spread over this many seconds before baseTime.
     std::int64_t baseTime = 1700000000;
     std::int64_t timeSpread = 5LL * 365 * 24 * 3600;

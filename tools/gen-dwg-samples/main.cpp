@@ -1,6 +1,7 @@
-// gen-dwg-samples OUTDIR COUNT [--variant N] [--width W] [--height H] [--bpp 24|8|4]
+// gen-dwg-samples OUTDIR COUNT [--variant N] [--width W] [--height H] [--bpp 24|8|4] [--lower-case]
 // Writes COUNT synthetic drawing files (container layout and preview picture only, no drawing content)
-// into OUTDIR, for tests and benchmarks of the thumbnail browser.
+// into OUTDIR, for tests and benchmarks of the thumbnail browser. Their names mix upper and lower case;
+// with --lower-case they are all lower case (the same names otherwise).
 #include "SyntheticDwg.h"
 
 #include <cstdio>
@@ -12,7 +13,8 @@ namespace {
 
 int Usage() {
     std::fprintf(stderr,
-                 "usage: gen-dwg-samples OUTDIR COUNT [--variant N] [--width W] [--height H] [--bpp 24|8|4]\n");
+                 "usage: gen-dwg-samples OUTDIR COUNT [--variant N] [--width W] [--height H] [--bpp 24|8|4] "
+                 "[--lower-case]\n");
     return 2;
 }
 
@@ -35,6 +37,10 @@ int main(int argc, char** argv) {
     options.count = value;
     for (int i = 3; i < argc; ++i) {
         const char* flag = argv[i];
+        if (std::strcmp(flag, "--lower-case") == 0) {
+            options.lowerCase = true;
+            continue;
+        }
         if (i + 1 >= argc || !ParseNumber(argv[i + 1], value))
             return Usage();
         ++i;
