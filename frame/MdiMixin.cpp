@@ -168,9 +168,14 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
         frame->ShowWindow(SW_SHOWNORMAL);
     }
 
-    // 7. The node the tree's walk reached is selected: the selection scans it and the grid shows it.
+    // 7. The node the tree's walk reached is selected: the selection scans it and the grid shows it. Only
+    // from here on does a selection scan its folder: showing the frame gave the tree the focus, and the
+    // tree control then selected its first visible item on its own.
+    if (tree)
+        tree->FollowSelection(true);
     if (treeOpened) {
         if (HTREEITEM target = tree->m_hPathTarget) {
+            tree->SelectItem(nullptr); // the target may be the item the control chose: selected anew
             tree->SelectSetFirstVisible(target);
             tree->SelectDropTarget(target);
             tree->SelectItem(target);

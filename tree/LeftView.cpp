@@ -54,6 +54,8 @@ bool CLeftView::Create(const char* className, const char* windowName, DWORD styl
         return true; // an empty pane: the explorer works on without its tree
     auto* doc = dynamic_cast<CTessel3Doc*>(m_pDocument);
     m_wndTree.SetDocument(doc);
+    // Until the frame has shown itself and selected the folder it opens on (it turns this on again).
+    m_wndTree.FollowSelection(false);
     {
         CDesktopFolderRef desktop;
         if (doc)

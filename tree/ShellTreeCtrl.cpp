@@ -293,7 +293,7 @@ void CShellTreeCtrl::RefreshCurrentFolder() {
 }
 
 void CShellTreeCtrl::OnSelChanged(HTREEITEM item) {
-    if (m_bClosing || !item)
+    if (m_bClosing || !m_bFollowSelection || !item)
         return;
     if (onEnablePick)
         onEnablePick(false);

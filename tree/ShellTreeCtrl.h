@@ -64,6 +64,10 @@ public:
     int ScanFolder(HTREEITEM item, const char* needle, std::string* problem = nullptr);
     // Rescans the selected folder and has the grid rebuild (after a rename or a file command).
     void RefreshCurrentFolder();
+    // Whether a selection change scans its folder (on after construction). The explorer holds it off while
+    // it opens: a tree control that gets the focus without a selection selects its first visible item,
+    // which would scan a folder the user never asked for.
+    void FollowSelection(bool follow) { m_bFollowSelection = follow; }
 
 protected:
     void PreSubclassWindow() override;
@@ -86,4 +90,5 @@ private:
     UINT m_nCallbackMask = 0;
     CTessel3Doc* m_pDoc = nullptr;
     bool m_bClosing = false; // the window is going: selection changes are no longer folder changes
+    bool m_bFollowSelection = true;
 };

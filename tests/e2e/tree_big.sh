@@ -30,6 +30,10 @@ printf '%s\n' 'wait contains=".dwg" timeout=30000' 'key right' 'sleep 800' "tree
 devhost --timing --script "$(winpath "$WORK/script.txt")" --eval "(Orvex 1 2 \"$(lisppath "$root")\\\\\" \"Insert\" \"Close\")"
 expect_line "Escape ends the call" "=> nil"
 
+# The first folder searched is the start folder: opening the explorer scans no other folder on the way.
+first_scan=$(printf '%s\n' "$OUT" | sed -n 's/^\[timing\] [0-9.]* scan-begin //p' | head -1)
+expect_true "the first folder scanned is the start folder (got $first_scan)" \
+  [ "$first_scan" == "$(winpath "$root")\\*" ]
 counts=$(printf '%s\n' "$OUT" | sed -n 's/^\[script\] tree-count //p' | tr '\n' ' ')
 read -r before after <<<"$counts"
 expect_true "the node holds the $count sub-folders afterwards (tree items $before before, ${after:-none} after)" \

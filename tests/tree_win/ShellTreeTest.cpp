@@ -253,6 +253,29 @@ TEST_F(ShellTree, SelectingAFolderScansItAndTheHighlightFollowsTheSelection) {
     EXPECT_TRUE(SameText(current, a)) << current;
 }
 
+TEST_F(ShellTree, ASelectionMadeWhileTheTreeDoesNotFollowScansNothing) {
+    CTessel3Doc doc(folder.File("Orvex1.ini"));
+    doc.m_strPath = "C:\\before";
+    CountingTree tree;
+    tree.SetDocument(&doc);
+    int shown = 0;
+    tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
+    OpenAt(tree, b);
+    BeginScan();
+    tree.FollowSelection(false);
+    ASSERT_TRUE(tree.SelectItem(tree.m_hPathTarget));
+    PumpPending();
+    EXPECT_EQ(shown, 0);
+    EXPECT_EQ(doc.m_strPath, "C:\\before");
+    EXPECT_EQ(DwgList.GetSize(), 0);
+
+    tree.FollowSelection(true);
+    ASSERT_TRUE(tree.SelectItem(tree.GetParentItem(tree.m_hPathTarget)));
+    PumpPending();
+    EXPECT_EQ(shown, 1);
+    EXPECT_TRUE(SameText(doc.m_strPath, a)) << doc.m_strPath;
+}
+
 TEST_F(ShellTree, RefreshingRescansTheSelectedFolder) {
     CTessel3Doc doc(folder.File("Orvex1.ini"));
     CountingTree tree;
