@@ -151,7 +151,8 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // node as soon as it got the focus.
     CChildView* tree = frame->GetFolderTree();
     const bool treeOpened = tree && tree->m_hPathTarget;
-    const std::string scanProblem = treeOpened ? std::string() : ShowStartFolder(*frame, *doc, call.startPath);
+    const std::string scanProblem =
+        treeOpened ? std::string() : ShowStartFolder(*frame, *doc, call.startPath);
     if (!treeOpened)
         if (CTessel3View* grid = frame->GetGridView())
             frame->SetActiveView(grid, false);
@@ -187,6 +188,9 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // Nothing is chosen yet.
     frame->UpdateWindow();
     frame->EnablePick(false);
+    // The pictures are up: the tree now opens the start folder to show its sub-folders.
+    if (treeOpened)
+        tree->OpenPathTargetLater();
 
     // 8. The drawing of the last run is chosen again: its name starts the search, and the drawing itself is
     // selected (the search may have found another name first). It stays the current drawing, so accept

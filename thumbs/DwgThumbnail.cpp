@@ -204,18 +204,23 @@ bool exCDwgThumbnail::Create(const std::string& name, int listIndex, const char*
     ShowWindow(SW_SHOW);
     m_strName = name;
 
-    m_wndToolTip.Create(this, 0);
+    // The tooltip's window is made when the mouse first moves over the picture (CreateToolTip): most
+    // thumbnails are scrolled past without it, and a window less for each makes the grid quicker to build.
     const DwgData& record = RecordAt(listIndex);
-    ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
+    const ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
     m_strToolTip = tip.text;
-    if (m_wndToolTip.m_hWnd) {
-        // A width of so few pixels makes the tooltip break its text at the blanks: name, size, date.
-        m_wndToolTip.SetMaxTipWidth(tip.width);
-        m_wndToolTip.AddTool(this, tip.text);
-        m_wndToolTip.Activate(false);
-    }
+    m_nToolTipWidth = tip.width;
     CreateLabel(name, cell);
     return true;
+}
+
+void exCDwgThumbnail::CreateToolTip() {
+    if (m_wndToolTip.m_hWnd || !m_wndToolTip.Create(this, 0))
+        return;
+    // A width of so few pixels makes the tooltip break its text at the blanks: name, size, date.
+    m_wndToolTip.SetMaxTipWidth(m_nToolTipWidth);
+    m_wndToolTip.AddTool(this, m_strToolTip);
+    m_wndToolTip.Activate(false);
 }
 
 bool exCDwgThumbnail::CreateLabel(const std::string& name, const RECT& cell) {
@@ -344,8 +349,9 @@ bool exCDwgThumbnail::PreTranslateMessage(MSG* pMsg) {
 bool exCDwgThumbnail::TranslateInput(MSG* pMsg) {
     switch (pMsg->message) {
     case WM_MOUSEMOVE:
-        // Created inactive, the tooltip starts to work when the mouse first moves over the picture; from
-        // then on the control's own delays decide when it shows.
+        // Created inactive when the mouse first moves over the picture, the tooltip starts to work then;
+        // from then on the control's own delays decide when it shows.
+        CreateToolTip();
         if (m_wndToolTip.m_hWnd && !m_bToolTipActive) {
             m_wndToolTip.Activate(true);
             m_bToolTipActive = true;

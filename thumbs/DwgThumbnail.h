@@ -62,6 +62,7 @@ public:
     int ListIndex() const { return m_nListIndex; }
     const std::string& Name() const { return m_strName; }
     CThumbLabel& Label() { return m_wndLabel; }
+    // The tooltip; its window exists once the mouse has moved over the picture.
     CToolTipCtrl& ToolTip() { return m_wndToolTip; }
     // The tooltip's text as it was built at creation.
     const std::string& ToolTipText() const { return m_strToolTip; }
@@ -74,6 +75,7 @@ protected:
 private:
     friend class CThumbLabel;
     bool CreateLabel(const std::string& name, const RECT& cell);
+    void CreateToolTip();
     // The mouse and key table of PreTranslateMessage; true when the message was consumed.
     bool TranslateInput(MSG* pMsg);
     // Marks this drawing selected and current; clearOthers first drops every other selection.
@@ -92,6 +94,7 @@ private:
     int m_nListIndex = -1;
     CToolTipCtrl m_wndToolTip;
     std::string m_strToolTip;
+    int m_nToolTipWidth = 0;
     bool m_bToolTipActive = false;
 };
 
