@@ -176,11 +176,15 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
         tree->FollowSelection(true);
     if (treeOpened) {
         if (HTREEITEM target = tree->m_hPathTarget) {
+            // The tree paints once the grid has drawn its pictures, not when the grid takes the focus on
+            // the way: its first paint asks the shell for every visible folder's icon.
+            tree->SendMessage(WM_SETREDRAW, FALSE);
             tree->SelectItem(nullptr); // the target may be the item the control chose: selected anew
             tree->SelectSetFirstVisible(target);
             tree->SelectDropTarget(target);
             tree->SelectItem(target);
             tree->EnsureVisible(target); // sideways too: a deep folder in a narrow pane
+            tree->SendMessage(WM_SETREDRAW, TRUE);
             tree->SetFocus();
         }
     }
