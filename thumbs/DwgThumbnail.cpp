@@ -214,6 +214,33 @@ bool exCDwgThumbnail::Create(const std::string& name, int listIndex, const char*
     return true;
 }
 
+bool exCDwgThumbnail::Rebind(const std::string& name, int listIndex, const RECT& cell) {
+    // A label being renamed keeps its edit until the control is destroyed, as before any scroll.
+    if (!m_hWnd || !m_wndLabel.m_hWnd || m_wndLabel.m_bRenaming)
+        return false;
+    const DwgData& record = RecordAt(listIndex);
+    m_nListIndex = listIndex;
+    m_strName = name;
+    // A tooltip of the drawing before would show its text: made again when the mouse comes.
+    m_wndToolTip.DestroyWindow();
+    m_bToolTipActive = false;
+    const ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
+    m_strToolTip = tip.text;
+    m_nToolTipWidth = tip.width;
+
+    constexpr UINT kMove = SWP_NOZORDER | SWP_NOACTIVATE | SWP_NOCOPYBITS;
+    const CRect rc(cell);
+    ::SetWindowPos(m_hWnd, nullptr, rc.left, rc.top, rc.Width(), rc.Height(), kMove);
+    ::InvalidateRect(m_hWnd, nullptr, TRUE);
+    const CRect label = LabelRect(cell);
+    ::SetWindowPos(m_wndLabel.m_hWnd, nullptr, label.left, label.top, label.Width(), label.Height(), kMove);
+    m_wndLabel.SetWindowText(name); // drops any highlight of the drawing before
+    if (record.IsSelected())
+        HighlightLabel();
+    ::InvalidateRect(m_wndLabel.m_hWnd, nullptr, TRUE);
+    return true;
+}
+
 void exCDwgThumbnail::CreateToolTip() {
     if (m_wndToolTip.m_hWnd || !m_wndToolTip.Create(this, 0))
         return;
@@ -223,11 +250,15 @@ void exCDwgThumbnail::CreateToolTip() {
     m_wndToolTip.Activate(false);
 }
 
-bool exCDwgThumbnail::CreateLabel(const std::string& name, const RECT& cell) {
+CRect exCDwgThumbnail::LabelRect(const RECT& cell) {
     const int cxEdge = ::GetSystemMetrics(SM_CXEDGE);
     const int cyEdge = ::GetSystemMetrics(SM_CYEDGE);
-    const CRect rc(cell.left + cxEdge, cell.bottom + cyEdge, cell.right - cxEdge,
-                   cell.bottom + CTessel3View::LabelHeight() - cyEdge);
+    return CRect(cell.left + cxEdge, cell.bottom + cyEdge, cell.right - cxEdge,
+                 cell.bottom + CTessel3View::LabelHeight() - cyEdge);
+}
+
+bool exCDwgThumbnail::CreateLabel(const std::string& name, const RECT& cell) {
+    const CRect rc = LabelRect(cell);
     m_wndLabel.m_pOwner = this;
     if (!m_wndLabel.CreateEx(0, "EDIT", "", WS_CHILD | ES_READONLY | ES_NOHIDESEL | ES_AUTOHSCROLL, rc,
                              m_pView, 0))

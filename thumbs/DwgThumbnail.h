@@ -53,6 +53,10 @@ public:
 
     bool Create(const std::string& name, int listIndex, const char* windowName, DWORD style, const RECT& cell,
                 CTessel3View* parentView, UINT id);
+    // Shows another drawing in the existing windows, moved to another cell: what destroying the control
+    // and creating it anew would show, at a fraction of the cost. False (nothing changed) when the control
+    // has no window or its label is being renamed.
+    bool Rebind(const std::string& name, int listIndex, const RECT& cell);
     bool DestroyWindow() override;
     bool PreTranslateMessage(MSG* pMsg) override;
     // Drops the label's highlight and the record's selection.
@@ -75,6 +79,7 @@ protected:
 private:
     friend class CThumbLabel;
     bool CreateLabel(const std::string& name, const RECT& cell);
+    static CRect LabelRect(const RECT& cell);
     void CreateToolTip();
     // The mouse and key table of PreTranslateMessage; true when the message was consumed.
     bool TranslateInput(MSG* pMsg);
