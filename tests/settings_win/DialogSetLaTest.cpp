@@ -6,6 +6,7 @@
 #include "hostapi/TextConv.h"
 #include "settings/FolderSettings.h"
 #include "settings/IniFile.h"
+#include "settings/IniFileIo.h"
 #include "tests/settings/ReportedMessages.h"
 #include "tests/support/TempFolder.h"
 
@@ -430,6 +431,19 @@ TEST_F(FolderSettingsNotSaved, AFileHeldOpenWithoutSharingIsLeftAndTheUserIsTold
     EXPECT_EQ(commandShown, "") << "an unreadable file opens the dialog on its defaults";
     ExpectTold(seen, "it could not be read");
     EXPECT_EQ(Ini(), before);
+}
+
+TEST_F(FolderSettingsNotSaved, AFullDiskLeavesTheFileAndTheUserIsTold) {
+    WriteIni(
+        "[Default Parameters]\r\nLayer=DOORS\r\nLisp command=(c:go)\r\nColor=5\r\n\r\n[Mine]\r\nA=1\r\n");
+    const std::string before = Ini();
+    SetDiskRoomForTesting(20);
+    const NotSaved seen = AcceptACommand();
+    SetDiskRoomForTesting(-1);
+    ExpectTold(seen, "was not saved: the disk is full");
+    EXPECT_EQ(Ini(), before);
+    EXPECT_EQ(FilesIn(m_folder.Dir()), std::vector<std::string>{"datains.ini"})
+        << "no temporary file is left";
 }
 
 TEST_F(FolderSettingsNotSaved, AFileWithALineOf3000CharactersIsLeftAndTheUserIsTold) {
