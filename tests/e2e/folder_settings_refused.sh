@@ -66,4 +66,31 @@ if cmp -s "$doors/datains.ini" "$WORK/datains.saved"; then pass "datains.ini is 
 else fail "datains.ini is left byte for byte"; cat -A "$doors/datains.ini"; fi
 chmod u+w "$doors/datains.ini"
 
+# 3. Another program holds datains.ini open without sharing: the pick works and returns no parameters
+#    (insert on the current layer, no command), and the file is left as it was.
+helper="$(dirname "$DEVHOST")/settings_helper.exe"
+if [ -f "$helper" ]; then
+  rm -f "$WORK/held" "$WORK/release"
+  "$WINE_RUN" "$helper" hold "$ini_win" "$(winpath "$WORK/held")" "$(winpath "$WORK/release")" 120000 \
+    >"$WORK/holder.out" 2>&1 &
+  holder=$!
+  for _ in $(seq 1 300); do [ -f "$WORK/held" ] && break; sleep 0.1; done
+  if [ -f "$WORK/held" ]; then
+    script_with_host_checks 'wait contains="x.dwg" timeout=30000' \
+      "screenshot $frame $(shot locked-datains.png)" 'double-click text="x.dwg" at=40,-40'
+    devhost --script "$(winpath "$WORK/script.txt")" --eval "$call"
+    expect_host_usable "a datains.ini held by another program"
+    expect_line "a datains.ini held by another program: the pick gives no parameters" \
+      "=> (\"$(lisppath "$doors")\\\\x.dwg\" (\"\" \"\" \"\"))"
+  else
+    fail "the helper holds datains.ini open"; cat "$WORK/holder.out"
+  fi
+  touch "$WORK/release"
+  wait "$holder"
+  if cmp -s "$doors/datains.ini" "$WORK/datains.saved"; then pass "the held datains.ini is left byte for byte"
+  else fail "the held datains.ini is left byte for byte"; fi
+else
+  echo "note: $helper is not built; the held-file check is skipped"
+fi
+
 finish
