@@ -6,6 +6,10 @@
 
 #include <gtest/gtest.h>
 
+#if defined(__SANITIZE_ADDRESS__)
+#include <sanitizer/lsan_interface.h>
+#endif
+
 #include <filesystem>
 #include <cstdint>
 #include <fstream>
@@ -293,6 +297,10 @@ struct HostOperation {
 const HostOperation kHostOperations[] = {ORVEX_HOST_OPERATIONS(ORVEX_HOST_REMOVER)};
 #undef ORVEX_HOST_REMOVER
 
+void PrintTo(const HostOperation& operation, std::ostream* out) {
+    *out << operation.name;
+}
+
 class HostLackingOneOperation : public ::testing::TestWithParam<HostOperation> {};
 
 int CountContaining(const std::vector<std::string>& events, const std::string& part) {
@@ -332,6 +340,13 @@ TEST_P(HostLackingOneOperation, TheLibraryDegradesAndSaysItOnce) {
     SetPickerPlatform(&platform);
     void* appId = reinterpret_cast<void*>(std::uintptr_t{42});
 
+#if defined(__SANITIZE_ADDRESS__)
+    // Without the host's release operation the library cannot give the host's nodes back: they stay the
+    // host's (this fake host does not collect them), which is not the library's leak.
+    std::unique_ptr<__lsan::ScopedDisabler> hostKeepsItsNodes;
+    if (std::string(operation.name) == "acutRelRb")
+        hostKeepsItsNodes = std::make_unique<__lsan::ScopedDisabler>();
+#endif
     EXPECT_NO_THROW({
         EXPECT_EQ(DispatchEntryMessage(AcRx::kInitAppMsg, appId), AcRx::kRetOK);
         EXPECT_EQ(DispatchEntryMessage(AcRx::kLoadDwgMsg, appId), AcRx::kRetOK);
