@@ -157,6 +157,7 @@ const CommandName kCommands[] = {
     {L"clipboard-put", ScriptCommand::Kind::ClipboardPut, false, false},
     {L"clipboard-files", ScriptCommand::Kind::ClipboardFiles, false, false},
     {L"post", ScriptCommand::Kind::Post, true, true},
+    {L"call", ScriptCommand::Kind::Call, false, false},
 };
 
 bool TakesTreePath(ScriptCommand::Kind kind) {
@@ -342,6 +343,13 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
         command.message = static_cast<unsigned>(message);
         return true;
     }
+    case ScriptCommand::Kind::Call:
+        if (positional.size() != 1) {
+            error = L"call takes one LISP call in quotes, such as \"(Orvex 1 2 \\\"\\\" \\\"\\\" \\\"\\\")\"";
+            return false;
+        }
+        command.text = positional[0];
+        return true;
     case ScriptCommand::Kind::Echo:
         for (std::size_t i = 0; i < positional.size(); ++i)
             command.text += (i ? L" " : L"") + positional[i];

@@ -60,7 +60,8 @@ struct ScriptCommand {
         TreeCount,
         ClipboardPut,
         ClipboardFiles,
-        Post
+        Post,
+        Call
     };
     int line = 0;
     Kind kind = Kind::Echo;

@@ -16,6 +16,7 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstring>
+#include <memory>
 #include <string>
 
 namespace devhost {
@@ -831,6 +832,21 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
     case Kind::Exists:
         Fact(L"exists " + YesNo(!FindWindows(command.window).empty()));
         break;
+    case Kind::Call: {
+        // The host's user-interface thread makes the call when its loop (inside a call: the library's)
+        // dispatches the message to the host's frame.
+        HWND frame = nullptr;
+        for (HWND hwnd : ProcessWindows())
+            if (ClassOf(hwnd) == L"DevhostFrame")
+                frame = hwnd;
+        auto expression = std::make_unique<std::wstring>(command.text);
+        if (!frame || !PostMessageW(frame, WM_DEVHOST_CALL, 0, reinterpret_cast<LPARAM>(expression.get())))
+            throw ScriptError{L"the host's frame cannot take the call"};
+        expression.release(); // the frame's now
+        Fact(L"call posted");
+        Sleep(kSettleMs);
+        break;
+    }
     case Kind::Post: {
         // From this thread, as another program would: a posted message carries no sender.
         WaitForWindow(command);

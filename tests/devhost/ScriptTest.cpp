@@ -189,3 +189,12 @@ TEST(Script, PostNamesAWindowAMessageAndItsParameters) {
     EXPECT_EQ(Error(L"post class=X 1 2 3 4\n"), usage);
     EXPECT_EQ(Error(L"post 32768 1\n"), L"line 1: post needs a window, such as class=NAME or id=N");
 }
+
+TEST(Script, CallTakesOneLispCall) {
+    const auto commands = Read(L"call \"(Orvex 1 2 \\\"\\\" \\\"\\\" \\\"\\\")\"\n");
+    ASSERT_EQ(commands.size(), 1u);
+    EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::Call);
+    EXPECT_EQ(commands[0].text, L"(Orvex 1 2 \"\" \"\" \"\")");
+    EXPECT_NE(Error(L"call\n").find(L"call takes one LISP call"), std::wstring::npos);
+    EXPECT_NE(Error(L"call (a) (b)\n").find(L"call takes one LISP call"), std::wstring::npos);
+}
