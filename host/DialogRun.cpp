@@ -62,6 +62,11 @@ bool CDialogRun::OnInitDialog() {
 
 bool CDialogRun::PreTranslateMessage(MSG* pMsg) {
     if (pMsg->message == WM_ORVEX_RESULT && pMsg->hwnd == m_hWnd) {
+        // WM_APP is every program's first private message: one posted here by another program, with
+        // meanings of its own, must not end the call. Only the explorer's two results, as PostAppResult
+        // posts them (lParam 0), count; anything else is dropped.
+        if ((pMsg->wParam != kAppAccept && pMsg->wParam != kAppCancel) || pMsg->lParam != 0)
+            return true;
         if (pMsg->wParam == kAppAccept) {
             const std::string drawing = ChosenDrawing();
             if (drawing.empty()) {
@@ -70,7 +75,8 @@ bool CDialogRun::PreTranslateMessage(MSG* pMsg) {
             }
             if (!IsExistingFile(drawing)) {
                 // Deleted or moved while the window was open: say so and let the user choose again.
-                const std::string text = "The drawing\n" + drawing + "\nno longer exists. Choose another one.";
+                const std::string text =
+                    "The drawing\n" + drawing + "\nno longer exists. Choose another one.";
                 HWND owner = ::GetActiveWindow();
                 ::MessageBoxA(owner ? owner : m_hWnd, text.c_str(), "Orvex1", MB_OK | MB_ICONWARNING);
                 return true;
