@@ -71,6 +71,9 @@ run "$nocall"
 expect_true "without a start path the last folder is shown again (got $(counts) $(titles))" \
   [ "$(counts) $(titles)" == "3 b" ]
 expect_true "and selected in the tree (got $(selected))" [ "$(selected)" == "b" ]
+expect_true "the folder opened is shown open, its sub-folder listed, once its drawings are up" \
+  has "$OUT" ' tree-item [0-9]* b expanded selected\( highlighted\)\?$'
+expect_true "  c among them" has "$OUT" ' tree-item [0-9]* c$'
 
 # 3. A click on a folder's button closes and opens it, a click on its label selects it.
 a_path=${shellpath%\\*}
