@@ -35,7 +35,7 @@ bool IsMarkedFolder(DWORD fileAttributes) {
 // The path of an item the shell draws with the plain folder icon, empty for any other: a folder below a
 // drive's root, reached through a file-system folder (not an item of the Desktop or of My Computer, which
 // have icons of their own), and not marked. Asking the shell about a folder itself makes it look for a
-// desktop.ini there, and Wine finds a name by reading the whole folder: a second for a folder of 100,000
+// desktop.ini there, and Wine finds a name by reading the whole folder: half a second for a folder of 100,000
 // drawings, paid on the tree's first paint.
 std::string PlainFolderPath(LPCITEMIDLIST absoluteId, SFGAOF attributes) {
     std::string path;
