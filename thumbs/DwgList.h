@@ -117,4 +117,17 @@ int FindByPrefixIndex(const std::string& text);
 // buffers is refused before it is used, and files whose full path is too long are left out; problem,
 // when given, receives what the user should be told (empty when all went well).
 int ScanFolderPath(const char* path, const char* needle, std::string* problem = nullptr);
+
+// Whether the drawing folder\name, as the scan listed it, can be handed back as a path that names that
+// one file.
+enum class PickedName {
+    Exact,        // one file of the folder is listed under this name, and its name is the path's
+    Missing,      // no file of the folder is listed under it (deleted, moved, or never a file)
+    NotInCodePage, // a file listed under it has a name the system's code page cannot hold: the path
+                   // would name no file, or another one whose name looks alike
+    Ambiguous,    // several files are listed under it (names that differ only in case)
+};
+// Reads the folder's names as the file system holds them (wide) and looks for those the scan turns
+// into name. Costs one listing of the folder: for a pick, not for every file.
+PickedName CheckPickedName(const std::string& folder, const std::string& name);
 #endif
