@@ -33,8 +33,8 @@ std::string PickRefusal(const std::string& drawing) {
     case PickedName::NotInCodePage:
         // Its narrow name is a best fit ('l' for a Polish l with stroke) or question marks: the path
         // would name another file or none.
-        return head + "cannot be given back: its name holds letters the system's code page cannot hold. "
-                      "Rename it and choose it again.";
+        return head + "cannot be given back: the system's code page cannot hold the letters of its name, or "
+                      "of another file's name shown the same. Rename the file and choose it again.";
     case PickedName::Ambiguous:
         return head + "cannot be given back: another file of the folder has the same name in other "
                       "letter case. Rename one of them and choose again.";

@@ -5,6 +5,9 @@
 # the host takes input again after every call.
 . "$(dirname "$0")/lib.sh"
 
+# checked_devhost ARGS...: one call with the host checks at the end of its script, then those checks.
+checked_devhost() { devhost "$@"; calls=$((${calls:-0} + 1)); expect_host_usable "call $calls (${*: -1})"; }
+
 folder="$WORK/hostiledrawings"
 gen_dwg "$folder" 3 --variant 5
 good=$(ls "$folder" | head -1)
@@ -55,7 +58,7 @@ script_with_host_checks "$ready" 'sleep 1500' 'count class=Edit contains=".dwg"'
   'exists text="pipe.dwg" visible=any' 'exists text="folder.dwg" visible=any' "$(shot drawings-damaged)" \
   'click text="zero.dwg" at=60,-50' 'key end' 'key home' 'key alt+v d' 'sleep 300' 'key alt+v i' 'sleep 300' \
   'key alt+s n' 'sleep 300' "$(shot drawings-damaged-repainted)" 'double-click text="zero.dwg" at=60,-50'
-devhost --script "$(winpath "$WORK/script.txt")" --eval "$call"
+checked_devhost --script "$(winpath "$WORK/script.txt")" --eval "$call"
 [ "$(labels)" == "$count" ] && pass "each of the $count files named .dwg has its cell" ||
   fail "cells: $(labels), files: $count"$'\n'"$OUT"
 [ "$(printf '%s\n' "$OUT" | grep -c '^\[script\] exists no$')" -eq 2 ] &&
@@ -67,7 +70,7 @@ expect_line "an empty file is a file: it is picked" "=> (\"${prefix}zero.dwg\" (
 rm -f "$WORK/lib/Orvex1.ini"
 script_with_host_checks "$ready" 'sleep 1500' 'count class=Edit contains=".dwg"' "$(shot drawings-damaged-library)" \
   'click text="png-bomb.dwg" at=60,-50' 'key end' 'key alt+v d' 'sleep 300' 'key alt+v i' 'sleep 300' 'key escape'
-DEVHOST="$DEVHOST_NOPREVIEW" devhost --script "$(winpath "$WORK/script.txt")" --eval "$call"
+DEVHOST="$DEVHOST_NOPREVIEW" checked_devhost --script "$(winpath "$WORK/script.txt")" --eval "$call"
 [ "$(labels)" == "$count" ] && pass "the library's own drawing shows every cell" || fail "cells: $(labels)"$'\n'"$OUT"
 expect_line "the library's own drawing: Escape gives nil" "=> nil"
 
