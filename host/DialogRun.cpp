@@ -21,15 +21,17 @@ std::string ChosenDrawing() {
     return folder + g_pTessel3Doc->m_strName;
 }
 
-bool IsExistingFile(const std::string& path) {
-    const DWORD attributes = ::GetFileAttributesA(path.c_str());
-    return attributes != INVALID_FILE_ATTRIBUTES && !(attributes & FILE_ATTRIBUTE_DIRECTORY);
-}
-
 // Why the chosen drawing cannot be handed back, or empty when it can.
 std::string PickRefusal(const std::string& drawing) {
+    const std::string& name = g_pTessel3Doc->m_strName;
+    const DWORD attributes = ::GetFileAttributesA(drawing.c_str());
+    // A file listed once under a name without the code page's '?' is the one the user chose: no need
+    // to read the folder again (it may hold a million files).
+    if (attributes != INVALID_FILE_ATTRIBUTES && !(attributes & FILE_ATTRIBUTE_DIRECTORY) &&
+        CountListed(name) == 1 && name.find('?') == std::string::npos)
+        return {};
     const std::string head = "The drawing\n" + drawing + "\n";
-    switch (CheckPickedName(g_pTessel3Doc->m_strPath, g_pTessel3Doc->m_strName)) {
+    switch (CheckPickedName(g_pTessel3Doc->m_strPath, name)) {
     case PickedName::NotInCodePage:
         // Its narrow name is a best fit ('l' for a Polish l with stroke) or question marks: the path
         // would name another file or none.
@@ -42,8 +44,10 @@ std::string PickRefusal(const std::string& drawing) {
     case PickedName::Exact:
         break;
     }
-    if (!IsExistingFile(drawing)) // deleted or moved while the window was open
+    if (attributes == INVALID_FILE_ATTRIBUTES) // deleted or moved while the window was open
         return head + "no longer exists. Choose another one.";
+    if (attributes & FILE_ATTRIBUTE_DIRECTORY) // a folder whose name begins with a dot is listed too
+        return head + "is a folder, not a drawing. Choose another one.";
     return {};
 }
 

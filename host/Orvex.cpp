@@ -127,7 +127,8 @@ int OrvexWith(PickerPlatform& platform) {
     const std::string cancelCaption = cancelText.empty() ? "Cancel" : NarrowAnsi(cancelText);
     // The tree opens along a whole path, and the scan makes its folder the current one: a relative start
     // path is taken against the host's current folder now, before the explorer changes it.
-    const std::string narrowPath = startPath.empty() ? std::string() : platform.WholeStartPath(NarrowAnsi(startPath));
+    const std::string narrowPath =
+        startPath.empty() ? std::string() : platform.WholeStartPath(NarrowAnsi(startPath));
     if (!CopyBounded(g_szAcceptCaption, acceptCaption) || !CopyBounded(g_szCancelCaption, cancelCaption)) {
         RefuseTooLong(L"caption", kCaptionChars, kCaptionChars); // multi-byte code pages can grow a text
         return 0;

@@ -41,8 +41,8 @@ words = [1, 9, 0x0300, 0xFFFF, 0xFFFF, 0, 3, 0, 0, 0xFFFF, 0x7FFF, 0x041B, 190, 
 put('metafile-lies.dwg', container(3, struct.pack(f'<{len(words)}H', *words)))
 PY
 mkfifo "$folder/pipe.dwg"
-mkdir "$folder/folder.dwg"
-names=$(ls "$folder" | grep -vx -e pipe.dwg -e folder.dwg | tr 'A-Z' 'a-z' | sort)
+mkdir "$folder/folder.dwg" "$folder/.dotted.dwg" # the scan lists a folder whose name begins with a dot
+names=$(ls -A "$folder" | grep -vx -e pipe.dwg -e folder.dwg | tr 'A-Z' 'a-z' | sort)
 count=$(printf '%s\n' "$names" | wc -l)
 start="$(lisppath "$folder")\\\\"
 call="(Orvex 1 2 \"$start\" \"Insert\" \"Close\")"
@@ -57,12 +57,16 @@ labels() { printf '%s\n' "$OUT" | sed -n 's/^\[script\] count //p' | head -1; }
 script_with_host_checks "$ready" 'sleep 1500' 'count class=Edit contains=".dwg"' \
   'exists text="pipe.dwg" visible=any' 'exists text="folder.dwg" visible=any' "$(shot drawings-damaged)" \
   'click text="zero.dwg" at=60,-50' 'key end' 'key home' 'key alt+v d' 'sleep 300' 'key alt+v i' 'sleep 300' \
-  'key alt+s n' 'sleep 300' "$(shot drawings-damaged-repainted)" 'double-click text="zero.dwg" at=60,-50'
+  'key alt+s n' 'sleep 300' "$(shot drawings-damaged-repainted)" 'double-click text=".dotted.dwg" at=60,-50' \
+  'wait class=#32770 text="Orvex1" timeout=5000' 'text class=#32770 text="Orvex1" > class=Static contains="folder"' \
+  'key enter' 'gone class=#32770 text="Orvex1" timeout=5000' 'double-click text="zero.dwg" at=60,-50'
 checked_devhost --script "$(winpath "$WORK/script.txt")" --eval "$call"
 [ "$(labels)" == "$count" ] && pass "each of the $count files named .dwg has its cell" ||
   fail "cells: $(labels), files: $count"$'\n'"$OUT"
 [ "$(printf '%s\n' "$OUT" | grep -c '^\[script\] exists no$')" -eq 2 ] &&
   pass "a pipe and a folder named like drawings are not shown" || fail "a pipe or a folder is shown"$'\n'"$OUT"
+expect_true "a folder named like a drawing is never picked: the user is told" \
+  grep -q '^\[script\] text .*\.dotted\.dwg.*is a folder, not a drawing' <(printf '%s\n' "$OUT")
 expect_line "an empty file is a file: it is picked" "=> (\"${prefix}zero.dwg\" (\"\" \"\" \"\"))"
 
 # 2. The same folder drawn by the library itself (a host without the preview operation). No settings file:

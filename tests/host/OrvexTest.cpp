@@ -250,8 +250,9 @@ TEST_F(OrvexTest, StartPathsOf259CharactersAreTakenAnd260Or1000Refused) {
         FiveArguments(L"C:\\" + std::wstring(n - 3, L'x'));
         EXPECT_EQ(OrvexWith(platform), 0) << n;
         EXPECT_TRUE(platform.steps.empty()) << n;
-        EXPECT_NE(host.printed().find("start path is too long (" + std::to_string(n) + " characters; at most 259)"),
-                  std::string::npos);
+        EXPECT_NE(
+            host.printed().find("start path is too long (" + std::to_string(n) + " characters; at most 259)"),
+            std::string::npos);
         EXPECT_EQ(host.liveNodes, 0);
     }
     // A relative path that fits, but not once made whole, is refused before the explorer opens.

@@ -162,7 +162,8 @@ namespace {
 // Creates an empty file by its wide name, as another program on the system may name it.
 bool WriteWide(const TempFolder& folder, const std::wstring& name) {
     const std::wstring dir(folder.Path().wstring());
-    HANDLE h = CreateFileW((dir + L"\\" + name).c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
+    HANDLE h =
+        CreateFileW((dir + L"\\" + name).c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
     if (h == INVALID_HANDLE_VALUE)
         return false;
     DWORD written = 0;
@@ -198,7 +199,7 @@ TEST(PickedName, AListedFileIsExactAndAnUnlistedOneMissing) {
 // A letter the code page lacks comes out of the narrow file search as a look-alike ('l' for the Polish
 // l with stroke) or as '?': the listed name names another file or none, and a pick must say so.
 TEST(PickedName, NamesTheCodePageCannotHoldAreNeverExact) {
-    const std::wstring lookAlike = L"\u0142uk.dwg";    // l with stroke
+    const std::wstring lookAlike = L"\u0142uk.dwg";               // l with stroke
     const std::wstring foreign = L"\u0447\u0435\u0440\u0442.dwg"; // Cyrillic
     if (CodePageHolds(lookAlike) || CodePageHolds(foreign))
         GTEST_SKIP() << "this system's code page (" << GetACP() << ") holds the test's letters";
