@@ -152,6 +152,12 @@ LRESULT FrameWindow::HandleMessage(UINT message, WPARAM wParam, LPARAM lParam) {
         return 0;
     case WM_CLOSE: // the host's frame closes only when devhost ends
         return 0;
+    case WM_DEVHOST_CALL: {
+        std::unique_ptr<std::wstring> expression(reinterpret_cast<std::wstring*>(lParam));
+        if (expression && onCall)
+            onCall(*expression);
+        return 0;
+    }
     default:
         return HostWindow::HandleMessage(message, wParam, lParam);
     }

@@ -4,6 +4,7 @@
 
 #include <windows.h>
 
+#include <functional>
 #include <string>
 
 namespace devhost {
@@ -29,11 +30,19 @@ protected:
     HWND m_hwnd = nullptr;
 };
 
+// Posted to the main frame by the script's `call` command: lParam is a new std::wstring holding the LISP
+// text, which the frame takes over.
+constexpr UINT WM_DEVHOST_CALL = WM_USER + 0x200;
+
 // The main frame. The view windows are its children and go with it.
 class FrameWindow final : public HostWindow {
 public:
     bool Create();
     void Destroy();
+
+    // Runs a call the script asked for (WM_DEVHOST_CALL), on the user-interface thread, whatever loop
+    // dispatched the message: inside a running call that is the library's own loop.
+    std::function<void(const std::wstring&)> onCall;
 
 protected:
     LRESULT HandleMessage(UINT message, WPARAM wParam, LPARAM lParam) override;

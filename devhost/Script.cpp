@@ -156,6 +156,8 @@ const CommandName kCommands[] = {
     {L"tree-count", ScriptCommand::Kind::TreeCount, true, true},
     {L"clipboard-put", ScriptCommand::Kind::ClipboardPut, false, false},
     {L"clipboard-files", ScriptCommand::Kind::ClipboardFiles, false, false},
+    {L"post", ScriptCommand::Kind::Post, true, true},
+    {L"call", ScriptCommand::Kind::Call, false, false},
 };
 
 bool TakesTreePath(ScriptCommand::Kind kind) {
@@ -329,6 +331,24 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
         }
         command.wide = positional[0] == L"wide";
         command.files.assign(positional.begin() + 1, positional.end());
+        return true;
+    case ScriptCommand::Kind::Post: {
+        int message = 0;
+        if (positional.empty() || positional.size() > 3 || !ParseInt(positional[0], message) ||
+            (positional.size() > 1 && !ParseInt(positional[1], command.wParam, true)) ||
+            (positional.size() > 2 && !ParseInt(positional[2], command.lParam, true))) {
+            error = L"post takes a window, a message number and up to two parameters, in decimal";
+            return false;
+        }
+        command.message = static_cast<unsigned>(message);
+        return true;
+    }
+    case ScriptCommand::Kind::Call:
+        if (positional.size() != 1) {
+            error = L"call takes one LISP call in quotes, such as \"(Orvex 1 2 \\\"\\\" \\\"\\\" \\\"\\\")\"";
+            return false;
+        }
+        command.text = positional[0];
         return true;
     case ScriptCommand::Kind::Echo:
         for (std::size_t i = 0; i < positional.size(); ++i)

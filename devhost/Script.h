@@ -59,24 +59,28 @@ struct ScriptCommand {
         TreeItems,
         TreeCount,
         ClipboardPut,
-        ClipboardFiles
+        ClipboardFiles,
+        Post,
+        Call
     };
     int line = 0;
     Kind kind = Kind::Echo;
     std::vector<WindowStep> window;
-    int timeoutMs = 5000;  // timeout=MS (wait, gone, and the commands that need their window)
-    bool hasPoint = false; // at=X,Y: a point of the window's client area
+    int timeoutMs = 5000;     // timeout=MS (wait, gone, and the commands that need their window)
+    bool hasPoint = false;    // at=X,Y: a point of the window's client area
     bool windowPoint = false; // window-at=X,Y: a point of the whole window (negative: from right/bottom)
     int x = 0, y = 0;
-    unsigned modifiers = 0;     // with=ctrl+shift+alt
-    std::vector<KeyChord> keys; // key
-    std::wstring text;          // type, echo
-    std::wstring file;          // screenshot
-    int ms = 0;                 // sleep
-    std::wstring treePath;      // path=: a tree item's label path, labels joined by backslashes
-    int atLeast = 0;            // tree-count: at-least=N
+    unsigned modifiers = 0;          // with=ctrl+shift+alt
+    std::vector<KeyChord> keys;      // key
+    std::wstring text;               // type, echo
+    std::wstring file;               // screenshot
+    int ms = 0;                      // sleep
+    std::wstring treePath;           // path=: a tree item's label path, labels joined by backslashes
+    int atLeast = 0;                 // tree-count: at-least=N
     bool wide = false;               // clipboard-put wide: the names as UTF-16
     std::vector<std::wstring> files; // clipboard-put: the names of the list
+    unsigned message = 0;            // post: the message number and its two parameters
+    int wParam = 0, lParam = 0;
 };
 
 // Reads a whole script. False with "line N: message" in `error` at the first bad line.

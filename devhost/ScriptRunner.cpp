@@ -16,6 +16,7 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstring>
+#include <memory>
 #include <string>
 
 namespace devhost {
@@ -548,7 +549,8 @@ public:
     // A message-only window of the script thread owns the clipboard while it is open: after
     // EmptyClipboard, SetClipboardData needs an owner.
     OpenedClipboard()
-        : m_owner(CreateWindowExW(0, L"STATIC", L"", 0, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr, nullptr)) {
+        : m_owner(
+              CreateWindowExW(0, L"STATIC", L"", 0, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr, nullptr)) {
         for (int attempt = 0; attempt < 50 && !m_open; ++attempt) {
             m_open = OpenClipboard(m_owner) != FALSE;
             if (!m_open)
@@ -830,6 +832,32 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
     case Kind::Exists:
         Fact(L"exists " + YesNo(!FindWindows(command.window).empty()));
         break;
+    case Kind::Call: {
+        // The host's user-interface thread makes the call when its loop (inside a call: the library's)
+        // dispatches the message to the host's frame.
+        HWND frame = nullptr;
+        for (HWND hwnd : ProcessWindows())
+            if (ClassOf(hwnd) == L"DevhostFrame")
+                frame = hwnd;
+        auto expression = std::make_unique<std::wstring>(command.text);
+        if (!frame || !PostMessageW(frame, WM_DEVHOST_CALL, 0, reinterpret_cast<LPARAM>(expression.get())))
+            throw ScriptError{L"the host's frame cannot take the call"};
+        expression.release(); // the frame's now
+        Fact(L"call posted");
+        Sleep(kSettleMs);
+        break;
+    }
+    case Kind::Post: {
+        // From this thread, as another program would: a posted message carries no sender.
+        WaitForWindow(command);
+        int posted = 0;
+        for (HWND hwnd : FindWindows(command.window))
+            posted += PostMessageW(hwnd, command.message, static_cast<WPARAM>(command.wParam),
+                                   static_cast<LPARAM>(command.lParam)) != FALSE;
+        Fact(L"post " + std::to_wstring(posted));
+        Sleep(kSettleMs);
+        break;
+    }
     case Kind::Tooltip: {
         std::wstring text;
         for (HWND hwnd : ProcessWindows()) {
@@ -856,8 +884,8 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
         const ULONGLONG deadline = GetTickCount64() + static_cast<ULONGLONG>(command.timeoutMs);
         while (CallsPending() > 0) {
             if (GetTickCount64() >= deadline)
-                throw ScriptError{L"the calls have not returned within " + std::to_wstring(command.timeoutMs) +
-                                  L" ms"};
+                throw ScriptError{L"the calls have not returned within " +
+                                  std::to_wstring(command.timeoutMs) + L" ms"};
             Sleep(kPollMs);
         }
         Fact(L"returned");

@@ -16,6 +16,7 @@
 
 #include <cwchar>
 #include <memory>
+#include <set>
 #include <vector>
 
 namespace devhost {
@@ -125,6 +126,7 @@ private:
     void CloseDocuments();
     void Activate(AcApDocument* document);
     void Evaluate(const std::wstring& expression);
+    void EvaluateDuringACall(const std::wstring& expression);
     void StartScript();
     void Send(AcRx::AppMsgCode message);
 
@@ -177,8 +179,8 @@ LRESULT CALLBACK RefuseWindowHook(int code, WPARAM wParam, LPARAM lParam) {
         GetClassNameW(reinterpret_cast<HWND>(wParam), className, 256);
         const std::size_t n = g_refusedClassPrefix.size();
         if (!(create->lpcs->style & WS_CHILD) && std::wcslen(className) >= n &&
-            CompareStringOrdinal(className, static_cast<int>(n), g_refusedClassPrefix.c_str(), static_cast<int>(n),
-                                 TRUE) == CSTR_EQUAL) {
+            CompareStringOrdinal(className, static_cast<int>(n), g_refusedClassPrefix.c_str(),
+                                 static_cast<int>(n), TRUE) == CSTR_EQUAL) {
             WriteLine(L"[host] refused to create a window of class " + std::wstring(className));
             return 1;
         }
@@ -201,10 +203,12 @@ static void CheckHeaps() {
     for (DWORD i = 0; i < count && i < heaps.size(); ++i)
         if (!HeapValidate(heaps[i], 0, nullptr))
             ++damaged;
-    WriteLine(damaged ? L"[host] heap damaged (" + std::to_wstring(damaged) + L" heaps)" : L"[host] heaps valid");
+    WriteLine(damaged ? L"[host] heap damaged (" + std::to_wstring(damaged) + L" heaps)"
+                      : L"[host] heaps valid");
 }
 
 bool Session::CreateWindows() {
+    m_frame.onCall = [this](const std::wstring& expression) { EvaluateDuringACall(expression); };
     if (!RegisterHostClasses() || !m_frame.Create()) {
         WriteError(L"cannot create the host's windows: " + SystemMessage(GetLastError()));
         return false;
@@ -337,21 +341,26 @@ void Session::Evaluate(const std::wstring& expression) {
         host.liveArgNodes.insert(node);
     host.functionCode = found->second;
     host.result = CallResult::Void;
+    const bool nested = host.inCall;
     host.inCall = true;
 
     UINT_PTR timer = 0;
-    if (m_options.afterMs >= 0) {
+    if (nested) {
+        // A call made while another runs (the script's `call`): no timers, marks or script of its own.
+        m_entryPoint(AcRx::kInvkSubrMsg, host.appId);
+    } else if (m_options.afterMs >= 0) {
         g_postValue = m_options.post == Options::Post::Accept ? kAppAccept : kAppCancel;
         g_posted = false;
         timer = SetTimer(nullptr, 0, static_cast<UINT>(m_options.afterMs), &PostTimer);
     }
-    StartScript();
-    TimingCallBegins();
-
-    m_entryPoint(AcRx::kInvkSubrMsg, host.appId);
-    TimingCallEnded();
-    if (m_options.checkHeaps)
-        CheckHeaps();
+    if (!nested) {
+        StartScript();
+        TimingCallBegins();
+        m_entryPoint(AcRx::kInvkSubrMsg, host.appId);
+        TimingCallEnded();
+        if (m_options.checkHeaps)
+            CheckHeaps();
+    }
 
     if (timer)
         KillTimer(nullptr, timer);
@@ -368,7 +377,8 @@ void Session::Evaluate(const std::wstring& expression) {
         WriteLine(L"=> " + PrintChain(host.resultList));
         break;
     }
-    CallReturned(); // after the value is printed: a script that waits for it reads it there
+    if (!nested)
+        CallReturned(); // after the value is printed: a script that waits for it reads it there
     // The argument nodes the library did not release are still the host's.
     for (const resbuf* node : host.liveArgNodes) {
         resbuf* own = const_cast<resbuf*>(node);
@@ -380,7 +390,35 @@ void Session::Evaluate(const std::wstring& expression) {
     FreeChain(host.resultList);
     host.resultList = nullptr;
     host.result = CallResult::Void;
-    PumpMessages();
+    if (!nested)
+        PumpMessages();
+}
+
+// The state of the running call is put aside while the second one runs and comes back after it, as a
+// host's LISP interpreter keeps each call's arguments and value apart.
+void Session::EvaluateDuringACall(const std::wstring& expression) {
+    HostState& host = Host();
+    if (!host.inCall) {
+        Evaluate(expression);
+        return;
+    }
+    const int functionCode = host.functionCode;
+    resbuf* args = host.args;
+    std::set<const resbuf*> liveArgNodes;
+    liveArgNodes.swap(host.liveArgNodes);
+    const CallResult result = host.result;
+    resbuf* resultList = host.resultList;
+    host.args = nullptr;
+    host.resultList = nullptr;
+
+    Evaluate(expression); // sees inCall: a nested call
+
+    host.inCall = true;
+    host.functionCode = functionCode;
+    host.args = args;
+    host.liveArgNodes.swap(liveArgNodes);
+    host.result = result;
+    host.resultList = resultList;
 }
 
 int Session::Run() {

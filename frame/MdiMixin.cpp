@@ -151,7 +151,8 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // node as soon as it got the focus.
     CChildView* tree = frame->GetFolderTree();
     const bool treeOpened = tree && tree->m_hPathTarget;
-    const std::string scanProblem = treeOpened ? std::string() : ShowStartFolder(*frame, *doc, call.startPath);
+    const std::string scanProblem =
+        treeOpened ? std::string() : ShowStartFolder(*frame, *doc, call.startPath);
     if (!treeOpened)
         if (CTessel3View* grid = frame->GetGridView())
             frame->SetActiveView(grid, false);
@@ -175,11 +176,15 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
         tree->FollowSelection(true);
     if (treeOpened) {
         if (HTREEITEM target = tree->m_hPathTarget) {
+            // The tree paints once the grid has drawn its pictures, not when the grid takes the focus on
+            // the way: its first paint asks the shell for every visible folder's icon.
+            tree->SendMessage(WM_SETREDRAW, FALSE);
             tree->SelectItem(nullptr); // the target may be the item the control chose: selected anew
             tree->SelectSetFirstVisible(target);
             tree->SelectDropTarget(target);
             tree->SelectItem(target);
             tree->EnsureVisible(target); // sideways too: a deep folder in a narrow pane
+            tree->SendMessage(WM_SETREDRAW, TRUE);
             tree->SetFocus();
         }
     }
@@ -187,6 +192,9 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // Nothing is chosen yet.
     frame->UpdateWindow();
     frame->EnablePick(false);
+    // The pictures are up: the tree now opens the start folder to show its sub-folders.
+    if (treeOpened)
+        tree->OpenPathTargetLater();
 
     // 8. The drawing of the last run is chosen again: its name starts the search, and the drawing itself is
     // selected (the search may have found another name first). It stays the current drawing, so accept

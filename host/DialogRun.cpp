@@ -88,6 +88,11 @@ bool CDialogRun::OnInitDialog() {
 
 bool CDialogRun::PreTranslateMessage(MSG* pMsg) {
     if (pMsg->message == WM_ORVEX_RESULT && pMsg->hwnd == m_hWnd) {
+        // WM_APP is every program's first private message: one posted here by another program, with
+        // meanings of its own, must not end the call. Only the explorer's two results, as PostAppResult
+        // posts them (lParam 0), count; anything else is dropped.
+        if ((pMsg->wParam != kAppAccept && pMsg->wParam != kAppCancel) || pMsg->lParam != 0)
+            return true;
         if (pMsg->wParam == kAppAccept) {
             const std::string drawing = ChosenDrawing();
             if (drawing.empty()) {

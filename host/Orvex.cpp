@@ -18,6 +18,7 @@ namespace {
 
 const wchar_t kMissingParameters[] = L"\nMissing parametrs\n";
 const wchar_t kNotShort[] = L"\nArgument should be an short";
+const wchar_t kAlreadyOpen[] = L"\nOrvex: the explorer is already open; this call returns nil\n";
 
 void PrintAndAlert(const wchar_t* text) {
     acutPrintf(L"%ls", text);
@@ -79,6 +80,24 @@ int Orvex() {
 }
 
 int OrvexWith(PickerPlatform& platform) {
+    // One explorer at a time: a second call made while one is open (a host that runs LISP from its own
+    // timers or another document while the explorer's loop runs) would share the open one's document,
+    // captions and main window, and destroy them under it. It is refused and returns nil.
+    static bool s_running = false;
+    if (s_running) {
+        if (resbuf* args = acedGetArgs())
+            acutRelRb(args);
+        PrintAndAlert(kAlreadyOpen);
+        acedRetNil();
+        return 1;
+    }
+    struct Running {
+        Running() { s_running = true; }
+        ~Running() { s_running = false; }
+        Running(const Running&) = delete;
+        Running& operator=(const Running&) = delete;
+    } running;
+
     resbuf* args = acedGetArgs();
     if (!args) {
         PrintAndAlert(kMissingParameters);

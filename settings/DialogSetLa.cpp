@@ -2,11 +2,37 @@
 
 #include "hostapi/HostApi.h"
 #include "hostapi/TextConv.h"
+#include "settings/SettingsReport.h"
 #include "res/resource.h"
 
 #include <cstring>
+#include <string>
+
+namespace {
+
+bool RemovalFailureIsHarmless(DWORD error) {
+    return error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND;
+}
+
+std::string RemovalFailureReason(const char* file, DWORD error) {
+    const DWORD attributes = ::GetFileAttributesA(file);
+    if (attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_READONLY))
+        return "it is read-only";
+    if (error == ERROR_SHARING_VIOLATION || error == ERROR_LOCK_VIOLATION)
+        return "it is in use by another program";
+    if (error == ERROR_ACCESS_DENIED)
+        return "access was denied";
+    return "Windows error " + std::to_string(error);
+}
+
+} // namespace
 
 CDialogSetLa::CDialogSetLa(CWnd* parent) : CDialog(IDD_SETLA, parent) {}
+
+void CDialogSetLa::TellNotSaved() {
+    // The dialog stays with what the user entered: Accept again once the file is free, or Cancel.
+    ::acedAlert(WidenAnsi(FolderSettingsNotSavedAlert(m_szPath)).c_str());
+}
 
 bool CDialogSetLa::SetFolder(const std::string& folder) {
     if (!FolderSettingsPathFits(folder))
@@ -64,7 +90,14 @@ void CDialogSetLa::OnOK() {
     const std::string layer = useCurrent ? std::string() : m_LayerName.GetWindowText();
     switch (DecideFolderSettingsAccept(useCurrent, layer, command)) {
     case FolderSettingsAction::DeleteFile:
-        ::DeleteFileA(m_szPath); // a folder without the file is what is asked for
+        // A folder without the file is what is asked for: one that is not there already is fine.
+        if (!::DeleteFileA(m_szPath) && !RemovalFailureIsHarmless(::GetLastError())) {
+            ReportSettingsProblem("\nOrvex: " + std::string(m_szPath) +
+                                  " was not removed: " + RemovalFailureReason(m_szPath, ::GetLastError()) +
+                                  "; the file is left as it was\n");
+            TellNotSaved();
+            return;
+        }
         if (onChanged)
             onChanged();
         EndDialog(IDOK);
@@ -76,7 +109,10 @@ void CDialogSetLa::OnOK() {
     case FolderSettingsAction::Write:
         break;
     }
-    WriteFolderSettings(m_IniFile, m_szPath, layer, command, m_StaticColor.GetColorIndex());
+    if (!WriteFolderSettings(m_IniFile, m_szPath, layer, command, m_StaticColor.GetColorIndex())) {
+        TellNotSaved(); // the store has said why on the command line
+        return;
+    }
     if (onChanged)
         onChanged();
     EndDialog(IDOK);

@@ -5,7 +5,9 @@
 // copying anything), then DoModal. Accept deletes the file (box "Use current layer" checked, no command),
 // keeps the dialog open with an alert (box clear, no layer name), or writes Layer, Lisp command and Color
 // and keeps every other key the file had. After a write or a delete onChanged tells the owner, which
-// shows the folder's layer again.
+// shows the folder's layer again. A write or a delete that fails (a read-only, locked or unreadable
+// file) leaves the file as it was, is said on the command line and in an alert, and keeps the dialog
+// open with what the user entered.
 //
 // Ownership. The controls are dialog items subclassed by the members below; they go with the dialog.
 #pragma once
@@ -40,6 +42,7 @@ protected:
 private:
     void OnUseCurrentLayer();
     bool UseCurrentLayer() const;
+    void TellNotSaved();
 
     CIniFile m_IniFile;
     char m_szPath[kFolderPathBufferSize] = "";

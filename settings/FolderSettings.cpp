@@ -19,6 +19,11 @@ std::string FolderPathTooLongMessage(const std::string& folder) {
            std::to_string(kFolderPathBufferSize - 1) + "); they cannot be edited here:\n" + folder;
 }
 
+std::string FolderSettingsNotSavedAlert(const std::string& filePath) {
+    return "The folder settings were not saved; the command line says why. The file is left as it was:\n" +
+           filePath;
+}
+
 FolderSettingsView ReadFolderSettingsView(CIniFile& store, bool fileRead) {
     FolderSettingsView view;
     if (!fileRead)

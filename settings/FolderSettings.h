@@ -56,6 +56,11 @@ FolderSettingsAction DecideFolderSettingsAccept(bool useCurrentLayer, const std:
 
 constexpr const char kLayerNameEmptyAlert[] = "Name of layer is empty";
 
+// What the person in front of the dialog is told when Accept could not write, or remove, the folder's
+// file (the command line has the reason): the dialog stays open with what they entered, and the file is
+// as it was.
+std::string FolderSettingsNotSavedAlert(const std::string& filePath);
+
 // Writes the three values into the store, in the order Layer, Lisp command, Color (created when
 // missing; every other section and key the store holds is kept), the colour formatted with "%i". An
 // empty layer is written when the box is checked. Returns WriteFile's result.

@@ -26,6 +26,10 @@ WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, s
 // before anything is written.
 bool ReplaceWholeFile(const std::string& fileName, const std::string& bytes, std::string& reason);
 
+// Tests: every replacement from now on finds room for only `bytes` more on the disk, and its write fails
+// there as on a full disk (what fits is written first). A negative value: the disk's own room again.
+void SetDiskRoomForTesting(long long bytes);
+
 // The temporary file of one replacement: beside the file, unique per process and call.
 std::string TemporaryFileBeside(const std::string& fileName, unsigned long processId,
                                 unsigned long callNumber);

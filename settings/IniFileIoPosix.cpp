@@ -13,6 +13,7 @@
 namespace {
 
 std::atomic<unsigned long> g_replacements{0};
+std::atomic<long long> g_diskRoomForTesting{-1};
 
 std::string WriteFailure(int error) {
     if (error == ENOSPC || error == EDQUOT)
@@ -21,9 +22,18 @@ std::string WriteFailure(int error) {
 }
 
 bool WriteAll(int fd, const std::string& bytes, int& error) {
+    const long long room = g_diskRoomForTesting;
     std::size_t done = 0;
     while (done < bytes.size()) {
-        ssize_t n = ::write(fd, bytes.data() + done, bytes.size() - done);
+        std::size_t chunk = bytes.size() - done;
+        if (room >= 0 && static_cast<unsigned long long>(room) < done + chunk) {
+            if (static_cast<unsigned long long>(room) <= done) {
+                error = ENOSPC;
+                return false;
+            }
+            chunk = static_cast<std::size_t>(room) - done;
+        }
+        ssize_t n = ::write(fd, bytes.data() + done, chunk);
         if (n < 0 && errno == EINTR)
             continue;
         if (n <= 0) {
@@ -36,6 +46,10 @@ bool WriteAll(int fd, const std::string& bytes, int& error) {
 }
 
 } // namespace
+
+void SetDiskRoomForTesting(long long bytes) {
+    g_diskRoomForTesting = bytes;
+}
 
 WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, std::string& bytes,
                             unsigned long long* fileSize) {

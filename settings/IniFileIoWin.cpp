@@ -9,6 +9,7 @@
 namespace {
 
 std::atomic<unsigned long> g_replacements{0};
+std::atomic<long long> g_diskRoomForTesting{-1};
 
 // Closes a file handle when it goes.
 class FileHandle {
@@ -52,9 +53,17 @@ std::string Reason(DWORD error) {
 }
 
 bool WriteAll(HANDLE file, const std::string& bytes) {
+    const long long room = g_diskRoomForTesting;
     std::size_t done = 0;
     while (done < bytes.size()) {
-        const std::size_t chunk = bytes.size() - done < 0x10000000 ? bytes.size() - done : 0x10000000;
+        std::size_t chunk = bytes.size() - done < 0x10000000 ? bytes.size() - done : 0x10000000;
+        if (room >= 0 && static_cast<unsigned long long>(room) < done + chunk) {
+            if (static_cast<unsigned long long>(room) <= done) {
+                ::SetLastError(ERROR_DISK_FULL);
+                return false;
+            }
+            chunk = static_cast<std::size_t>(room) - done;
+        }
         DWORD written = 0;
         if (!::WriteFile(file, bytes.data() + done, static_cast<DWORD>(chunk), &written, nullptr))
             return false;
@@ -85,6 +94,10 @@ bool MoveOver(const std::string& temporary, const std::string& fileName) {
 }
 
 } // namespace
+
+void SetDiskRoomForTesting(long long bytes) {
+    g_diskRoomForTesting = bytes;
+}
 
 WholeFileRead ReadWholeFile(const std::string& fileName, std::size_t maxBytes, std::string& bytes,
                             unsigned long long* fileSize) {

@@ -2,7 +2,8 @@
 //
 // The run dialog is the application's main window while the explorer is open: the explorer tells it what
 // the user decided with WM_ORVEX_RESULT, and the dialog's loop ends the call with it. The grid view asks
-// itself to rescan with WM_ORVEX_REFRESH once the message being handled is done.
+// itself to rescan with WM_ORVEX_REFRESH once the message being handled is done; the folder tree opens
+// the folder the explorer starts in with WM_ORVEX_OPEN_TARGET once the first pictures are drawn.
 #pragma once
 
 #include <windows.h>
@@ -11,6 +12,8 @@
 constexpr UINT WM_ORVEX_RESULT = WM_APP;
 // Posted to the grid view: rescan the current folder and rebuild.
 constexpr UINT WM_ORVEX_REFRESH = WM_USER + 0x321;
+// Posted to the folder tree: open the node its walk reached, once the pictures are up.
+constexpr UINT WM_ORVEX_OPEN_TARGET = WM_USER + 0x322;
 
 // What the user decided, as WM_ORVEX_RESULT carries it.
 enum AppResult : WPARAM {

@@ -204,25 +204,61 @@ bool exCDwgThumbnail::Create(const std::string& name, int listIndex, const char*
     ShowWindow(SW_SHOW);
     m_strName = name;
 
-    m_wndToolTip.Create(this, 0);
+    // The tooltip's window is made when the mouse first moves over the picture (CreateToolTip): most
+    // thumbnails are scrolled past without it, and a window less for each makes the grid quicker to build.
     const DwgData& record = RecordAt(listIndex);
-    ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
+    const ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
     m_strToolTip = tip.text;
-    if (m_wndToolTip.m_hWnd) {
-        // A width of so few pixels makes the tooltip break its text at the blanks: name, size, date.
-        m_wndToolTip.SetMaxTipWidth(tip.width);
-        m_wndToolTip.AddTool(this, tip.text);
-        m_wndToolTip.Activate(false);
-    }
+    m_nToolTipWidth = tip.width;
     CreateLabel(name, cell);
     return true;
 }
 
-bool exCDwgThumbnail::CreateLabel(const std::string& name, const RECT& cell) {
+bool exCDwgThumbnail::Rebind(const std::string& name, int listIndex, const RECT& cell) {
+    // A label being renamed keeps its edit until the control is destroyed, as before any scroll.
+    if (!m_hWnd || !m_wndLabel.m_hWnd || m_wndLabel.m_bRenaming)
+        return false;
+    const DwgData& record = RecordAt(listIndex);
+    m_nListIndex = listIndex;
+    m_strName = name;
+    // A tooltip of the drawing before would show its text: made again when the mouse comes.
+    m_wndToolTip.DestroyWindow();
+    m_bToolTipActive = false;
+    const ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
+    m_strToolTip = tip.text;
+    m_nToolTipWidth = tip.width;
+
+    constexpr UINT kMove = SWP_NOZORDER | SWP_NOACTIVATE | SWP_NOCOPYBITS;
+    const CRect rc(cell);
+    ::SetWindowPos(m_hWnd, nullptr, rc.left, rc.top, rc.Width(), rc.Height(), kMove);
+    ::InvalidateRect(m_hWnd, nullptr, TRUE);
+    const CRect label = LabelRect(cell);
+    ::SetWindowPos(m_wndLabel.m_hWnd, nullptr, label.left, label.top, label.Width(), label.Height(), kMove);
+    m_wndLabel.SetWindowText(name); // drops any highlight of the drawing before
+    if (record.IsSelected())
+        HighlightLabel();
+    ::InvalidateRect(m_wndLabel.m_hWnd, nullptr, TRUE);
+    return true;
+}
+
+void exCDwgThumbnail::CreateToolTip() {
+    if (m_wndToolTip.m_hWnd || !m_wndToolTip.Create(this, 0))
+        return;
+    // A width of so few pixels makes the tooltip break its text at the blanks: name, size, date.
+    m_wndToolTip.SetMaxTipWidth(m_nToolTipWidth);
+    m_wndToolTip.AddTool(this, m_strToolTip);
+    m_wndToolTip.Activate(false);
+}
+
+CRect exCDwgThumbnail::LabelRect(const RECT& cell) {
     const int cxEdge = ::GetSystemMetrics(SM_CXEDGE);
     const int cyEdge = ::GetSystemMetrics(SM_CYEDGE);
-    const CRect rc(cell.left + cxEdge, cell.bottom + cyEdge, cell.right - cxEdge,
-                   cell.bottom + CTessel3View::LabelHeight() - cyEdge);
+    return CRect(cell.left + cxEdge, cell.bottom + cyEdge, cell.right - cxEdge,
+                 cell.bottom + CTessel3View::LabelHeight() - cyEdge);
+}
+
+bool exCDwgThumbnail::CreateLabel(const std::string& name, const RECT& cell) {
+    const CRect rc = LabelRect(cell);
     m_wndLabel.m_pOwner = this;
     if (!m_wndLabel.CreateEx(0, "EDIT", "", WS_CHILD | ES_READONLY | ES_NOHIDESEL | ES_AUTOHSCROLL, rc,
                              m_pView, 0))
@@ -344,8 +380,9 @@ bool exCDwgThumbnail::PreTranslateMessage(MSG* pMsg) {
 bool exCDwgThumbnail::TranslateInput(MSG* pMsg) {
     switch (pMsg->message) {
     case WM_MOUSEMOVE:
-        // Created inactive, the tooltip starts to work when the mouse first moves over the picture; from
-        // then on the control's own delays decide when it shows.
+        // Created inactive when the mouse first moves over the picture, the tooltip starts to work then;
+        // from then on the control's own delays decide when it shows.
+        CreateToolTip();
         if (m_wndToolTip.m_hWnd && !m_bToolTipActive) {
             m_wndToolTip.Activate(true);
             m_bToolTipActive = true;

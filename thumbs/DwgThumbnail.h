@@ -53,6 +53,10 @@ public:
 
     bool Create(const std::string& name, int listIndex, const char* windowName, DWORD style, const RECT& cell,
                 CTessel3View* parentView, UINT id);
+    // Shows another drawing in the existing windows, moved to another cell: what destroying the control
+    // and creating it anew would show, at a fraction of the cost. False (nothing changed) when the control
+    // has no window or its label is being renamed.
+    bool Rebind(const std::string& name, int listIndex, const RECT& cell);
     bool DestroyWindow() override;
     bool PreTranslateMessage(MSG* pMsg) override;
     // Drops the label's highlight and the record's selection.
@@ -62,6 +66,7 @@ public:
     int ListIndex() const { return m_nListIndex; }
     const std::string& Name() const { return m_strName; }
     CThumbLabel& Label() { return m_wndLabel; }
+    // The tooltip; its window exists once the mouse has moved over the picture.
     CToolTipCtrl& ToolTip() { return m_wndToolTip; }
     // The tooltip's text as it was built at creation.
     const std::string& ToolTipText() const { return m_strToolTip; }
@@ -74,6 +79,8 @@ protected:
 private:
     friend class CThumbLabel;
     bool CreateLabel(const std::string& name, const RECT& cell);
+    static CRect LabelRect(const RECT& cell);
+    void CreateToolTip();
     // The mouse and key table of PreTranslateMessage; true when the message was consumed.
     bool TranslateInput(MSG* pMsg);
     // Marks this drawing selected and current; clearOthers first drops every other selection.
@@ -92,6 +99,7 @@ private:
     int m_nListIndex = -1;
     CToolTipCtrl m_wndToolTip;
     std::string m_strToolTip;
+    int m_nToolTipWidth = 0;
     bool m_bToolTipActive = false;
 };
 

@@ -391,11 +391,14 @@ void CTessel3View::CreateRow(int row, int rowTop) {
     for (int column = 0; column < m_nColumns; ++column) {
         const grid::Cell cell = grid::CellOf(g, m_nColumns, poolSize, row, column, rowTop);
         exCDwgThumbnail& control = PoolControl(cell.slot);
+        const CRect rect(cell.left, cell.top, cell.right, cell.bottom);
+        // A row scrolled into view takes over the windows of the row that left it.
+        if (cell.index < m_nCount && control.Rebind(DwgList[cell.index].m_strName, cell.index, rect))
+            continue;
         if (control.m_hWnd)
             control.DestroyWindow();
         if (cell.index < m_nCount)
-            control.Create(DwgList[cell.index].m_strName, cell.index, nullptr, WS_CHILD,
-                           CRect(cell.left, cell.top, cell.right, cell.bottom), this, 0);
+            control.Create(DwgList[cell.index].m_strName, cell.index, nullptr, WS_CHILD, rect, this, 0);
     }
     SetFocus();
 }

@@ -17,7 +17,8 @@ constexpr UINT kAnimationPeriod = 125; // milliseconds
 CChildView::CChildView() {
     SetLoadingIcon(nullptr, true);
     SetAnimationPeriod(kAnimationPeriod);
-    m_hHourglassCursor = static_cast<HCURSOR>(::LoadCursorW(AfxGetInstanceHandle(), MAKEINTRESOURCEW(IDC_HOURGLASS)));
+    m_hHourglassCursor =
+        static_cast<HCURSOR>(::LoadCursorW(AfxGetInstanceHandle(), MAKEINTRESOURCEW(IDC_HOURGLASS)));
     SetHourglass(m_hHourglassCursor);
     // The system icons are asked for when an item is first shown, not at insertion: the shell takes
     // milliseconds for each (under Wine about 8 ms for a folder's two icons), which made a folder of
@@ -70,7 +71,8 @@ bool CLeftView::Create(const char* className, const char* windowName, DWORD styl
         doc->m_strShellPath = m_strStartShellPath;
     else if (doc->m_strShellPath.empty() && !doc->m_strPath.empty())
         doc->m_strShellPath = StartShellPathOf(doc->m_strPath + "\\"); // settings that only know the folder
-    m_wndTree.ExpandToLabelPath(doc->m_strShellPath);
+    // The folder itself is opened once the explorer has drawn its pictures (OpenPathTargetLater).
+    m_wndTree.ExpandToLabelPath(doc->m_strShellPath, false);
     return true;
 }
 

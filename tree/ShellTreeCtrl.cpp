@@ -1,6 +1,7 @@
 #include "tree/ShellTreeCtrl.h"
 
 #include "settings/Tessel3Doc.h"
+#include "thumbs/AppMessages.h"
 #include "thumbs/DwgList.h"
 #include "tree/ShellNamespace.h"
 
@@ -14,11 +15,43 @@ namespace {
 constexpr UINT kInsertMask = TVIF_TEXT | TVIF_IMAGE | TVIF_PARAM | TVIF_SELECTEDIMAGE | TVIF_CHILDREN;
 constexpr int kLabelChars = MAX_PATH;
 
+// The number of ids in an item id list.
+int ItemIdCount(LPCITEMIDLIST pidl) {
+    int count = 0;
+    for (auto* p = reinterpret_cast<const BYTE*>(pidl); p && reinterpret_cast<const SHITEMID*>(p)->cb != 0;
+         p += reinterpret_cast<const SHITEMID*>(p)->cb)
+        ++count;
+    return count;
+}
+
+// Whether a folder on a drive may carry an icon of its own: only one marked read-only or system (or a link
+// of the file system) may; the shell draws every other folder with the plain folder icon.
+bool IsMarkedFolder(DWORD fileAttributes) {
+    constexpr DWORD kMarks = FILE_ATTRIBUTE_READONLY | FILE_ATTRIBUTE_SYSTEM | FILE_ATTRIBUTE_REPARSE_POINT;
+    return fileAttributes == INVALID_FILE_ATTRIBUTES || !(fileAttributes & FILE_ATTRIBUTE_DIRECTORY) ||
+           (fileAttributes & kMarks);
+}
+
+// The path of an item the shell draws with the plain folder icon, empty for any other: a folder below a
+// drive's root, reached through a file-system folder (not an item of the Desktop or of My Computer, which
+// have icons of their own), and not marked. Asking the shell about a folder itself makes it look for a
+// desktop.ini there, and Wine finds a name by reading the whole folder: a second for a folder of 100,000
+// drawings, paid on the tree's first paint.
+std::string PlainFolderPath(LPCITEMIDLIST absoluteId, SFGAOF attributes) {
+    std::string path;
+    if (!(attributes & SFGAO_FOLDER) || ItemIdCount(absoluteId) < 3 ||
+        !ShellFileSystemPath(absoluteId, path) || path.size() <= 3 || path[1] != ':' || path[2] != '\\' ||
+        IsMarkedFolder(::GetFileAttributesA(path.c_str())))
+        path.clear();
+    return path;
+}
+
 // The system small icon of an item (open: the opened-folder form).
-int SmallIconOf(LPCITEMIDLIST absoluteId, bool open) {
+int SmallIconOf(LPCSTR pathOrId, bool isId, bool open) {
     SHFILEINFOA info{};
-    const UINT how = SHGFI_PIDL | SHGFI_SYSICONINDEX | SHGFI_SMALLICON | (open ? SHGFI_OPENICON : 0);
-    if (!::SHGetFileInfoA(reinterpret_cast<LPCSTR>(absoluteId), 0, &info, sizeof info, how))
+    const UINT how =
+        SHGFI_SYSICONINDEX | SHGFI_SMALLICON | (open ? SHGFI_OPENICON : 0) | (isId ? SHGFI_PIDL : 0);
+    if (!::SHGetFileInfoA(pathOrId, 0, &info, sizeof info, how))
         return 0;
     return info.iIcon;
 }
@@ -144,14 +177,35 @@ void CShellTreeCtrl::FillDisplayInfo(TVITEMA& item, const CShellNode& node, UINT
             item.state |= INDEXTOOVERLAYMASK((attributes & SFGAO_SHARE) ? 1 : 2);
             item.stateMask |= TVIS_OVERLAYMASK;
         }
+        const std::string plain = PlainFolderPath(node.AbsoluteId(), attributes);
+        const auto id = reinterpret_cast<LPCSTR>(node.AbsoluteId());
         if (mask & TVIF_IMAGE)
-            item.iImage = item.iSelectedImage = SmallIconOf(node.AbsoluteId(), false);
+            item.iImage = item.iSelectedImage =
+                plain.empty() ? SmallIconOf(id, true, false) : PlainFolderIcon(plain, false);
         if ((mask & TVIF_SELECTEDIMAGE) && (attributes & SFGAO_FOLDER))
-            item.iSelectedImage = SmallIconOf(node.AbsoluteId(), true);
+            item.iSelectedImage = plain.empty() ? SmallIconOf(id, true, true) : PlainFolderIcon(plain, true);
     }
 
     if (mask & TVIF_CHILDREN)
         item.cChildren = ShellHasChildren(folder, relative, node.Flags()) ? 1 : 0;
+}
+
+int CShellTreeCtrl::PlainFolderIcon(const std::string& path, bool open) const {
+    int& icon = m_plainIcon[open ? 1 : 0];
+    if (icon >= 0)
+        return icon;
+    // Every plain folder has the icon of the first plain folder on the path, the one nearest the drive's
+    // root: the cheapest to ask about, as such folders hold few entries.
+    std::string folder = path;
+    for (std::size_t slash = path.find('\\', 3); slash != std::string::npos;
+         slash = path.find('\\', slash + 1)) {
+        if (!IsMarkedFolder(::GetFileAttributesA(path.substr(0, slash).c_str()))) {
+            folder = path.substr(0, slash);
+            break;
+        }
+    }
+    icon = SmallIconOf(folder.c_str(), false, open);
+    return icon;
 }
 
 bool CShellTreeCtrl::PopulateNode(HTREEITEM item, LPCITEMIDLIST absoluteId, std::uint32_t flags) {
@@ -227,7 +281,7 @@ std::string CShellTreeCtrl::GetLabelPath(HTREEITEM item) const {
     return path;
 }
 
-void CShellTreeCtrl::ExpandToLabelPath(const std::string& labelPath) {
+void CShellTreeCtrl::ExpandToLabelPath(const std::string& labelPath, bool openTarget) {
     HTREEITEM current = nullptr;
     std::size_t position = 0;
     for (;;) {
@@ -242,11 +296,29 @@ void CShellTreeCtrl::ExpandToLabelPath(const std::string& labelPath) {
             candidate = GetNextSiblingItem(candidate);
         if (!candidate)
             return; // the path target keeps what it had
-        Expand(candidate, TVE_EXPAND);
+        const bool last = position >= labelPath.size() || labelPath[position] == '\\'; // no component follows
+        if (openTarget || !last)
+            Expand(candidate, TVE_EXPAND);
         current = candidate;
     }
     if (current)
         m_hPathTarget = current;
+}
+
+void CShellTreeCtrl::OpenPathTargetLater() {
+    m_hOpenLater = m_hPathTarget;
+    if (m_hOpenLater)
+        PostMessage(WM_ORVEX_OPEN_TARGET);
+}
+
+LRESULT CShellTreeCtrl::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+    if (message != WM_ORVEX_OPEN_TARGET)
+        return CWaitingTreeCtrl::WindowProc(message, wParam, lParam);
+    HTREEITEM item = m_hOpenLater;
+    m_hOpenLater = nullptr;
+    if (item && !m_bClosing)
+        Expand(item, TVE_EXPAND);
+    return 0;
 }
 
 std::string CShellTreeCtrl::FolderPathOf(HTREEITEM item) const {
@@ -316,6 +388,8 @@ bool CShellTreeCtrl::OnNotifyReflect(NMHDR* hdr, LRESULT* result) {
     switch (code) {
     case TVN_DELETEITEMA: {
         const auto* tv = reinterpret_cast<const NMTREEVIEWA*>(hdr);
+        if (tv->itemOld.hItem == m_hOpenLater)
+            m_hOpenLater = nullptr;
         delete reinterpret_cast<CShellNode*>(tv->itemOld.lParam);
         *result = 0;
         return true;

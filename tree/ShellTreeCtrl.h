@@ -53,8 +53,14 @@ public:
     std::string GetLabelPath(HTREEITEM item) const;
     // Expands the nodes named by a label path (case ignored), filling each on the way; the last one
     // becomes the path target. An empty component ends the walk; a name that matches no node stops it
-    // and leaves the path target as it was. Selects nothing.
-    void ExpandToLabelPath(const std::string& labelPath);
+    // and leaves the path target as it was. Selects nothing. With openTarget false the path target itself
+    // is left closed: OpenPathTargetLater opens it.
+    void ExpandToLabelPath(const std::string& labelPath, bool openTarget = true);
+    // Expands the path target once the messages queued now have been handled. The explorer opens with
+    // its start folder closed and has it opened so: filling it means reading the whole folder for its
+    // sub-folders (the better part of a second for 100,000 drawings under Wine), which the first
+    // pictures need not wait for. Nothing happens when the node has gone meanwhile.
+    void OpenPathTargetLater();
     // The file-system path of a node, or empty for a virtual folder and for the Desktop at the top.
     std::string FolderPathOf(HTREEITEM item) const;
     // Scans the item's folder into the drawing list: the document's label path first, then the list
@@ -74,6 +80,7 @@ protected:
     bool PopulateItem(HTREEITEM node) override;
     bool OnNotifyReflect(NMHDR* hdr, LRESULT* result) override;
     void OnDestroy() override;
+    LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
 
     // Tells the owner what a scan of the item found (title, grid, status).
     void ShowScanned(HTREEITEM item, int scanned, const std::string& problem);
@@ -82,13 +89,17 @@ private:
     HTREEITEM InsertNode(HTREEITEM parent, IShellFolder* parentFolder, LPCITEMIDLIST parentId,
                          LPCITEMIDLIST relativeId, std::uint32_t flags);
     void FillDisplayInfo(TVITEMA& item, const CShellNode& node, UINT mask, bool wideText) const;
+    int PlainFolderIcon(const std::string& path, bool open) const;
     bool PopulateNode(HTREEITEM item, LPCITEMIDLIST absoluteId, std::uint32_t flags);
     void OnSelChanged(HTREEITEM item);
     static int CALLBACK CompareNodes(LPARAM a, LPARAM b, LPARAM);
 
     CDesktopFolderRef m_desktop;
     UINT m_nCallbackMask = 0;
+    // The plain folder's icon, closed and open, once the shell has been asked (-1: not yet).
+    mutable int m_plainIcon[2] = {-1, -1};
     CTessel3Doc* m_pDoc = nullptr;
     bool m_bClosing = false; // the window is going: selection changes are no longer folder changes
     bool m_bFollowSelection = true;
+    HTREEITEM m_hOpenLater = nullptr; // the node OpenPathTargetLater will expand; cleared when it goes
 };

@@ -169,3 +169,32 @@ TEST(Script, ClipboardCommands) {
     EXPECT_NE(Error(L"clipboard-put Z:\\a.dwg\n").find(L"ansi or wide"), std::wstring::npos);
     EXPECT_NE(Error(L"clipboard-put\n").find(L"ansi or wide"), std::wstring::npos);
 }
+
+TEST(Script, PostNamesAWindowAMessageAndItsParameters) {
+    const auto commands = Read(L"post class=#32770 visible=any 32768 1 -7\npost class=X 32769\n");
+    ASSERT_EQ(commands.size(), 2u);
+    EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::Post);
+    ASSERT_EQ(commands[0].window.size(), 1u);
+    EXPECT_TRUE(commands[0].window[0].anyVisibility);
+    EXPECT_EQ(commands[0].message, 32768u);
+    EXPECT_EQ(commands[0].wParam, 1);
+    EXPECT_EQ(commands[0].lParam, -7);
+    EXPECT_EQ(commands[1].message, 32769u);
+    EXPECT_EQ(commands[1].wParam, 0);
+    EXPECT_EQ(commands[1].lParam, 0);
+    const std::wstring usage =
+        L"line 1: post takes a window, a message number and up to two parameters, in decimal";
+    EXPECT_EQ(Error(L"post class=X\n"), usage);
+    EXPECT_EQ(Error(L"post class=X 0x8000\n"), usage);
+    EXPECT_EQ(Error(L"post class=X 1 2 3 4\n"), usage);
+    EXPECT_EQ(Error(L"post 32768 1\n"), L"line 1: post needs a window, such as class=NAME or id=N");
+}
+
+TEST(Script, CallTakesOneLispCall) {
+    const auto commands = Read(L"call \"(Orvex 1 2 \\\"\\\" \\\"\\\" \\\"\\\")\"\n");
+    ASSERT_EQ(commands.size(), 1u);
+    EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::Call);
+    EXPECT_EQ(commands[0].text, L"(Orvex 1 2 \"\" \"\" \"\")");
+    EXPECT_NE(Error(L"call\n").find(L"call takes one LISP call"), std::wstring::npos);
+    EXPECT_NE(Error(L"call (a) (b)\n").find(L"call takes one LISP call"), std::wstring::npos);
+}

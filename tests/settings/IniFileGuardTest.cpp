@@ -402,6 +402,26 @@ TEST_F(IniGuardTest, FailedWriteLeavesTheOldFile) {
         << m_reported.Texts()[0];
 }
 
+TEST_F(IniGuardTest, AFullDiskLeavesTheOldFileAndSaysSo) {
+    std::string fileName = m_dir.File("datains.ini");
+    const std::string text = "[Default Parameters]\r\nLayer=DOORS\r\nLisp command=(c:go)\r\nColor=5\r\n\r\n";
+    WriteBytes(fileName, text);
+    CIniFile ini(fileName);
+    ASSERT_TRUE(ini.ReadFile());
+    ini.SetValue("Default Parameters", "Layer", "WALLS");
+    SetDiskRoomForTesting(16);
+    const bool written = ini.WriteFile();
+    SetDiskRoomForTesting(-1);
+    EXPECT_FALSE(written);
+    EXPECT_EQ(ReadBytes(fileName), text);
+    EXPECT_EQ(FilesIn(m_dir.Dir()), std::vector<std::string>{"datains.ini"});
+    EXPECT_EQ(m_reported.Texts(),
+              std::vector<std::string>{"\nOrvex: " + fileName +
+                                       " was not saved: the disk is full; the file is left as it was\n"});
+    EXPECT_TRUE(ini.WriteFile()) << "with room again the save goes through";
+    EXPECT_NE(ReadBytes(fileName).find("Layer=WALLS\r\n"), std::string::npos);
+}
+
 TEST_F(IniGuardTest, ReplacedFileKeepsItsPermissions) {
     std::string fileName = m_dir.File("Orvex1.ini");
     WriteBytes(fileName, "[S]\r\na=1\r\n");

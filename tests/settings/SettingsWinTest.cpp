@@ -2,6 +2,7 @@
 // file, and two processes saving the same file at once. Share-mode locks are only seen between
 // processes, so settings_helper.exe (beside this program) holds the file or does the second save.
 #include "settings/IniFile.h"
+#include "settings/IniFileIo.h"
 #include "settings/Tessel3Doc.h"
 
 #include "ReportedMessages.h"
@@ -165,6 +166,32 @@ TEST_F(SettingsWinTest, ReadOnlyAttributeRefusesTheSave) {
     EXPECT_EQ(m_reported.Texts(), std::vector<std::string>{NotSaved(fileName, "it is read-only")});
     EXPECT_EQ(FilesIn(m_dir.Dir()), std::vector<std::string>{"Orvex1.ini"});
     ::SetFileAttributesA(fileName.c_str(), FILE_ATTRIBUTE_NORMAL);
+}
+
+TEST_F(SettingsWinTest, AFullDiskLeavesTheOldFileWholeAndSaysSo) {
+    // The explorer's settings of a user, with a section of their own, closed on a disk with room for 40
+    // bytes: the temporary file takes what fits, then the write fails.
+    std::string fileName = m_dir.File("Orvex1.ini");
+    const std::string text =
+        "[Mine]\r\nkeep=me\r\n\r\n[View]\r\nSort=2\r\n\r\n[Size]\r\nSplitterSize=250\r\n\r\n";
+    WriteBytes(fileName, text);
+    SetDiskRoomForTesting(40);
+    {
+        CTessel3Doc doc(fileName);
+        EXPECT_EQ(doc.m_nSort, 2);
+        doc.m_nSort = 1;
+    }
+    SetDiskRoomForTesting(-1);
+    EXPECT_EQ(ReadBytes(fileName), text) << "nothing the user had is lost";
+    EXPECT_EQ(FilesIn(m_dir.Dir()), std::vector<std::string>{"Orvex1.ini"}) << "no temporary file is left";
+    EXPECT_EQ(m_reported.Texts(), std::vector<std::string>{NotSaved(fileName, "the disk is full")});
+    // With room again the next close saves.
+    {
+        CTessel3Doc doc(fileName);
+        doc.m_nSort = 1;
+    }
+    EXPECT_NE(ReadBytes(fileName).find("Sort=1\r\n"), std::string::npos);
+    EXPECT_NE(ReadBytes(fileName).find("[Mine]\r\nkeep=me\r\n"), std::string::npos);
 }
 
 TEST_F(SettingsWinTest, TwoProcessesSavingAtOnceLeaveOneWholeFile) {

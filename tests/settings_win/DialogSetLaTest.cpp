@@ -3,8 +3,11 @@
 #include "settings/DialogSetLa.h"
 
 #include "hostapi/HostApi.h"
+#include "hostapi/TextConv.h"
 #include "settings/FolderSettings.h"
 #include "settings/IniFile.h"
+#include "settings/IniFileIo.h"
+#include "tests/settings/ReportedMessages.h"
 #include "tests/support/TempFolder.h"
 
 #include "res/resource.h"
@@ -337,6 +340,166 @@ TEST_F(FolderSettingsDialog, CheckedAndNoCommandDeletesTheFile) {
     EXPECT_FALSE(FileExists(IniPath()));
     EXPECT_EQ(dialog.changes, 1) << "the owner shows the layer again after a delete too";
     EXPECT_TRUE(g_alerts.empty());
+}
+
+// ---- files the dialog cannot write: the user is told, nothing is lost -----------------------------------
+
+// Accept with a command on a folder whose file cannot be written: the file stays byte for byte, the
+// command line says why, the alert tells the person at the dialog, and the dialog stays open with what
+// was entered (then Cancel).
+struct NotSaved {
+    INT_PTR result = 0;
+    bool stillOpen = false;
+    std::string commandAfter;
+    std::vector<std::string> reported;
+};
+
+class FolderSettingsNotSaved : public FolderSettingsDialog {
+protected:
+    NotSaved AcceptACommand(bool clearLayer = false) {
+        ReportedMessages messages;
+        NotSaved seen;
+        TestDialog dialog;
+        seen.result = Run(dialog, [&](TestDialog& d) {
+            if (clearLayer) {
+                if (!d.Checked())
+                    d.Press(IDC_SETLA_USE_CURRENT);
+                d.SetText(IDC_SETLA_COMMAND, "");
+            } else {
+                d.SetText(IDC_SETLA_COMMAND, "(c:mine)");
+            }
+            d.Press(IDOK);
+            seen.stillOpen = d.IsModalRunning() && d.IsWindowVisible();
+            seen.commandAfter = d.Text(IDC_SETLA_COMMAND);
+            d.Press(IDCANCEL);
+        });
+        seen.reported = messages.Texts();
+        EXPECT_EQ(dialog.changes, 0) << "the owner is not told of a change that did not happen";
+        return seen;
+    }
+    void ExpectTold(const NotSaved& seen, const std::string& reason) {
+        EXPECT_EQ(seen.result, IDCANCEL);
+        EXPECT_TRUE(seen.stillOpen) << "the dialog stays open";
+        EXPECT_EQ(g_alerts, std::vector<std::wstring>{WidenAnsi(FolderSettingsNotSavedAlert(IniPath()))});
+        ASSERT_EQ(seen.reported.size(), 1u);
+        EXPECT_NE(seen.reported[0].find("\nOrvex: " + IniPath() + " was not "), std::string::npos)
+            << seen.reported[0];
+        EXPECT_NE(seen.reported[0].find(reason), std::string::npos) << seen.reported[0];
+        EXPECT_NE(seen.reported[0].find("; the file is left as it was\n"), std::string::npos)
+            << seen.reported[0];
+    }
+};
+
+TEST_F(FolderSettingsNotSaved, AReadOnlyFileIsLeftAndTheUserIsTold) {
+    WriteIni("[Default Parameters]\r\nLayer=DOORS\r\nLisp command=(c:go)\r\nColor=5\r\n\r\n");
+    const std::string before = Ini();
+    ASSERT_TRUE(::SetFileAttributesA(IniPath().c_str(), FILE_ATTRIBUTE_READONLY));
+    const NotSaved seen = AcceptACommand();
+    ::SetFileAttributesA(IniPath().c_str(), FILE_ATTRIBUTE_NORMAL);
+    ExpectTold(seen, "it is read-only");
+    EXPECT_EQ(seen.commandAfter, "(c:mine)") << "what was typed is still there";
+    EXPECT_EQ(Ini(), before);
+}
+
+TEST_F(FolderSettingsNotSaved, AReadOnlyFileIsNotRemovedEitherAndTheUserIsTold) {
+    WriteIni("[Default Parameters]\r\nLayer=DOORS\r\nLisp command=(c:go)\r\nColor=5\r\n\r\n");
+    const std::string before = Ini();
+    ASSERT_TRUE(::SetFileAttributesA(IniPath().c_str(), FILE_ATTRIBUTE_READONLY));
+    const NotSaved seen = AcceptACommand(true);
+    ::SetFileAttributesA(IniPath().c_str(), FILE_ATTRIBUTE_NORMAL);
+    ExpectTold(seen, "was not removed: it is read-only");
+    EXPECT_EQ(Ini(), before);
+}
+
+TEST_F(FolderSettingsNotSaved, AFileHeldOpenWithoutSharingIsLeftAndTheUserIsTold) {
+    WriteIni("[Default Parameters]\r\nLayer=DOORS\r\nLisp command=(c:go)\r\nColor=5\r\n\r\n");
+    const std::string before = Ini();
+    // Another program holds it open and shares nothing.
+    HANDLE held = ::CreateFileA(IniPath().c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr, OPEN_EXISTING,
+                                FILE_ATTRIBUTE_NORMAL, nullptr);
+    ASSERT_NE(held, INVALID_HANDLE_VALUE);
+    std::string commandShown = "?";
+    {
+        TestDialog dialog;
+        Run(dialog, [&](TestDialog& d) {
+            commandShown = d.Text(IDC_SETLA_COMMAND);
+            d.Press(IDCANCEL);
+        });
+    }
+    const NotSaved seen = AcceptACommand();
+    ::CloseHandle(held);
+    EXPECT_EQ(commandShown, "") << "an unreadable file opens the dialog on its defaults";
+    ExpectTold(seen, "it could not be read");
+    EXPECT_EQ(Ini(), before);
+}
+
+TEST_F(FolderSettingsNotSaved, AFullDiskLeavesTheFileAndTheUserIsTold) {
+    WriteIni(
+        "[Default Parameters]\r\nLayer=DOORS\r\nLisp command=(c:go)\r\nColor=5\r\n\r\n[Mine]\r\nA=1\r\n");
+    const std::string before = Ini();
+    SetDiskRoomForTesting(20);
+    const NotSaved seen = AcceptACommand();
+    SetDiskRoomForTesting(-1);
+    ExpectTold(seen, "was not saved: the disk is full");
+    EXPECT_EQ(Ini(), before);
+    EXPECT_EQ(FilesIn(m_folder.Dir()), std::vector<std::string>{"datains.ini"})
+        << "no temporary file is left";
+}
+
+TEST_F(FolderSettingsNotSaved, AFileWithALineOf3000CharactersIsLeftAndTheUserIsTold) {
+    WriteIni("[Default Parameters]\r\nLayer=DOORS\r\nLisp command=" + std::string(3000, 'c') +
+             "\r\nColor=5\r\n\r\n[Mine]\r\nA=1\r\n");
+    const std::string before = Ini();
+    const NotSaved seen = AcceptACommand();
+    ExpectTold(seen, "line 3 is longer than 2047 characters");
+    EXPECT_EQ(Ini(), before);
+}
+
+TEST_F(FolderSettingsNotSaved, BinaryGarbageIsLeftAndTheUserIsTold) {
+    std::string garbage = "[Default Parameters]\r\nLayer=DOORS\r\n";
+    for (int i = 0; i < 20000; ++i)
+        garbage += static_cast<char>((i * 7919 + i / 13) & 0xFF);
+    WriteIni(garbage);
+    const NotSaved seen = AcceptACommand();
+    ExpectTold(seen, "was not saved: line ");
+    EXPECT_EQ(Ini(), garbage);
+}
+
+TEST_F(FolderSettingsNotSaved, AFileOf10MiBIsNotReadNorWrittenOverAndTheUserIsTold) {
+    std::string big =
+        "[Default Parameters]\r\nLayer=DOORS\r\nLisp command=(c:go)\r\nColor=5\r\n\r\n[Big]\r\n";
+    while (big.size() < 10u * 1024 * 1024)
+        big += "key" + std::to_string(big.size()) + "=" + std::string(40, 'v') + "\r\n";
+    WriteIni(big);
+    std::string commandShown = "?";
+    {
+        TestDialog dialog;
+        Run(dialog, [&](TestDialog& d) {
+            commandShown = d.Text(IDC_SETLA_COMMAND);
+            d.Press(IDCANCEL);
+        });
+    }
+    g_alerts.clear();
+    const NotSaved seen = AcceptACommand();
+    EXPECT_EQ(commandShown, "") << "a file over 1 MiB is not read: the dialog opens on its defaults";
+    ExpectTold(seen, "was not saved");
+    EXPECT_TRUE(Ini() == big) << "the file is left as it was";
+}
+
+// ---- the stored LISP command: what the caller will run, shown as it is ----------------------------------
+
+TEST_F(FolderSettingsDialog, TheStoredCommandIsShownWhole) {
+    // Whoever can write into a shared folder chooses this text; the user sees it whole before accepting.
+    const std::string command = "(progn (command \"_.ERASE\" \"_ALL\" \"\") (vl-file-delete \"C:\\\\x\") " +
+                                std::string(1800, ' ') + "(princ \"tail\"))";
+    WriteIni("[Default Parameters]\r\nLayer=DOORS\r\nLisp command=" + command + "\r\nColor=5\r\n");
+    std::string shown;
+    TestDialog dialog;
+    Run(dialog, [&](TestDialog& d) {
+        shown = d.Text(IDC_SETLA_COMMAND);
+        d.Press(IDCANCEL);
+    });
+    EXPECT_EQ(shown, command);
 }
 
 TEST_F(FolderSettingsDialog, TheSwatchOpensTheHostsColourDialogAndPaintsTheChoice) {

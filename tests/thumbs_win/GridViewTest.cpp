@@ -4,6 +4,7 @@
 
 #include "res/resource.h"
 #include "thumbs/GridMath.h"
+#include "thumbs/TooltipText.h"
 
 #include <gtest/gtest.h>
 
@@ -148,6 +149,70 @@ TEST(GridScroll, DownArrowThroughThreeThousandDrawingsKeepsTheRing) {
     EXPECT_LE(LiveThumbnails(view.m_hWnd), limit);
     ExpectFirstRowAtTop(view);
     std::printf("%s\n", KeyPressSummary().c_str());
+}
+
+// What every live control shows matches its drawing: name, label, tooltip, highlight, and its cell.
+void ExpectControlsShowTheirDrawings(CTessel3View& view, int step) {
+    const int columns = view.GetColumns();
+    const int pitch = RowPitch(view);
+    int checked = 0;
+    for (int index = 0; index < DwgList.GetSize(); ++index) {
+        exCDwgThumbnail* control = view.ControlOf(index);
+        if (!control)
+            continue;
+        ++checked;
+        const DwgData& record = DwgList[index];
+        EXPECT_EQ(control->Name(), record.m_strName) << "step " << step;
+        EXPECT_EQ(control->Label().GetWindowText(), record.m_strName) << "step " << step;
+        EXPECT_EQ(control->ToolTipText(),
+                  BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite).text);
+        DWORD start = 0, end = 0;
+        control->Label().SendMessage(EM_GETSEL, reinterpret_cast<WPARAM>(&start),
+                                     reinterpret_cast<LPARAM>(&end));
+        EXPECT_EQ(end > start, record.IsSelected()) << record.m_strName << " step " << step;
+        // Its cell: the column of its index, the row's place relative to the first row's.
+        const CRect picture = RectInView(control->m_hWnd, view.m_hWnd);
+        const CRect label = RectInView(control->Label().m_hWnd, view.m_hWnd);
+        exCDwgThumbnail* firstOfItsColumn = view.ControlOf(view.GetFirstRow() * columns + index % columns);
+        if (firstOfItsColumn) {
+            const CRect top = RectInView(firstOfItsColumn->m_hWnd, view.m_hWnd);
+            EXPECT_EQ(picture.left, top.left) << record.m_strName;
+            EXPECT_EQ(picture.top - top.top, (index / columns - view.GetFirstRow()) * pitch)
+                << record.m_strName;
+        }
+        EXPECT_GT(label.top, picture.top) << record.m_strName;
+        EXPECT_LT(label.top - picture.bottom, 4) << record.m_strName;
+        EXPECT_GE(label.left, picture.left) << record.m_strName;
+    }
+    EXPECT_GE(checked, columns * view.GetVisibleRows()) << "step " << step;
+}
+
+TEST(GridScroll, RowsScrolledIntoViewShowTheirOwnDrawingsNamesTooltipsAndSelection) {
+    GridBench bench(1000, 600);
+    FillList(400);
+    CTessel3View& view = bench.view();
+    view.Rebuild();
+    Pump();
+    const int columns = view.GetColumns();
+    // Every seventh drawing is selected: rows that come in show theirs, rows that go take none along.
+    for (int index = 0; index < DwgList.GetSize(); index += 7)
+        DwgList[index].Select();
+    view.Rebuild();
+    Pump();
+    for (int index = 0; index < DwgList.GetSize(); index += 7)
+        DwgList[index].Select();
+    int step = 0;
+    for (; step < view.GetVisibleRows() * 3; ++step) {
+        view.SetFocus();
+        PressKey(VK_DOWN);
+        ExpectControlsShowTheirDrawings(view, step);
+    }
+    for (int up = 0; up < view.GetVisibleRows() + 3; ++up, ++step) {
+        PressKey(VK_UP);
+        ExpectControlsShowTheirDrawings(view, step);
+    }
+    EXPECT_GT(view.GetFirstRow(), 0);
+    EXPECT_LE(LiveThumbnails(view.m_hWnd), columns * (view.GetVisibleRows() + 2));
 }
 
 TEST(GridScroll, EndHomePageDownPageUp) {

@@ -170,6 +170,9 @@ TEST(ThumbnailTooltip, NameSizeAndLocalDateInOneNarrowTip) {
     EXPECT_EQ(control->ToolTipText(), expected);
 
     CToolTipCtrl& tip = control->ToolTip();
+    EXPECT_EQ(tip.m_hWnd, nullptr) << "made when the mouse first comes";
+    ::PostMessageA(control->m_hWnd, WM_MOUSEMOVE, 0, MAKELPARAM(20, 20));
+    Pump();
     ASSERT_NE(tip.m_hWnd, nullptr);
     EXPECT_EQ(tip.GetToolCount(), 1);
     EXPECT_EQ(tip.SendMessage(TTM_GETMAXTIPWIDTH), 19);

@@ -9,6 +9,8 @@
 
 #include <windows.h>
 
+#include <shellapi.h>
+
 #include <string>
 #include <vector>
 
@@ -16,8 +18,8 @@ namespace {
 
 CWinApp theApp("ShellTreeTests");
 
-using treetest::ShellTest;
 using testsupport::TempFolder;
+using treetest::ShellTest;
 
 constexpr DWORD kTreeStyle = WS_CHILD | WS_VISIBLE | TVS_HASBUTTONS | TVS_HASLINES | TVS_LINESATROOT;
 
@@ -29,7 +31,9 @@ void PumpPending() {
     }
 }
 
-bool SameText(const std::string& a, const std::string& b) { return lstrcmpiA(a.c_str(), b.c_str()) == 0; }
+bool SameText(const std::string& a, const std::string& b) {
+    return lstrcmpiA(a.c_str(), b.c_str()) == 0;
+}
 
 // The Desktop's label, the first of every label path.
 std::string ShellDesktopLabel() {
@@ -137,6 +141,37 @@ TEST_F(ShellTree, TheWalkOpensTheFolderOfALabelPathWhateverItsCaseAndMakesItTheP
     EXPECT_EQ(ChildNamed(tree, aNode, "missing"), nullptr);
 }
 
+TEST_F(ShellTree, TheWalkCanLeaveItsTargetClosedForItToBeOpenedOnceQueuedMessagesAreDone) {
+    CountingTree tree;
+    ASSERT_TRUE(tree.Create(kTreeStyle, CRect(0, 0, 600, 700), &parent, 1));
+    tree.PopulateTree(nullptr, 0);
+    tree.ExpandToLabelPath(StartShellPathOf(a + "\\"), false);
+    HTREEITEM target = tree.m_hPathTarget;
+    ASSERT_NE(target, nullptr);
+    EXPECT_TRUE(SameText(tree.FolderPathOf(target), a));
+    EXPECT_FALSE(tree.GetItemState(target, TVIS_EXPANDED) & TVIS_EXPANDED);
+    EXPECT_EQ(tree.GetChildItem(target), nullptr) << "not filled yet";
+    EXPECT_TRUE(tree.GetItemState(tree.GetParentItem(target), TVIS_EXPANDED) & TVIS_EXPANDED);
+
+    tree.OpenPathTargetLater();
+    EXPECT_FALSE(tree.GetItemState(target, TVIS_EXPANDED) & TVIS_EXPANDED) << "opened only from the queue";
+    PumpPending();
+    EXPECT_TRUE(tree.GetItemState(target, TVIS_EXPANDED) & TVIS_EXPANDED);
+    EXPECT_NE(ChildNamed(tree, target, "b"), nullptr);
+    EXPECT_NE(ChildNamed(tree, target, "side"), nullptr);
+
+    // A target deleted before the queued message comes is left alone.
+    CountingTree other;
+    ASSERT_TRUE(other.Create(kTreeStyle, CRect(0, 0, 600, 700), &parent, 2));
+    other.PopulateTree(nullptr, 0);
+    other.ExpandToLabelPath(StartShellPathOf(b + "\\"), false);
+    ASSERT_NE(other.m_hPathTarget, nullptr);
+    other.OpenPathTargetLater();
+    other.DeleteItem(other.GetParentItem(other.m_hPathTarget));
+    PumpPending();
+    EXPECT_TRUE(other.GetCount() > 0);
+}
+
 TEST_F(ShellTree, SubFoldersComeSortedAndAnEmptyOneLosesItsButtonWhenOpened) {
     CountingTree tree;
     OpenAt(tree, a);
@@ -194,6 +229,57 @@ TEST_F(ShellTree, AttributesSuppliedOnDemandEqualThoseComputedAtInsertion) {
     EXPECT_EQ(x, nullptr);
     EXPECT_EQ(y, nullptr);
     EXPECT_GT(onDemand.textRequests, 0);
+}
+
+// The icon the shell gives an item when asked about the item itself.
+int ShellIconOf(const std::string& path, bool open) {
+    const CShellPidl id = treetest::PidlOfPath(path);
+    SHFILEINFOA info{};
+    const UINT how = SHGFI_PIDL | SHGFI_SYSICONINDEX | SHGFI_SMALLICON | (open ? SHGFI_OPENICON : 0);
+    if (!id || !::SHGetFileInfoA(reinterpret_cast<LPCSTR>(id.get()), 0, &info, sizeof info, how))
+        return -1;
+    return info.iIcon;
+}
+
+TEST_F(ShellTree, EveryFolderShowsTheIconsTheShellGivesItMarkedFoldersTheirOwn) {
+    // side is a system folder that names an icon of its own: the shell may draw it with that icon (Windows
+    // does the same for read-only folders; Wine keeps no read-only mark on folders); the plain folders
+    // around it have the plain folder icon.
+    const std::string ini = side + "\\desktop.ini";
+    testsupport::WriteBytes(ini, "[.ShellClassInfo]\r\nIconResource=shell32.dll,3\r\nIconFile=shell32.dll\r\n"
+                                 "IconIndex=3\r\n");
+    ASSERT_TRUE(::SetFileAttributesA(side.c_str(), FILE_ATTRIBUTE_SYSTEM));
+    CountingTree tree;
+    OpenAt(tree, a, CShellTreeCtrl::kCallbackImage | CShellTreeCtrl::kCallbackSelectedImage);
+    ASSERT_NE(tree.m_hPathTarget, nullptr);
+    int compared = 0;
+    for (HTREEITEM item = tree.m_hPathTarget; item; item = tree.GetParentItem(item)) {
+        const std::string path = tree.FolderPathOf(item);
+        if (path.empty())
+            continue; // Desktop, My Computer
+        TVITEMA shown{};
+        shown.mask = TVIF_IMAGE | TVIF_SELECTEDIMAGE;
+        shown.hItem = item;
+        ASSERT_TRUE(tree.GetItem(&shown));
+        EXPECT_EQ(shown.iImage, ShellIconOf(path, false)) << path;
+        EXPECT_EQ(shown.iSelectedImage, ShellIconOf(path, true)) << path;
+        ++compared;
+    }
+    for (const char* name : {"b", "side"}) {
+        HTREEITEM item = ChildNamed(tree, tree.m_hPathTarget, name);
+        ASSERT_NE(item, nullptr) << name;
+        TVITEMA shown{};
+        shown.mask = TVIF_IMAGE | TVIF_SELECTEDIMAGE;
+        shown.hItem = item;
+        ASSERT_TRUE(tree.GetItem(&shown));
+        const std::string path = a + "\\" + name;
+        EXPECT_EQ(shown.iImage, ShellIconOf(path, false)) << path;
+        EXPECT_EQ(shown.iSelectedImage, ShellIconOf(path, true)) << path;
+        ++compared;
+    }
+    EXPECT_GE(compared, 4);
+    ::SetFileAttributesA(side.c_str(), FILE_ATTRIBUTE_NORMAL);
+    ::DeleteFileA(ini.c_str());
 }
 
 TEST_F(ShellTree, IconsOnDemandAreAskedForOnceWhenFirstShown) {
