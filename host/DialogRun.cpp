@@ -5,6 +5,7 @@
 #include "host/Orvex.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
+#include "thumbs/DwgList.h"
 
 #include <string>
 
@@ -20,9 +21,34 @@ std::string ChosenDrawing() {
     return folder + g_pTessel3Doc->m_strName;
 }
 
-bool IsExistingFile(const std::string& path) {
-    const DWORD attributes = ::GetFileAttributesA(path.c_str());
-    return attributes != INVALID_FILE_ATTRIBUTES && !(attributes & FILE_ATTRIBUTE_DIRECTORY);
+// Why the chosen drawing cannot be handed back, or empty when it can.
+std::string PickRefusal(const std::string& drawing) {
+    const std::string& name = g_pTessel3Doc->m_strName;
+    const DWORD attributes = ::GetFileAttributesA(drawing.c_str());
+    // A file listed once under a name without the code page's '?' is the one the user chose: no need
+    // to read the folder again (it may hold a million files).
+    if (attributes != INVALID_FILE_ATTRIBUTES && !(attributes & FILE_ATTRIBUTE_DIRECTORY) &&
+        CountListed(name) == 1 && name.find('?') == std::string::npos)
+        return {};
+    const std::string head = "The drawing\n" + drawing + "\n";
+    switch (CheckPickedName(g_pTessel3Doc->m_strPath, name)) {
+    case PickedName::NotInCodePage:
+        // Its narrow name is a best fit ('l' for a Polish l with stroke) or question marks: the path
+        // would name another file or none.
+        return head + "cannot be given back: the system's code page cannot hold the letters of its name, or "
+                      "of another file's name shown the same. Rename the file and choose it again.";
+    case PickedName::Ambiguous:
+        return head + "cannot be given back: another file of the folder has the same name in other "
+                      "letter case. Rename one of them and choose again.";
+    case PickedName::Missing:
+    case PickedName::Exact:
+        break;
+    }
+    if (attributes == INVALID_FILE_ATTRIBUTES) // deleted or moved while the window was open
+        return head + "no longer exists. Choose another one.";
+    if (attributes & FILE_ATTRIBUTE_DIRECTORY) // a folder whose name begins with a dot is listed too
+        return head + "is a folder, not a drawing. Choose another one.";
+    return {};
 }
 
 // Copies of what the LISP function took from its arguments, for the explorer of this call.
@@ -73,12 +99,11 @@ bool CDialogRun::PreTranslateMessage(MSG* pMsg) {
                 EndDialog(kAppCancel); // accept with nothing chosen: the call returns nil
                 return true;
             }
-            if (!IsExistingFile(drawing)) {
-                // Deleted or moved while the window was open: say so and let the user choose again.
-                const std::string text =
-                    "The drawing\n" + drawing + "\nno longer exists. Choose another one.";
+            // The path must name the file the user chose, or the user is told and chooses again.
+            const std::string refused = PickRefusal(drawing);
+            if (!refused.empty()) {
                 HWND owner = ::GetActiveWindow();
-                ::MessageBoxA(owner ? owner : m_hWnd, text.c_str(), "Orvex1", MB_OK | MB_ICONWARNING);
+                ::MessageBoxA(owner ? owner : m_hWnd, refused.c_str(), "Orvex1", MB_OK | MB_ICONWARNING);
                 return true;
             }
         }

@@ -144,11 +144,16 @@ int OrvexWith(PickerPlatform& platform) {
 
     const std::string acceptCaption = acceptText.empty() ? "Ok" : NarrowAnsi(acceptText);
     const std::string cancelCaption = cancelText.empty() ? "Cancel" : NarrowAnsi(cancelText);
-    const std::string narrowPath = NarrowAnsi(startPath);
+    // The tree opens along a whole path, and the scan makes its folder the current one: a relative start
+    // path is taken against the host's current folder now, before the explorer changes it.
+    const std::string narrowPath =
+        startPath.empty() ? std::string() : platform.WholeStartPath(NarrowAnsi(startPath));
     if (!CopyBounded(g_szAcceptCaption, acceptCaption) || !CopyBounded(g_szCancelCaption, cancelCaption)) {
         RefuseTooLong(L"caption", kCaptionChars, kCaptionChars); // multi-byte code pages can grow a text
         return 0;
     }
+    if (RefuseTooLong(L"start path", narrowPath.size(), kPathChars)) // made whole, it may have grown
+        return 0;
 
     g_szStartShellPath[0] = 0;
     CopyBounded(g_szStartPath, narrowPath.size() < kPathChars ? narrowPath : std::string());

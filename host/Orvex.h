@@ -23,6 +23,8 @@ struct PickerPlatform {
     virtual ~PickerPlatform() = default;
     // The shell's display-name path of a file-system path (folder part only), or "" when it has none.
     virtual std::string StartShellPath(const std::string& fileSystemPath) = 0;
+    // A start path relative to the host's current folder made whole; others are returned as they are.
+    virtual std::string WholeStartPath(const std::string& fileSystemPath) { return fileSystemPath; }
     // Runs the invisible modal dialog that hosts the explorer; 1 = picked, 2 = cancelled.
     virtual int RunDialog() = 0;
     // The explorer document of this run (created while the dialog initialised), or nullptr.

@@ -42,6 +42,21 @@ class WindowsPickerPlatform : public PickerPlatform {
 public:
     std::string StartShellPath(const std::string& path) override { return StartShellPathOf(path); }
 
+    std::string WholeStartPath(const std::string& path) override {
+        if (!::PathIsRelativeA(path.c_str()) &&
+            !(path.size() > 1 && path[1] == ':' && (path.size() == 2 || (path[2] != '\\' && path[2] != '/'))))
+            return path; // "C:\x\", "\\server\share\": whole already ("C:x" is relative to C:'s folder)
+        const DWORD needed = ::GetFullPathNameA(path.c_str(), 0, nullptr, nullptr);
+        if (needed == 0)
+            return path;
+        std::string whole(needed, '\0');
+        const DWORD written = ::GetFullPathNameA(path.c_str(), needed, whole.data(), nullptr);
+        if (written == 0 || written >= needed)
+            return path;
+        whole.resize(written);
+        return whole;
+    }
+
     int RunDialog() override {
         HostInputRestorer restorer;
         CDialogRun dialog;

@@ -118,6 +118,15 @@ bool AnySelected() {
     return false;
 }
 
+int CountListed(const std::string& name) {
+    int listed = 0;
+    const int count = DwgList.GetSize();
+    for (int i = 0; i < count; ++i)
+        if (DwgList[i].m_strName == name)
+            ++listed;
+    return listed;
+}
+
 DwgPrefixSearch FindByPrefix(const std::string& text) {
     DwgPrefixSearch result;
     const int count = DwgList.GetSize();

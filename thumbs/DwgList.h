@@ -97,6 +97,10 @@ void DeselectAllFlags();
 // True when any record is selected; false for an empty list.
 bool AnySelected();
 
+// How many records carry exactly this name: more than one when the folder holds names that differ only
+// in case, or names the code page turned into the same one.
+int CountListed(const std::string& name);
+
 // What a search for a name prefix did.
 struct DwgPrefixSearch {
     bool ran = false; // false: empty text or empty list, nothing was touched
@@ -117,4 +121,17 @@ int FindByPrefixIndex(const std::string& text);
 // buffers is refused before it is used, and files whose full path is too long are left out; problem,
 // when given, receives what the user should be told (empty when all went well).
 int ScanFolderPath(const char* path, const char* needle, std::string* problem = nullptr);
+
+// Whether the drawing folder\name, as the scan listed it, can be handed back as a path that names that
+// one file.
+enum class PickedName {
+    Exact,         // one file of the folder is listed under this name, and its name is the path's
+    Missing,       // no file of the folder is listed under it (deleted, moved, or never a file)
+    NotInCodePage, // a file listed under it has a name the system's code page cannot hold: the path
+                   // would name no file, or another one whose name looks alike
+    Ambiguous,     // several files are listed under it (names that differ only in case)
+};
+// Reads the folder's names as the file system holds them (wide) and looks for those the scan turns
+// into name. Costs one listing of the folder: for a pick, not for every file.
+PickedName CheckPickedName(const std::string& folder, const std::string& name);
 #endif

@@ -1,5 +1,6 @@
 // The folder scan over the runtime library's file search (Windows build only).
 #include "thumbs/DwgList.h"
+#include "thumbs/NameFold.h"
 
 #include <windows.h>
 
@@ -36,7 +37,83 @@ DwgFindEntry EntryOf(const struct _finddata64i32_t& found) {
     return entry;
 }
 
+bool IsReadableEntry(const std::string& folder, const char* name) {
+    std::string path = folder;
+    if (path.back() != '\\' && path.back() != '/')
+        path += '\\';
+    path += name;
+    return ::GetFileAttributesA(path.c_str()) != INVALID_FILE_ATTRIBUTES;
+}
+
+std::wstring Widened(const std::string& text) {
+    const int n = ::MultiByteToWideChar(CP_ACP, 0, text.data(), static_cast<int>(text.size()), nullptr, 0);
+    std::wstring wide(static_cast<std::size_t>(n), L'\0');
+    if (n > 0)
+        ::MultiByteToWideChar(CP_ACP, 0, text.data(), static_cast<int>(text.size()), wide.data(), n);
+    return wide;
+}
+
+// The name as the runtime's narrow file search gives it: the code page's best fit, '?' for the rest.
+std::string Narrowed(const wchar_t* wide) {
+    const int n = ::WideCharToMultiByte(CP_ACP, 0, wide, -1, nullptr, 0, nullptr, nullptr);
+    if (n <= 1)
+        return {};
+    std::string narrow(static_cast<std::size_t>(n), '\0');
+    ::WideCharToMultiByte(CP_ACP, 0, wide, -1, narrow.data(), n, nullptr, nullptr);
+    narrow.resize(static_cast<std::size_t>(n - 1));
+    return narrow;
+}
+
+// Closes a wide file search however the look ends.
+class WideFindHandle {
+public:
+    explicit WideFindHandle(HANDLE handle) : m_handle(handle) {}
+    WideFindHandle(const WideFindHandle&) = delete;
+    WideFindHandle& operator=(const WideFindHandle&) = delete;
+    ~WideFindHandle() {
+        if (m_handle != INVALID_HANDLE_VALUE)
+            ::FindClose(m_handle);
+    }
+    HANDLE get() const { return m_handle; }
+
+private:
+    HANDLE m_handle;
+};
+
 } // namespace
+
+PickedName CheckPickedName(const std::string& folder, const std::string& name) {
+    if (folder.empty() || name.empty())
+        return PickedName::Missing;
+    std::wstring pattern = Widened(folder);
+    if (pattern.back() != L'\\' && pattern.back() != L'/')
+        pattern += L'\\';
+    pattern += L'*';
+    WIN32_FIND_DATAW found;
+    WideFindHandle search(::FindFirstFileW(pattern.c_str(), &found));
+    if (search.get() == INVALID_HANDLE_VALUE)
+        return PickedName::Missing;
+    int listed = 0;
+    bool inexact = false;
+    do {
+        if (found.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY)
+            continue;
+        std::string narrow = Narrowed(found.cFileName);
+        // A name that does not come back from its narrow form is not the file's name.
+        const bool exact = !narrow.empty() && Widened(narrow) == found.cFileName;
+        FoldNameInPlace(narrow);
+        if (narrow != name)
+            continue;
+        ++listed;
+        if (!exact)
+            inexact = true;
+    } while (::FindNextFileW(search.get(), &found));
+    if (inexact)
+        return PickedName::NotInCodePage;
+    if (listed > 1)
+        return PickedName::Ambiguous;
+    return listed == 1 ? PickedName::Exact : PickedName::Missing;
+}
 
 int ScanFolderPath(const char* path, const char* needle, std::string* problem) {
     BeginScan();
@@ -66,6 +143,10 @@ int ScanFolderPath(const char* path, const char* needle, std::string* problem) {
     do {
         DwgFindEntry entry = EntryOf(found);
         if (!AcceptScanEntry(entry, needle))
+            continue;
+        // A pipe or a socket shows as an empty file whose attributes cannot be read (under Wine): it is
+        // no drawing, and opening it for its preview could wait for a writer for good.
+        if (entry.size == 0 && !entry.isDirectory && !IsReadableEntry(folder, found.name))
             continue;
         if (!FullPathFits(folder, entry.name)) {
             ++tooLong; // its preview could not be opened by its name

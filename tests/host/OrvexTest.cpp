@@ -33,6 +33,10 @@ struct FakePlatform : PickerPlatform {
         shellPathAskedFor = path;
         return "Desktop\\Computer\\" + path;
     }
+    std::string currentFolder = "C:\\Host\\";
+    std::string WholeStartPath(const std::string& path) override {
+        return path.find(':') == std::string::npos ? currentFolder + path : path;
+    }
     int RunDialog() override {
         steps.push_back("dialog");
         doc = std::make_unique<CTessel3Doc>(settingsFile.string());
@@ -280,6 +284,39 @@ TEST_F(OrvexTest, OverlongArgumentsAreRefusedWithAMessage) {
     FiveArguments(L"", std::wstring(200, L'o'));
     EXPECT_EQ(OrvexWith(platform), 0);
     EXPECT_NE(host.printed().find("accept caption is too long"), std::string::npos);
+}
+
+TEST_F(OrvexTest, ARelativeStartPathIsTakenAgainstTheHostsCurrentFolder) {
+    FiveArguments(L"Doors\\", L"Insert", L"Close");
+    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_STREQ(g_szStartPath, "C:\\Host\\Doors\\");
+    EXPECT_EQ(platform.shellPathAskedFor, "C:\\Host\\Doors\\");
+}
+
+TEST_F(OrvexTest, StartPathsOf259CharactersAreTakenAnd260Or1000Refused) {
+    const std::wstring whole259 = L"C:\\" + std::wstring(256, L'x');
+    FiveArguments(whole259);
+    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(std::string(g_szStartPath).size(), 259u);
+    for (std::size_t n : {260u, 1000u}) {
+        host.events.clear();
+        platform.steps.clear();
+        FiveArguments(L"C:\\" + std::wstring(n - 3, L'x'));
+        EXPECT_EQ(OrvexWith(platform), 0) << n;
+        EXPECT_TRUE(platform.steps.empty()) << n;
+        EXPECT_NE(
+            host.printed().find("start path is too long (" + std::to_string(n) + " characters; at most 259)"),
+            std::string::npos);
+        EXPECT_EQ(host.liveNodes, 0);
+    }
+    // A relative path that fits, but not once made whole, is refused before the explorer opens.
+    host.events.clear();
+    platform.steps.clear();
+    platform.currentFolder = "C:\\" + std::string(100, 'h') + "\\";
+    FiveArguments(std::wstring(200, L'r') + L"\\");
+    EXPECT_EQ(OrvexWith(platform), 0);
+    EXPECT_TRUE(platform.steps.empty());
+    EXPECT_NE(host.printed().find("start path is too long (305 characters; at most 259)"), std::string::npos);
 }
 
 } // namespace

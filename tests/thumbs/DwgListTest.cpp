@@ -273,6 +273,16 @@ TEST_F(DwgListTest, SelectionFlags) {
     EXPECT_FALSE(DwgList[1].IsSelected());
 }
 
+// Names that differ only in case are listed under one name: a pick must see that it names two files.
+TEST_F(DwgListTest, CountListedSeesNamesThatDifferOnlyInCase) {
+    EXPECT_EQ(CountListed("plan.dwg"), 0);
+    Scan({File("Plan.dwg"), File("plan.DWG"), File("door.dwg")});
+    EXPECT_EQ(CountListed("plan.dwg"), 2);
+    EXPECT_EQ(CountListed("door.dwg"), 1);
+    EXPECT_EQ(CountListed("Plan.dwg"), 0);
+    EXPECT_EQ(CountListed("do"), 0);
+}
+
 void Append(const std::vector<std::string>& names) {
     for (const std::string& n : names)
         AppendScanEntry(File(n));

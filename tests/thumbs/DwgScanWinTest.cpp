@@ -156,3 +156,75 @@ TEST(DwgScanWin, FilesWhoseFullPathIsTooLongAreLeftOutAndCounted) {
 }
 
 } // namespace
+
+namespace {
+
+// Creates an empty file by its wide name, as another program on the system may name it.
+bool WriteWide(const TempFolder& folder, const std::wstring& name) {
+    const std::wstring dir(folder.Path().wstring());
+    HANDLE h =
+        CreateFileW((dir + L"\\" + name).c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
+    if (h == INVALID_HANDLE_VALUE)
+        return false;
+    DWORD written = 0;
+    WriteFile(h, "AC1018", 6, &written, nullptr);
+    CloseHandle(h);
+    return true;
+}
+
+bool CodePageHolds(const std::wstring& name) {
+    BOOL usedDefault = FALSE;
+    char narrow[64];
+    const int n = WideCharToMultiByte(CP_ACP, WC_NO_BEST_FIT_CHARS, name.c_str(), -1, narrow, sizeof narrow,
+                                      nullptr, &usedDefault);
+    return n > 0 && !usedDefault;
+}
+
+} // namespace
+
+TEST(PickedName, AListedFileIsExactAndAnUnlistedOneMissing) {
+    TempFolder folder;
+    folder.Write("Plan-1.DWG", "AC1018");
+    folder.MakeDir("x.dwg");
+    ASSERT_EQ(ScanFolderPath(folder.Dir().c_str(), ".dwg"), 1);
+    EXPECT_EQ(SortedNames(), (std::vector<std::string>{"plan-1.dwg"}));
+    EXPECT_EQ(CheckPickedName(folder.Dir(), "plan-1.dwg"), PickedName::Exact);
+    EXPECT_EQ(CheckPickedName(folder.Dir() + "\\", "plan-1.dwg"), PickedName::Exact);
+    EXPECT_EQ(CheckPickedName(folder.Dir(), "x.dwg"), PickedName::Missing); // a folder is no drawing
+    EXPECT_EQ(CheckPickedName(folder.Dir(), "plan-2.dwg"), PickedName::Missing);
+    EXPECT_EQ(CheckPickedName(folder.Dir() + "\\gone", "plan-1.dwg"), PickedName::Missing);
+    EXPECT_EQ(CheckPickedName("", "plan-1.dwg"), PickedName::Missing);
+}
+
+// A letter the code page lacks comes out of the narrow file search as a look-alike ('l' for the Polish
+// l with stroke) or as '?': the listed name names another file or none, and a pick must say so.
+TEST(PickedName, NamesTheCodePageCannotHoldAreNeverExact) {
+    const std::wstring lookAlike = L"\u0142uk.dwg";               // l with stroke
+    const std::wstring foreign = L"\u0447\u0435\u0440\u0442.dwg"; // Cyrillic
+    if (CodePageHolds(lookAlike) || CodePageHolds(foreign))
+        GTEST_SKIP() << "this system's code page (" << GetACP() << ") holds the test's letters";
+    TempFolder folder;
+    ASSERT_TRUE(WriteWide(folder, lookAlike));
+    ASSERT_TRUE(WriteWide(folder, foreign));
+    ASSERT_EQ(ScanFolderPath(folder.Dir().c_str(), ".dwg"), 1);
+    const std::vector<std::string> names = SortedNames();
+    ASSERT_EQ(names.size(), 2u);
+    for (const std::string& name : names)
+        EXPECT_EQ(CheckPickedName(folder.Dir(), name), PickedName::NotInCodePage) << name;
+
+    // The look-alike's narrow name beside a file that really has it: neither can be told apart.
+    const std::string& narrowLookAlike = names[0].find('?') == std::string::npos ? names[0] : names[1];
+    folder.Write(narrowLookAlike, "AC1018");
+    EXPECT_EQ(CheckPickedName(folder.Dir(), narrowLookAlike), PickedName::NotInCodePage) << narrowLookAlike;
+}
+
+TEST(PickedName, LettersOfTheCodePageOutsideAsciiAreExact) {
+    const std::wstring accented = L"caf\u00e9-\u00c9t\u00e9.dwg";
+    if (!CodePageHolds(accented))
+        GTEST_SKIP() << "this system's code page (" << GetACP() << ") lacks the test's letters";
+    TempFolder folder;
+    ASSERT_TRUE(WriteWide(folder, accented));
+    ASSERT_EQ(ScanFolderPath(folder.Dir().c_str(), ".dwg"), 1);
+    ASSERT_EQ(DwgList.GetSize(), 1);
+    EXPECT_EQ(CheckPickedName(folder.Dir(), DwgList[0].m_strName), PickedName::Exact) << DwgList[0].m_strName;
+}
