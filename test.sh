@@ -29,9 +29,11 @@ fuzz_rc=0; fuzz_n=0; fuzz_bad=0
 if cmake --preset fuzz >/dev/null && cmake --build --preset fuzz --target orvex_fuzz_all; then
   for t in $(cat build/fuzz/fuzz-targets.txt 2>/dev/null); do
     corpus=tests/fuzz/corpus/$(basename "$t")
+    dict=tests/fuzz/dict/$(basename "$t").dict
     work=build/fuzz/corpus/$(basename "$t"); mkdir -p "$work"
     fuzz_n=$((fuzz_n + 1))
-    if "$t" -max_total_time="$FUZZ_SECONDS" -rss_limit_mb=2048 "$work" $( [ -d "$corpus" ] && echo "$corpus" ) \
+    if "$t" -max_total_time="$FUZZ_SECONDS" -rss_limit_mb=2048 $( [ -f "$dict" ] && echo "-dict=$dict" ) \
+        "$work" $( [ -d "$corpus" ] && echo "$corpus" ) \
         >"build/fuzz/$(basename "$t").log" 2>&1; then
       echo "fuzz $(basename "$t"): ok"
     else

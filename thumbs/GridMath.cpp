@@ -23,9 +23,11 @@ int RowsForCount(int count, int columns) {
     return static_cast<int>(std::ceil(static_cast<double>(count) / static_cast<double>(columns)));
 }
 
-int CapTotalHeight(int totalHeight, int rowPitch) {
-    if (totalHeight <= kScrollCap || rowPitch <= 0)
-        return totalHeight;
+int CapTotalHeight(long long totalHeight, int rowPitch) {
+    if (totalHeight <= kScrollCap)
+        return static_cast<int>(totalHeight);
+    if (rowPitch <= 0)
+        return kScrollCap;
     return kScrollCap - kScrollCap % rowPitch;
 }
 
@@ -39,7 +41,10 @@ LayoutNumbers ComputeLayout(const Geometry& g, int count, int columns, int clien
     n.visibleRows = rowPitch > 0 ? clientHeight / rowPitch : 0;
     n.remainder = rowPitch > 0 ? clientHeight % rowPitch : clientHeight;
     n.totalWidth = columns * columnPitch + g.originX - g.gap;
-    n.totalHeight = CapTotalHeight(g.originY + rowPitch * n.rows + n.remainder, rowPitch);
+    // A million drawings in one column of large pictures pass the int range: add up in 64 bits, then cap.
+    n.totalHeight = CapTotalHeight(static_cast<long long>(g.originY) +
+                                       static_cast<long long>(rowPitch) * n.rows + n.remainder,
+                                   rowPitch);
     if (count <= 0) {
         n.visibleRows = 0;
         n.poolRows = 0;
@@ -197,10 +202,9 @@ int RelayoutFirstRow(int oldColumns, int firstRow, int newColumns, int count) {
 
 int RelayoutScrollY(const Geometry& g, int firstRow, int totalHeight) {
     long long y = static_cast<long long>(g.RowPitch()) * firstRow + g.originY;
-    if (totalHeight > 0) {
-        while (y > totalHeight)
-            y -= totalHeight;
-    }
+    // Into (0, totalHeight] by whole turns of the range, in one step: a loop of turns can take seconds.
+    if (totalHeight > 0 && y > totalHeight)
+        y = (y - 1) % totalHeight + 1;
     return static_cast<int>(y);
 }
 
@@ -218,7 +222,8 @@ int PageDownFirstRow(int firstRow, int visibleRows, int rows) {
 }
 
 int EndFirstRow(int rows, int visibleRows) {
-    return std::max(0, rows - visibleRows);
+    // A client lower than one row still shows one, partly: the last row, not the empty space after it.
+    return std::max(0, rows - std::max(1, visibleRows));
 }
 
 int ThumbTrackStep(int trackPos, int scrollY, int rowPitch) {
@@ -264,7 +269,8 @@ LineStep LineUp(ScrollState& s, const Geometry& g) {
 LineStep LineDown(ScrollState& s, const Geometry& g) {
     LineStep step;
     const int rowPitch = g.RowPitch();
-    if (s.firstRow + s.visibleRows >= s.rows)
+    // The last row stays in view, also in a client lower than one row.
+    if (s.firstRow + std::max(1, s.visibleRows) >= s.rows)
         return step;
     if (s.x > 0) {
         s.x = 0;

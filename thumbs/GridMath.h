@@ -41,8 +41,9 @@ struct Geometry {
 int ColumnsForWidth(int clientWidth, int cellWidth, int gap);
 // Rows needed for count drawings, the last one possibly partly filled.
 int RowsForCount(int count, int columns);
-// A total height above the cap becomes the largest multiple of the row pitch within it.
-int CapTotalHeight(int totalHeight, int rowPitch);
+// A total height above the cap becomes the largest multiple of the row pitch within it (the cap itself
+// for a pitch that is not positive). The total may be beyond the int range.
+int CapTotalHeight(long long totalHeight, int rowPitch);
 
 // Everything a layout computes before it creates controls.
 struct LayoutNumbers {
@@ -120,6 +121,7 @@ int RelayoutScrollY(const Geometry& g, int firstRow, int totalHeight);
 // Keyboard jumps.
 int PageUpFirstRow(int firstRow, int visibleRows);
 int PageDownFirstRow(int firstRow, int visibleRows, int rows);
+// The last first row: the last page, or the last row when not one row fits the client.
 int EndFirstRow(int rows, int visibleRows);
 
 // Thumb tracking moves by single rows: -1 up, +1 down, 0 none.

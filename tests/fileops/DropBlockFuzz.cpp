@@ -1,6 +1,9 @@
 // Fuzzes the reader of the clipboard's file list with whole blocks: whatever the bytes, it stays inside the
-// block and what it gives back reads back the same from a block the explorer writes.
+// block and what it gives back reads back the same from a block the explorer writes. The names then go
+// through the double-NUL list the shell's file operation is given (Copy, Paste, Delete of those files),
+// which must hold them whole, in order, with its final NUL inside its block.
 #include "fileops/DropBlock.h"
+#include "fileops/NameList.h"
 
 #include <cstddef>
 #include <cstdint>
@@ -24,6 +27,19 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     std::free(block);
     const auto rebuilt = BuildDropBlock(names);
     if (rebuilt.size() % kDropBlockStep != 0 || ReadDropBlock(rebuilt.data(), rebuilt.size()) != names)
+        std::abort();
+
+    NameList list;
+    for (const auto& name : names)
+        list.Add(name);
+    if (names.empty() ? list.Data() != nullptr : list.Data() == nullptr)
+        std::abort();
+    if (list.Length() != total || list.Names() != names)
+        std::abort();
+    if (list.Data() && (list.Capacity() < list.Length() + 1 || list.Data()[list.Length()] != '\0'))
+        std::abort();
+    list.Clear();
+    if (list.Data() != nullptr || list.Length() != 0 || !list.Names().empty())
         std::abort();
     return 0;
 }

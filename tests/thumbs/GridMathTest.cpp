@@ -83,6 +83,18 @@ TEST(GridMath, TotalHeightIsCapped) {
     EXPECT_EQ(n.totalHeight % 163, 0);
 }
 
+TEST(GridMath, TotalHeightBeyondTheIntRangeIsCapped) {
+    // Two million drawings in one column of 2000-pixel rows: 4 * 10^9 pixels before the cap.
+    Geometry g = DefaultGeometry();
+    g.cellHeight = 1980;
+    g.labelHeight = 20;
+    const LayoutNumbers n = ComputeLayout(g, 2000000, 1, 1000);
+    EXPECT_EQ(n.rows, 2000000);
+    EXPECT_EQ(n.totalHeight, 32768 - 32768 % 2000);
+    EXPECT_EQ(CapTotalHeight(5000000000LL, 2000), 32000);
+    EXPECT_EQ(CapTotalHeight(5000000000LL, 0), 32768);
+}
+
 TEST(GridMath, PoolSlotIsIndexModPoolSize) {
     EXPECT_EQ(PoolSlot(0, 15), 0);
     EXPECT_EQ(PoolSlot(14, 15), 14);
@@ -270,6 +282,14 @@ TEST(GridMath, RelayoutScrollPositionWraps) {
     EXPECT_EQ(RelayoutScrollY(g, 500, 32763), 500 * 163 - 2 * 32763);
 }
 
+TEST(GridMath, RelayoutScrollPositionOfAFarRowIsImmediate) {
+    // 1.6 * 10^11 pixels down a range of 7: as many turns as a loop would have taken, at once.
+    const Geometry g = DefaultGeometry();
+    const long long y = 163LL * 1000000000 + g.originY;
+    EXPECT_EQ(RelayoutScrollY(g, 1000000000, 7), static_cast<int>((y - 1) % 7 + 1));
+    EXPECT_EQ(RelayoutScrollY(g, 1000000000, 163), 163);
+}
+
 TEST(GridMath, PageUpJumpsToTopWithinOnePage) {
     EXPECT_EQ(PageUpFirstRow(15, 10), 0);
     EXPECT_EQ(PageUpFirstRow(20, 10), 10);
@@ -322,6 +342,18 @@ TEST(GridMath, LineDownCreatesNextRowAndStopsAtLastRow) {
     step = LineDown(s, g);
     EXPECT_FALSE(step.moved);
     EXPECT_EQ(s.firstRow, 7);
+}
+
+TEST(GridMath, ClientLowerThanOneRowStopsAtTheLastRow) {
+    const Geometry g = DefaultGeometry();
+    ScrollState s = StateFor(g, 9, 3, 100); // 3 rows, none whole in 100 pixels
+    ASSERT_EQ(s.visibleRows, 0);
+    for (int i = 0; i < 5; ++i)
+        LineDown(s, g);
+    EXPECT_EQ(s.firstRow, 2); // the last row, never the empty space after it
+    EXPECT_FALSE(LineDown(s, g).moved);
+    EXPECT_EQ(EndFirstRow(3, 0), 2);
+    EXPECT_EQ(EndFirstRow(0, 0), 0);
 }
 
 TEST(GridMath, LineUpAtTopDoesNothingAndResetsNothing) {

@@ -1,0 +1,132 @@
+// Fuzzes the argument checks of the `Orvex` LISP function through the fake host: the input is a LISP call
+// as the command line reads it, its arguments become the result-buffer chain the host hands over. Five
+// arguments (two short integers, three strings that fit their buffers) run the explorer; anything else
+// is refused with a printed and alerted message and no run. Either way the arguments are released, the
+// buffers hold only what fits, and a run ends with the document destroyed and the host's view focused.
+#include "devhost/Lisp.h"
+#include "devhost/ResultBuffers.h"
+#include "devhost/Text.h"
+#include "host/Orvex.h"
+#include "hostapi/TextConv.h"
+#include "settings/Tessel3Doc.h"
+#include "tests/host/FakeHost.h"
+
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <cwchar>
+#include <string>
+#include <vector>
+
+namespace {
+
+constexpr char kPickFolder[] = "/nonexistent-orvex-fuzz\\";
+constexpr char kPickName[] = "door-900.dwg";
+
+// Plays the explorer: picks a drawing when the accept caption has an odd length, cancels otherwise.
+struct FuzzPlatform : PickerPlatform {
+    std::vector<std::string> steps;
+    std::string shellPathAskedFor;
+    bool pick = false;
+    CTessel3Doc doc{std::string()}; // no settings file: nothing read, nothing saved
+
+    std::string StartShellPath(const std::string& path) override {
+        shellPathAskedFor = path;
+        steps.push_back("shell");
+        return "Desktop\\" + path;
+    }
+    int RunDialog() override {
+        steps.push_back("dialog");
+        doc.m_strPath = kPickFolder;
+        doc.m_strName = kPickName;
+        return pick ? 1 : 2;
+    }
+    CTessel3Doc* Document() override { return &doc; }
+    void DestroyDocument() override { steps.push_back("destroy"); }
+    void FocusHostView() override { steps.push_back("focus"); }
+};
+
+int CountNodes(const resbuf* rb) {
+    int n = 0;
+    for (; rb; rb = rb->rbnext)
+        ++n;
+    return n;
+}
+
+bool IsString(const resbuf* rb) {
+    return rb && rb->restype == RTSTR && rb->resval.rstring;
+}
+
+bool Contains(const std::vector<std::string>& events, const std::string& prefix) {
+    for (const auto& e : events)
+        if (e.rfind(prefix, 0) == 0)
+            return true;
+    return false;
+}
+
+} // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    const std::wstring text = devhost::FromUtf8(std::string_view(reinterpret_cast<const char*>(data), size));
+    devhost::LispCall call;
+    std::wstring error;
+    if (!devhost::ReadLispCall(text, call, error))
+        return 0;
+
+    FakeHost host;
+    host.args = devhost::BuildArgumentChain(call.args);
+    host.liveNodes = CountNodes(host.args);
+
+    // What the checks should decide, from the chain itself.
+    const resbuf* a[5] = {};
+    const resbuf* rb = host.args;
+    for (int i = 0; i < 5 && rb; ++i, rb = rb->rbnext)
+        a[i] = rb;
+    bool valid = a[0] && a[0]->restype == RTSHORT && a[1] && a[1]->restype == RTSHORT && IsString(a[2]) &&
+                 IsString(a[3]) && IsString(a[4]);
+    std::wstring path, accept, cancel;
+    if (valid) {
+        path = a[2]->resval.rstring;
+        accept = a[3]->resval.rstring;
+        cancel = a[4]->resval.rstring;
+        valid = path.size() < kPathChars && accept.size() < kCaptionChars && cancel.size() < kCaptionChars;
+    }
+
+    FuzzPlatform platform;
+    platform.pick = valid && accept.size() % 2 == 1;
+    const std::string acceptBefore = g_szAcceptCaption;
+    const std::string cancelBefore = g_szCancelCaption;
+    const int rc = OrvexWith(platform);
+
+    if (host.liveNodes != 0) // the arguments and the result list are released
+        std::abort();
+    if (rc != (valid ? 1 : 0))
+        std::abort();
+    if (!valid) {
+        // Refused: said on the command line and in an alert, nothing run, the buffers as they were.
+        if (!platform.steps.empty() || host.result != "unset" || !Contains(host.events, "print:") ||
+            !Contains(host.events, "alert:") || acceptBefore != g_szAcceptCaption ||
+            cancelBefore != g_szCancelCaption)
+            std::abort();
+        return 0;
+    }
+    const std::string expectAccept = accept.empty() ? "Ok" : NarrowAnsi(accept);
+    const std::string expectCancel = cancel.empty() ? "Cancel" : NarrowAnsi(cancel);
+    const std::string narrowPath = NarrowAnsi(path);
+    if (expectAccept != g_szAcceptCaption || expectCancel != g_szCancelCaption || narrowPath != g_szStartPath)
+        std::abort();
+    if (std::strlen(g_szStartShellPath) >= kPathChars)
+        std::abort();
+    // The shell is asked about a start path only, and the run always ends with destroy and focus.
+    const std::vector<std::string> expectSteps =
+        path.empty() ? std::vector<std::string>{"dialog", "destroy", "focus"}
+                     : std::vector<std::string>{"shell", "dialog", "destroy", "focus"};
+    if (platform.steps != expectSteps || (!path.empty() && platform.shellPathAskedFor != narrowPath))
+        std::abort();
+    const std::string expectResult =
+        platform.pick ? std::string("(\"") + kPickFolder + kPickName + "\" (\"\" \"\" \"\"))"
+                      : std::string("nil");
+    if (host.result != expectResult)
+        std::abort();
+    return 0;
+}
