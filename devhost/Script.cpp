@@ -199,6 +199,11 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
                 stepOpen = true;
             }
             WindowStep& step = command.window.back();
+            // An empty class or fragment would be no condition at all, and the step would match any window.
+            if ((key == L"class" || key == L"contains") && value.empty()) {
+                error = key + L"= takes a text: " + token;
+                return false;
+            }
             if (key == L"class") {
                 step.className = value;
             } else if (key == L"id") {

@@ -114,6 +114,9 @@ TEST(Script, Errors) {
     EXPECT_EQ(Error(L"count id=1 extra\n"), L"line 1: unexpected extra");
     EXPECT_EQ(Error(L"wait id=1 timeout=soon\n"), L"line 1: timeout= takes milliseconds: timeout=soon");
     EXPECT_EQ(Error(L"wait id=1 visible=no\n"), L"line 1: visible= takes yes or any: visible=no");
+    // An empty class or fragment would match every window.
+    EXPECT_EQ(Error(L"click class=\n"), L"line 1: class= takes a text: class=");
+    EXPECT_EQ(Error(L"click id=1 > contains=\"\"\n"), L"line 1: contains= takes a text: contains=");
 }
 
 TEST(Script, TreeCommandsNameAnItemByItsLabelPath) {
