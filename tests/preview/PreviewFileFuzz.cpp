@@ -2,6 +2,7 @@
 // read through ReadDwgPreview, which opens the file, seeks to the image section and reads only the parts
 // it needs. Whatever the bytes, the file reader and the reader of the whole file in memory must agree.
 #include "preview/DwgPreview.h"
+#include "tests/support/FuzzScratchFile.h"
 
 #include <cstddef>
 #include <cstdint>
@@ -27,19 +28,8 @@ void WriteBytes(const uint8_t* data, size_t size) {
 } // namespace
 
 extern "C" int LLVMFuzzerInitialize(int*, char***) {
-    // Memory-backed when available: every input is written once and read in pieces.
-    char pattern[] = "/dev/shm/preview_file_fuzz_XXXXXX.dwg";
-    char fallback[] = "/tmp/preview_file_fuzz_XXXXXX.dwg";
-    int fd = ::mkstemps(pattern, 4);
-    if (fd < 0) {
-        fd = ::mkstemps(fallback, 4);
-        std::memcpy(pattern, fallback, sizeof fallback);
-    }
-    if (fd < 0)
-        std::abort();
-    ::close(fd);
-    g_fileName = pattern;
-    std::atexit([] { std::remove(g_fileName.c_str()); });
+    // Memory-backed when available: every input is written and read.
+    g_fileName = testsupport::FuzzScratchFile("preview_file_fuzz", ".dwg");
     return 0;
 }
 

@@ -4,6 +4,7 @@
 // A file the store did not take whole is never written over. Input: a file, then the operations.
 #include "settings/IniFile.h"
 #include "settings/SettingsReport.h"
+#include "tests/support/FuzzScratchFile.h"
 
 #include <fuzzer/FuzzedDataProvider.h>
 
@@ -90,18 +91,8 @@ std::string ValueName(FuzzedDataProvider& in, const CIniFile& ini, const std::st
 } // namespace
 
 extern "C" int LLVMFuzzerInitialize(int*, char***) {
-    char pattern[] = "/dev/shm/ini_edit_fuzz_XXXXXX";
-    char fallback[] = "/tmp/ini_edit_fuzz_XXXXXX";
-    int fd = ::mkstemp(pattern);
-    if (fd < 0) {
-        fd = ::mkstemp(fallback);
-        std::memcpy(pattern, fallback, sizeof fallback);
-    }
-    if (fd < 0)
-        std::abort();
-    ::close(fd);
-    g_fileName = pattern;
-    std::atexit([] { std::remove(g_fileName.c_str()); });
+    // Memory-backed when available: every input is written and read.
+    g_fileName = testsupport::FuzzScratchFile("ini_edit_fuzz");
     SetSettingsReporter([](const char*, bool) {}); // refused saves are expected, not news
     return 0;
 }

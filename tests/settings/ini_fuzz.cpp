@@ -3,6 +3,7 @@
 // not hold whole (a line too long, lines a save would change) must not be written over at all.
 #include "settings/IniFile.h"
 #include "settings/SettingsReport.h"
+#include "tests/support/FuzzScratchFile.h"
 
 #include <cstdint>
 #include <cstdio>
@@ -54,19 +55,8 @@ bool SameStore(const CIniFile& a, const CIniFile& b) {
 } // namespace
 
 extern "C" int LLVMFuzzerInitialize(int*, char***) {
-    // Memory-backed when available: every input is written and read three times.
-    char pattern[] = "/dev/shm/ini_fuzz_XXXXXX";
-    char fallback[] = "/tmp/ini_fuzz_XXXXXX";
-    int fd = ::mkstemp(pattern);
-    if (fd < 0) {
-        fd = ::mkstemp(fallback);
-        std::memcpy(pattern, fallback, sizeof fallback);
-    }
-    if (fd < 0)
-        std::abort();
-    ::close(fd);
-    g_fileName = pattern;
-    std::atexit([] { std::remove(g_fileName.c_str()); });
+    // Memory-backed when available: every input is written and read.
+    g_fileName = testsupport::FuzzScratchFile("ini_fuzz");
     SetSettingsReporter([](const char*, bool) {}); // refused saves are expected, not news
     return 0;
 }
