@@ -94,7 +94,7 @@ script_with_host_checks 'wait text="Cancel" timeout=20000' 'sleep 300' \
   "screenshot contains=\"Explorer\" nth=0 $(winpath "$shots/bad-settings-garbage.png")"
 devhost --after-ms 1500 --post cancel --script "$(winpath "$WORK/script.txt")" --eval '(Orvex 1 2 "" "" "")'
 expect_line "garbage Orvex1.ini: the call works" "=> nil"
-if printf '%s\n' "$OUT" | grep -qE "^Orvex: $(printf '%s' "$ini_win" | sed 's/[\\.]/\\&/g') was not saved: line [0-9]+ .*; the file is left as it was$"; then
+if grep -qE "^Orvex: $(printf '%s' "$ini_win" | sed 's/[\\.]/\\&/g') was not saved: line [0-9]+ .*; the file is left as it was$" <<<"$OUT"; then
   pass "garbage Orvex1.ini: the command line says it was not saved"
 else
   fail "garbage Orvex1.ini: the command line says it was not saved"; printf '%s\n' "$OUT" | grep -v '^\[script\]'

@@ -15,20 +15,20 @@ script() { printf '%s\n' "$@" >"$WORK/script.txt"; }
 counts() { printf '%s\n' "$OUT" | sed -n 's/^\[script\] count //p'; }
 
 # Home, End, Page Down, Page Up, arrows; the labels (one per live thumbnail) are counted after each.
-steps=('wait contains=".dwg" timeout=30000' "click text=\"$first\" at=60,-50" 'count contains=".dwg" visible=any'
+steps=('wait contains=".dwg" timeout=30000' "click text=\"$first\" at=60,-50" 'count class=Edit contains=".dwg" visible=any'
        "exists text=\"$first\"")
-steps+=('key end' 'count contains=".dwg" visible=any' "exists text=\"$last\"" "exists text=\"$first\"")
-steps+=('key home' 'count contains=".dwg" visible=any' "exists text=\"$first\"")
-for _ in 1 2 3 4 5 6; do steps+=('key pagedown' 'count contains=".dwg" visible=any'); done
+steps+=('key end' 'count class=Edit contains=".dwg" visible=any' "exists text=\"$last\"" "exists text=\"$first\"")
+steps+=('key home' 'count class=Edit contains=".dwg" visible=any' "exists text=\"$first\"")
+for _ in 1 2 3 4 5 6; do steps+=('key pagedown' 'count class=Edit contains=".dwg" visible=any'); done
 steps+=("exists text=\"$first\"")
-for _ in 1 2 3 4 5 6 7; do steps+=('key pageup' 'count contains=".dwg" visible=any'); done
+for _ in 1 2 3 4 5 6 7; do steps+=('key pageup' 'count class=Edit contains=".dwg" visible=any'); done
 steps+=("exists text=\"$first\"")
-for _ in $(seq 1 12); do steps+=('key down' 'count contains=".dwg" visible=any'); done
+for _ in $(seq 1 12); do steps+=('key down' 'count class=Edit contains=".dwg" visible=any'); done
 steps+=("exists text=\"$first\"")
-for _ in $(seq 1 12); do steps+=('key up' 'count contains=".dwg" visible=any'); done
+for _ in $(seq 1 12); do steps+=('key up' 'count class=Edit contains=".dwg" visible=any'); done
 steps+=("exists text=\"$first\"")
 # The scroll bar: clicks below its thumb move down row by row.
-for _ in $(seq 1 8); do steps+=("click $grid window-at=-14,-90" 'count contains=".dwg" visible=any'); done
+for _ in $(seq 1 8); do steps+=("click $grid window-at=-14,-90" 'count class=Edit contains=".dwg" visible=any'); done
 steps+=("exists text=\"$first\"" 'key escape')
 script "${steps[@]}"
 devhost --script "$(winpath "$WORK/script.txt")" --eval "$call"

@@ -45,7 +45,7 @@ cp "$WORK/fallback.bmp" "${SCREENSHOT_DIR:-$WORK}/" 2>/dev/null || true
 DEVHOST=$FULL_HOST
 shot "$WORK/host.bmp"
 expect_line "the full host's call ends as usual" "=> nil"
-printf '%s\n' "$OUT" | grep -q "does not provide acdbDisplayPreviewFromDwg" &&
+grep -q "does not provide acdbDisplayPreviewFromDwg" <<<"$OUT" &&
   fail "the full host is said to lack the preview operation" || pass "the full host draws without a notice"
 
 # dark SHOT: sampled pixels (every 4th of a row) darker than 120 in sum. diff A B: sampled pixels that differ.

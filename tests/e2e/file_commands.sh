@@ -36,7 +36,7 @@ call_at() { printf '(Orvex 1 2 "%s\\\\" "Insert" "Close")' "$(lisppath "$1")"; }
 labels() { printf '%s\n' "$OUT" | sed -n 's/^\[script\] count //p' | tr '\n' ' ' | sed 's/ $//'; }
 shot() { printf 'screenshot %s %s' "$frame" "$(winpath "$WORK/$1.png")"; }
 ini_value() { tr -d '\r' <"$WORK/lib/Orvex1.ini" 2>/dev/null | sed -n "s/^$1=//p"; }
-has() { printf '%s\n' "$1" | grep -q -- "$2"; }
+has() { grep -q -- "$2" <<<"$1"; }
 on_disk() { (cd "$1" && ls | tr '\n' ' ' | sed 's/ $//'); }
 
 # 0. Where the tree shows the two folders: the label path of a, from the explorer's own settings.

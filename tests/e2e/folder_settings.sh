@@ -20,7 +20,7 @@ frame='contains="orvexsettings" nth=0' # the explorer's title shows the folder
 call=$(printf '(Orvex 1 2 "%s\\\\" "Insert" "Close")' "$(lisppath "$doors")")
 script() { printf '%s\n' "$@" >"$WORK/script.txt"; }
 run() { devhost --script "$(winpath "$WORK/script.txt")" --eval "$1"; }
-has() { printf '%s\n' "$1" | grep -q -- "$2"; }
+has() { grep -q -- "$2" <<<"$1"; }
 ini_value() { tr -d '\r' <"$WORK/lib/Orvex1.ini" 2>/dev/null | sed -n "s/^$1=//p"; }
 shot() { winpath "$WORK/$1"; }
 

@@ -47,7 +47,7 @@ devhost() {
     calls=$((${calls:-0} + 1))
     expect_host_usable "call $calls (${args[*]: -1})"
     OUT=$(printf '%s\n' "$OUT" | awk '/^\[script\] host-checks$/ {h = 1; next} !(h && /^\[script\] /)')
-    [ "$RC" -eq 4 ] && ! printf '%s\n' "$OUT" | grep -q '^\[script\] error' && RC=0 # a failed host check only
+    [ "$RC" -eq 4 ] && ! grep -q '^\[script\] error' <<<"$OUT" && RC=0 # a failed host check only
   fi
 }
 
@@ -63,7 +63,7 @@ expect_output() {
 
 # expect_line NAME LINE: one line of the output must be LINE exactly.
 expect_line() {
-  if printf '%s\n' "$OUT" | grep -qxF -- "$2"; then pass "$1"; else
+  if grep -qxF -- "$2" <<<"$OUT"; then pass "$1"; else
     fail "$1"; echo "--- expected a line: $2"; echo "--- got (exit $RC)"; printf '%s\n' "$OUT"
     echo "--- stderr"; tail -20 "$WORK/stderr"; fi
 }
@@ -94,9 +94,11 @@ script_with_host_checks() { printf '%s\n' "$@" "${HOST_CHECKS[@]}" >"$WORK/scrip
 # expect_host_usable NAME: the output of a run with HOST_CHECKS shows a host that takes input.
 expect_host_usable() {
   local name=$1
-  if printf '%s\n' "$OUT" | grep -qx '\[script\] enabled yes' &&
-     printf '%s\n' "$OUT" | grep -qE '^\[script\] focus DevhostDrawingView id=' &&
-     printf '%s\n' "$OUT" | grep -qx '\[script\] typed ok'; then
+  # grep reads a here-string: a pipe from printf could die of SIGPIPE once grep -q has its match, and
+  # pipefail would call the check failed.
+  if grep -qx '\[script\] enabled yes' <<<"$OUT" &&
+     grep -qE '^\[script\] focus DevhostDrawingView id=' <<<"$OUT" &&
+     grep -qx '\[script\] typed ok' <<<"$OUT"; then
     pass "$name: the host takes input again"
   else
     fail "$name: the host takes input again"

@@ -212,10 +212,10 @@ run
 messages=$(texts)
 n=$(printf '%s\n' "$messages" | grep -c '^Cannot rename to ')
 [ "$n" -eq 7 ] && pass "each refused rename is explained in a message box" || { fail "rename messages ($n)"; printf '%s\n' "$messages"; }
-printf '%s\n' "$messages" | grep -qF 'Cannot rename to "a*b.dwg": a name cannot contain' &&
-  printf '%s\n' "$messages" | grep -qF "Cannot rename to \"plan.txt\": a drawing's name ends in .dwg." &&
-  printf '%s\n' "$messages" | grep -qF 'Cannot rename to "con.dwg": the name is reserved for a device.' &&
-  printf '%s\n' "$messages" | grep -qF 'a file of that name already exists.' &&
+grep -qF 'Cannot rename to "a*b.dwg": a name cannot contain' <<<"$messages" &&
+  grep -qF "Cannot rename to \"plan.txt\": a drawing's name ends in .dwg." <<<"$messages" &&
+  grep -qF 'Cannot rename to "con.dwg": the name is reserved for a device.' <<<"$messages" &&
+  grep -qF 'a file of that name already exists.' <<<"$messages" &&
   pass "the messages name the rule" || fail "messages: $messages"
 ex=$(printf '%s\n' "$OUT" | sed -n 's/^\[script\] exists //p' | tr '\n' ' ')
 [ "$ex" == "yes yes yes yes yes yes yes " ] && pass "the label shows the old name again after each refusal" ||

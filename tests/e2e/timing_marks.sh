@@ -46,7 +46,8 @@ complete=$(timing | awk '$3 == "preview" { split($4, dv, "/"); if (dv[1] == dv[2
 expect_true "a complete paint is seen: every visible thumbnail has its picture (${complete:-none} thumbnails)" \
   test "${complete:-0}" -gt 0
 named=$(timing | awk '$3 == "preview" { sub(/^[^ ]+ [^ ]+ [^ ]+ [^ ]+ /, ""); print }' | sort -u)
-missing=$(printf '%s\n' "$named" | while read -r n; do ls "$folder" | grep -qixF "$n" || echo "$n"; done)
+listing=$(ls "$folder")
+missing=$(printf '%s\n' "$named" | while read -r n; do grep -qixF -- "$n" <<<"$listing" || echo "$n"; done)
 expect_true "each preview line names a drawing of the folder" test -z "$missing"
 
 # The thumbnail's picture is the flat colour (RGB 0x40 0x80 0xB0); its label and frame are not.

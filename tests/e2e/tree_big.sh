@@ -41,7 +41,7 @@ expect_true "the node holds the $count sub-folders afterwards (tree items $befor
 # The expansion's length, from the key press to the end of its handling (devhost's timing hook).
 expand_ms=$(printf '%s\n' "$OUT" | awk '/^\[timing\] [0-9.]+ key 39$/ {k = $2} /key-handled$/ && k {e = $2 - k; k = 0} END {printf "%d", e}')
 echo "expanding $count sub-folders took ${expand_ms} ms"
-has() { printf '%s\n' "$OUT" | grep -q -- "$1"; }
+has() { grep -q -- "$1" <<<"$OUT"; }
 expect_true "Down selects the first sub-folder, d00001, and the title names it" has '^\[script\] text .*\\d00001$'
 # devhost's drawing view is the one window of the count: no thumbnail.
 expect_true "an empty folder shows an empty grid" has '^\[script\] count 1$'
