@@ -291,10 +291,25 @@ template <class Fn> bool Watch(HMODULE module, const char* name, Fn replacement,
 struct VisibleCount {
     HWND parent = nullptr;
     wchar_t className[128] = {};
-    RECT client{};
     int visible = 0;
     int drawn = 0;
 };
+
+// Whether any part of the window shows: its rectangle cut by the client area of each window it lies in,
+// up to its top-level window (a control can sit on a child window larger than what shows of it).
+bool ShowsOnScreen(HWND window) {
+    RECT shown;
+    GetWindowRect(window, &shown);
+    for (HWND outer = GetParent(window); outer && (GetWindowLongW(window, GWL_STYLE) & WS_CHILD);
+         window = outer, outer = GetParent(outer)) {
+        RECT client;
+        GetClientRect(outer, &client);
+        MapWindowPoints(outer, nullptr, reinterpret_cast<POINT*>(&client), 2);
+        if (!IntersectRect(&shown, &shown, &client))
+            return false;
+    }
+    return true;
+}
 
 BOOL CALLBACK CountSibling(HWND window, LPARAM data) {
     VisibleCount& count = *reinterpret_cast<VisibleCount*>(data);
@@ -303,11 +318,7 @@ BOOL CALLBACK CountSibling(HWND window, LPARAM data) {
     wchar_t className[128];
     if (!GetClassNameW(window, className, 128) || lstrcmpiW(className, count.className) != 0)
         return TRUE;
-    RECT rect;
-    GetWindowRect(window, &rect);
-    MapWindowPoints(nullptr, count.parent, reinterpret_cast<POINT*>(&rect), 2);
-    RECT shown;
-    if (!IntersectRect(&shown, &rect, &count.client))
+    if (!ShowsOnScreen(window))
         return TRUE;
     ++count.visible;
     if (GetPropW(window, kDrawnProperty))
@@ -374,10 +385,8 @@ void TimingPreviewDrawn(HWND window, const wchar_t* fileName) {
     VisibleCount count;
     count.parent = GetParent(window);
     GetClassNameW(window, count.className, 128);
-    if (count.parent) {
-        GetClientRect(count.parent, &count.client);
+    if (count.parent)
         EnumChildWindows(count.parent, &CountSibling, reinterpret_cast<LPARAM>(&count));
-    }
     Line(ms, L"preview " + std::to_wstring(count.drawn) + L"/" + std::to_wstring(count.visible) + L" " +
                  (fileName ? std::wstring(fileName) : std::wstring()));
 }

@@ -195,7 +195,8 @@ exCDwgThumbnail::~exCDwgThumbnail() {
 bool exCDwgThumbnail::Create(const std::string& name, int listIndex, const char* windowName, DWORD style,
                              const RECT& cell, CTessel3View* parentView, UINT id) {
     const bool created =
-        CWnd::CreateEx(0, nullptr, windowName, style | WS_VISIBLE | WS_BORDER, cell, parentView, id);
+        CWnd::CreateEx(0, nullptr, windowName, style | WS_VISIBLE | WS_BORDER, cell,
+                       parentView ? parentView->Sheet() : nullptr, id);
     if (!created)
         return false;
 
@@ -261,7 +262,7 @@ bool exCDwgThumbnail::CreateLabel(const std::string& name, const RECT& cell) {
     const CRect rc = LabelRect(cell);
     m_wndLabel.m_pOwner = this;
     if (!m_wndLabel.CreateEx(0, "EDIT", "", WS_CHILD | ES_READONLY | ES_NOHIDESEL | ES_AUTOHSCROLL, rc,
-                             m_pView, 0))
+                             m_pView ? m_pView->Sheet() : nullptr, 0))
         return false;
     m_wndLabel.SetWindowText(name);
     if (RecordAt(m_nListIndex).IsSelected())
@@ -398,7 +399,7 @@ bool exCDwgThumbnail::TranslateInput(MSG* pMsg) {
         if (m_wndToolTip.m_hWnd)
             m_wndToolTip.RelayEvent(pMsg);
         // A click in the grid takes the keyboard there (from the folder tree, the search edit).
-        if (HWND view = GetParentHwnd()) {
+        if (HWND view = m_pView ? m_pView->m_hWnd : nullptr) {
             HWND focus = ::GetFocus();
             if (focus != view && !::IsChild(view, focus))
                 ::SetFocus(view);
@@ -422,7 +423,7 @@ bool exCDwgThumbnail::TranslateInput(MSG* pMsg) {
     }
     case WM_KEYDOWN:
         // Keyboard navigation belongs to the grid.
-        if (HWND view = GetParentHwnd()) {
+        if (HWND view = m_pView ? m_pView->m_hWnd : nullptr) {
             ::SetFocus(view);
             ::PostMessageA(view, WM_KEYDOWN, pMsg->wParam, pMsg->lParam);
         }

@@ -49,6 +49,37 @@ private:
 
 } // namespace
 
+// ---- the sheet ---------------------------------------------------------------------------------------
+
+bool CGridSheet::PreCreateWindow(CREATESTRUCTA& cs) {
+    cs.lpszClass = AfxRegisterWndClass(0, ::LoadCursorA(nullptr, IDC_ARROW), nullptr);
+    cs.style |= WS_CLIPCHILDREN | WS_CLIPSIBLINGS;
+    return CWnd::PreCreateWindow(cs);
+}
+
+LRESULT CGridSheet::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+    switch (message) {
+    case WM_NCHITTEST:
+        return HTTRANSPARENT; // a click between the cells is the view's, as if there were no sheet
+    case WM_ERASEBKGND:
+        return 1; // the paint fills every pixel
+    case WM_PAINT: {
+        CPaintDC dc(m_hWnd);
+        m_view.DrawSheet(dc);
+        return 0;
+    }
+    case WM_PRINTCLIENT: {
+        CDC dc(reinterpret_cast<HDC>(wParam));
+        m_view.DrawSheet(dc);
+        return 0;
+    }
+    default:
+        return CWnd::WindowProc(message, wParam, lParam);
+    }
+}
+
+// ---- the view ----------------------------------------------------------------------------------------
+
 CTessel3View::CTessel3View() {
     LabelHeight(); // measured once, before the first layout needs it
 }
@@ -369,6 +400,8 @@ void CTessel3View::Layout() {
     m_nVisibleRows = n.visibleRows;
     m_nPoolRows = n.poolRows;
     m_nTotalHeight = n.totalHeight;
+    m_nTotalWidth = n.totalWidth;
+    PlaceSheet();
     if (m_nCount == 0)
         return;
 
@@ -383,15 +416,89 @@ void CTessel3View::Layout() {
     ScrollToPosition(GetScrollPosition());
 }
 
+CPoint CTessel3View::SheetOrigin() const {
+    POINT origin{0, 0};
+    if (m_wndSheet.m_hWnd)
+        ::MapWindowPoints(m_wndSheet.m_hWnd, m_hWnd, &origin, 1);
+    return CPoint(origin.x, origin.y);
+}
+
+int CTessel3View::SheetMargin() const {
+    // Some twenty steps of the default size between two moves back; never less than two rows, so that a
+    // step always finds a row of margin left.
+    constexpr int kMargin = 4096;
+    return std::max(kMargin, 2 * Geometry().RowPitch());
+}
+
+void CTessel3View::PlaceSheet() {
+    const CRect client = GetClientRect();
+    const int margin = SheetMargin();
+    const CRect rect(0, -margin, std::max(m_nTotalWidth, client.Width()), client.Height() + margin);
+    if (m_wndSheet.m_hWnd)
+        ::SetWindowPos(m_wndSheet.m_hWnd, nullptr, rect.left, rect.top, rect.Width(), rect.Height(),
+                       SWP_NOZORDER | SWP_NOACTIVATE);
+    else
+        m_wndSheet.CreateEx(0, nullptr, "", WS_CHILD | WS_VISIBLE, rect, this, 0);
+}
+
+void CTessel3View::KeepSheetCovering() {
+    if (!m_wndSheet.m_hWnd)
+        return;
+    const CRect client = GetClientRect();
+    const CPoint origin = SheetOrigin();
+    CRect sheet = m_wndSheet.GetClientRect();
+    sheet.OffsetRect(origin);
+    const int pitch = Geometry().RowPitch();
+    if (sheet.left <= 0 && sheet.right >= client.right && sheet.top <= -pitch && sheet.bottom >= client.bottom + pitch)
+        return;
+    // Back to the margin above the client area; every control moves the other way by as much, so nothing
+    // moves on the screen and nothing needs painting. What waits to be painted is painted first: it is
+    // kept in the coordinates of the window it belongs to and would land in the wrong place.
+    ::RedrawWindow(m_hWnd, nullptr, nullptr, RDW_UPDATENOW | RDW_ALLCHILDREN);
+    const int margin = SheetMargin();
+    const CPoint to(std::min<int>(origin.x, 0), -margin);
+    const int width = std::max<int>(m_nTotalWidth, client.right - to.x);
+    const int height = client.Height() + 2 * margin;
+    const int dx = origin.x - to.x;
+    const int dy = origin.y - to.y;
+    constexpr UINT kStill = SWP_NOZORDER | SWP_NOACTIVATE | SWP_NOSIZE | SWP_NOREDRAW | SWP_NOCOPYBITS;
+    auto shift = [&](HWND control) {
+        CRect rc;
+        ::GetWindowRect(control, &rc);
+        ::MapWindowPoints(nullptr, m_wndSheet.m_hWnd, reinterpret_cast<POINT*>(&rc), 2);
+        ::SetWindowPos(control, nullptr, rc.left + dx, rc.top + dy, 0, 0, kStill);
+    };
+    ::SetWindowPos(m_wndSheet.m_hWnd, nullptr, to.x, to.y, width, height,
+                   SWP_NOZORDER | SWP_NOACTIVATE | SWP_NOREDRAW | SWP_NOCOPYBITS);
+    for (const auto& control : m_pool) {
+        if (!control->m_hWnd)
+            continue;
+        shift(control->m_hWnd);
+        if (control->Label().m_hWnd)
+            shift(control->Label().m_hWnd);
+    }
+}
+
+void CTessel3View::DrawSheet(CDC& dc) {
+    dc.FillSolidRect(m_wndSheet.GetClientRect(), ::GetSysColor(COLOR_SCROLLBAR));
+    for (const auto& control : m_pool) {
+        CThumbLabel& label = control->Label();
+        if (label.m_hWnd && label.IsRenaming())
+            dc.DrawEdge(label.EdgeRect(), EDGE_SUNKEN, BF_RECT);
+    }
+}
+
 void CTessel3View::CreateRow(int row, int rowTop) {
     const int poolSize = PoolSize();
     if (row < 0 || poolSize == 0)
         return;
     const grid::Geometry g = Geometry();
+    const CPoint sheet = SheetOrigin();
     for (int column = 0; column < m_nColumns; ++column) {
         const grid::Cell cell = grid::CellOf(g, m_nColumns, poolSize, row, column, rowTop);
         exCDwgThumbnail& control = PoolControl(cell.slot);
-        const CRect rect(cell.left, cell.top, cell.right, cell.bottom);
+        CRect rect(cell.left, cell.top, cell.right, cell.bottom); // in the view; the controls sit on the sheet
+        rect.OffsetRect(-sheet.x, -sheet.y);
         // A row scrolled into view takes over the windows of the row that left it.
         if (cell.index < m_nCount && control.Rebind(DwgList[cell.index].m_strName, cell.index, rect))
             continue;
@@ -468,7 +575,14 @@ void CTessel3View::ApplyLineStep(const grid::LineStep& step, const grid::ScrollS
     // The contents always move by exactly one row, whatever the capped scroll bar could show.
     ::SetScrollPos(m_hWnd, SB_VERT, after.y, TRUE);
     ScrollWindow(0, -direction * Geometry().RowPitch());
+    KeepSheetCovering();
     UpdateWindow();
+}
+
+bool CTessel3View::OnScrollBy(CSize sizeScroll, bool doScroll) {
+    const bool scrolled = CScrollView::OnScrollBy(sizeScroll, doScroll);
+    KeepSheetCovering();
+    return scrolled;
 }
 
 void CTessel3View::LineUp() {
@@ -606,6 +720,7 @@ void CTessel3View::OnSize(UINT type, int cx, int cy) {
     CScrollView::OnSize(type, cx, cy);
     if (!m_bAligning)
         Refit(false);
+    KeepSheetCovering();
     RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
 }
 
@@ -619,10 +734,11 @@ void CTessel3View::OnDraw(CDC* pDC) {
     const CRect client = GetClientRect();
     pDC->IntersectClipRect(client);
     pDC->FillSolidRect(client, ::GetSysColor(COLOR_SCROLLBAR));
-    for (const auto& control : m_pool) {
-        CThumbLabel& label = control->Label();
-        if (label.m_hWnd && label.IsRenaming())
-            pDC->DrawEdge(label.EdgeRect(), EDGE_SUNKEN, BF_RECT);
+    if (m_wndSheet.m_hWnd) {
+        // What lies on the sheet, where the sheet lies (the view's own paint never shows under it).
+        const CPoint sheet = SheetOrigin();
+        pDC->SetViewportOrg(sheet.x, sheet.y);
+        DrawSheet(*pDC);
     }
     pDC->RestoreDC(saved);
 }

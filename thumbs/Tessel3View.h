@@ -6,9 +6,10 @@
 // handlers through which the grid and its thumbnails tell it what changed; a handler left empty is
 // simply not called. The thumbnails reach the grid through the view that created them.
 //
-// The controls always sit in client coordinates with the first row shown at the top; the scroll
-// position only mirrors the row (it wraps round inside the capped range), and every row step moves the
-// window contents by exactly one row pitch.
+// The controls sit on a sheet, a child window that covers the client area and a margin of rows above
+// and below it, with the first row shown at the top of the client area; the scroll position only mirrors
+// the row (it wraps round inside the capped range), and every row step moves the window contents by
+// exactly one row pitch: the sheet moves, and the controls on it with it.
 #pragma once
 
 #include "framework/afxview.h"
@@ -21,6 +22,25 @@
 #include <vector>
 
 class CTessel3Doc;
+class CTessel3View;
+
+// The sheet under the thumbnails and their labels. Scrolling a window moves each of its children, one
+// round trip to the window system apiece; with the controls on one sheet a row step moves one window, and
+// only the row that left is moved, to the other edge. The sheet is taller than the view by a margin above
+// and below; when a step has used the margin up, the sheet moves back and its controls the other way,
+// which changes nothing on the screen. The sheet paints the grid's background and the edge of a label
+// being renamed; the mouse goes through it to the view.
+class CGridSheet : public CWnd {
+public:
+    explicit CGridSheet(CTessel3View& view) : m_view(view) {}
+
+protected:
+    bool PreCreateWindow(CREATESTRUCTA& cs) override;
+    LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
+
+private:
+    CTessel3View& m_view;
+};
 
 // The numbers of the grid's own context menu (built at run time).
 enum GridMenuCommand { kGridMenuCopy = 1, kGridMenuPaste = 2, kGridMenuDelete = 3, kGridMenuRename = 4 };
@@ -117,9 +137,17 @@ public:
 
     // Height of a thumbnail's label, measured once from the view's font.
     static int LabelHeight();
+    // The window the thumbnails and labels are children of (see CGridSheet); the view itself until its
+    // first layout has made the sheet.
+    CWnd* Sheet() { return m_wndSheet.m_hWnd ? static_cast<CWnd*>(&m_wndSheet) : this; }
+    // The sheet's top-left corner in the view's client coordinates.
+    CPoint SheetOrigin() const;
+    // Draws the grid's background and the edge of a label being renamed, in the sheet's coordinates.
+    void DrawSheet(CDC& dc);
 
     bool PreTranslateMessage(MSG* pMsg) override;
     bool OnScroll(UINT scrollCode, UINT pos, bool doScroll = true) override;
+    bool OnScrollBy(CSize sizeScroll, bool doScroll = true) override;
     void OnInitialUpdate() override;
 
 protected:
@@ -140,6 +168,11 @@ private:
     void Refit(bool resizeFrame);
     void Relayout();
     void CreateRow(int row, int rowTop);
+    // Creates the sheet, or places it afresh: a margin above and below the client area.
+    void PlaceSheet();
+    // Moves the sheet back when a step has left part of the client area uncovered.
+    void KeepSheetCovering();
+    int SheetMargin() const;
     void LineUp();
     void LineDown();
     void ApplyLineStep(const grid::LineStep& step, const grid::ScrollState& before,
@@ -167,6 +200,8 @@ private:
     int m_nVisibleRows = 0;
     bool m_bAligning = false;
     int m_nTotalHeight = 0; // capped scroll height of the last layout
+    int m_nTotalWidth = 0;  // width of the grid's columns in the last layout
+    CGridSheet m_wndSheet{*this};
     // The controls live on the heap: resizing the pool never moves or copies a live window.
     std::vector<std::unique_ptr<exCDwgThumbnail>> m_pool;
 };

@@ -190,16 +190,16 @@ void FillList(int count) {
 namespace {
 
 struct ChildCount {
-    HWND parent;
     const char* className;
     int count;
 };
 
+// Every window of the class inside the view (the controls sit on the view's sheet).
 BOOL CALLBACK CountChild(HWND hwnd, LPARAM lParam) {
     auto* c = reinterpret_cast<ChildCount*>(lParam);
     char name[64] = {};
     ::GetClassNameA(hwnd, name, sizeof name);
-    if (::GetParent(hwnd) == c->parent && ::lstrcmpiA(name, c->className) == 0)
+    if (::lstrcmpiA(name, c->className) == 0)
         ++c->count;
     return TRUE;
 }
@@ -207,13 +207,13 @@ BOOL CALLBACK CountChild(HWND hwnd, LPARAM lParam) {
 } // namespace
 
 int LiveThumbnails(HWND view) {
-    ChildCount c{view, AFX_WND_CLASS, 0};
+    ChildCount c{AFX_WND_CLASS, 0};
     ::EnumChildWindows(view, CountChild, reinterpret_cast<LPARAM>(&c));
     return c.count;
 }
 
 int LiveLabels(HWND view) {
-    ChildCount c{view, "Edit", 0};
+    ChildCount c{"Edit", 0};
     ::EnumChildWindows(view, CountChild, reinterpret_cast<LPARAM>(&c));
     return c.count;
 }

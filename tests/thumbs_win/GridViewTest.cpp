@@ -215,6 +215,76 @@ TEST(GridScroll, RowsScrolledIntoViewShowTheirOwnDrawingsNamesTooltipsAndSelecti
     EXPECT_LE(LiveThumbnails(view.m_hWnd), columns * (view.GetVisibleRows() + 2));
 }
 
+namespace {
+
+// The view's client area as the window system holds it for the screen.
+std::vector<COLORREF> ClientPixels(CTessel3View& view) {
+    const CRect client = view.GetClientRect();
+    HDC source = ::GetDC(view.m_hWnd);
+    HDC memory = ::CreateCompatibleDC(source);
+    HBITMAP bitmap = ::CreateCompatibleBitmap(source, client.Width(), client.Height());
+    HGDIOBJ old = ::SelectObject(memory, bitmap);
+    ::BitBlt(memory, 0, 0, client.Width(), client.Height(), source, 0, 0, SRCCOPY);
+    std::vector<COLORREF> pixels;
+    for (int y = 0; y < client.Height(); y += 2)
+        for (int x = 0; x < client.Width(); x += 2)
+            pixels.push_back(::GetPixel(memory, x, y));
+    ::SelectObject(memory, old);
+    ::DeleteObject(bitmap);
+    ::DeleteDC(memory);
+    ::ReleaseDC(view.m_hWnd, source);
+    return pixels;
+}
+
+// Where what is shown after a step differs from what a repaint of everything draws.
+int DiffersFromARepaint(CTessel3View& view) {
+    const std::vector<COLORREF> shown = ClientPixels(view);
+    view.RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_ALLCHILDREN | RDW_UPDATENOW);
+    Pump();
+    const std::vector<COLORREF> repainted = ClientPixels(view);
+    int differing = 0;
+    for (std::size_t i = 0; i < shown.size() && i < repainted.size(); ++i)
+        differing += shown[i] != repainted[i];
+    return differing;
+}
+
+} // namespace
+
+// A step moves the sheet the controls sit on, and every twenty-odd steps the sheet moves back while its
+// controls move the other way, painting nothing: through a long scroll down and back up, the first row
+// shown stays at the top with each row one pitch below the one before, and the screen shows exactly what
+// a repaint of everything would draw.
+TEST(GridScroll, ALongScrollKeepsEveryRowInPlaceAndTheScreenAsARepaintDrawsIt) {
+    GridBench bench(1000, 600);
+    FillList(1200);
+    CTessel3View& view = bench.view();
+    view.Rebuild();
+    Pump();
+    const int pitch = RowPitch(view);
+    const int steps = 2 * 4096 / pitch + 10; // beyond two moves back of the sheet
+    ASSERT_LT(steps, view.GetRows() - view.GetVisibleRows());
+    const std::vector<COLORREF> atTop = ClientPixels(view);
+    int step = 0;
+    for (int down = 0; down < steps; ++down, ++step) {
+        view.SetFocus();
+        PressKey(VK_DOWN);
+        ASSERT_EQ(view.GetFirstRow(), down + 1);
+        ExpectFirstRowAtTop(view);
+        ExpectControlsShowTheirDrawings(view, step);
+        ASSERT_EQ(DiffersFromARepaint(view), 0) << "step " << step;
+    }
+    for (int up = 0; up < steps; ++up, ++step) {
+        view.SetFocus();
+        PressKey(VK_UP);
+        ASSERT_EQ(view.GetFirstRow(), steps - up - 1);
+        ExpectFirstRowAtTop(view);
+        ExpectControlsShowTheirDrawings(view, step);
+        ASSERT_EQ(DiffersFromARepaint(view), 0) << "step " << step;
+    }
+    // Back at the top, the grid looks as it did before the scroll.
+    EXPECT_EQ(ClientPixels(view), atTop);
+}
+
 TEST(GridScroll, EndHomePageDownPageUp) {
     GridBench bench(700, 600);
     FillList(900); // 300 rows: beyond the capped range

@@ -525,7 +525,8 @@ TEST(ThumbnailRename, SunkenEdgeAroundTheLabelOnlyWhileRenaming) {
     Pump();
     ASSERT_NE(bench.view().ControlOf(4), nullptr);
     CThumbLabel& label = bench.view().ControlOf(4)->Label();
-    const CRect edge = label.EdgeRect();
+    CRect edge = label.EdgeRect(); // in the label's parent: the view's sheet
+    ::MapWindowPoints(::GetParent(label.m_hWnd), bench.view().m_hWnd, reinterpret_cast<POINT*>(&edge), 2);
     const COLORREF background = Nearest(bench.view(), ::GetSysColor(COLOR_SCROLLBAR));
     {
         ViewPicture before(bench.view());
