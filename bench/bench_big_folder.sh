@@ -58,7 +58,7 @@ one_run() {
   local folder=$1 tmp
   tmp=$(mktemp -d)
   printf '%s\n' 'wait contains=".dwg" timeout=900000' 'sleep 1500' 'echo picking' \
-    'double-click contains=".dwg" nth=0 at=60,-50' >"$tmp/script.txt"
+    'double-click class=Edit contains=".dwg" nth=0 at=60,-50' >"$tmp/script.txt"
   [ -n "$(find "$folder" -maxdepth 1 -name '*.dwg' -print -quit)" ] || printf '%s\n' 'sleep 3000' 'echo picking' \
     'click text="Close"' >"$tmp/script.txt"
   rm -f "$win_build/bin/Orvex1.ini"

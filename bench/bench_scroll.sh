@@ -30,7 +30,8 @@ mkdir -p "$data"
 {
   echo 'wait class=Orvex1Wnd timeout=120000' # the first thumbnail
   echo 'sleep 1000'
-  echo 'click contains=".dwg" nth=0 at=60,-50'
+  # Above the first label: a tooltip shown where the pointer rests holds a drawing's name too.
+  echo 'click class=Edit contains=".dwg" nth=0 at=60,-50'
   echo 'sleep 500'
   echo 'echo top'
   for ((i = 0; i < steps; i++)); do echo 'key down'; echo 'sleep 300'; done
