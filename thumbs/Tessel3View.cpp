@@ -477,6 +477,10 @@ void CTessel3View::KeepSheetCovering() {
         if (control->Label().m_hWnd)
             shift(control->Label().m_hWnd);
     }
+    // A client area that grew without a new layout leaves part of the larger sheet unpainted.
+    if (width != sheet.Width() || height != sheet.Height())
+        ::RedrawWindow(m_wndSheet.m_hWnd, nullptr, nullptr,
+                       RDW_INVALIDATE | RDW_ERASE | RDW_ALLCHILDREN | RDW_UPDATENOW);
 }
 
 void CTessel3View::DrawSheet(CDC& dc) {
