@@ -194,9 +194,8 @@ exCDwgThumbnail::~exCDwgThumbnail() {
 
 bool exCDwgThumbnail::Create(const std::string& name, int listIndex, const char* windowName, DWORD style,
                              const RECT& cell, CTessel3View* parentView, UINT id) {
-    const bool created =
-        CWnd::CreateEx(0, nullptr, windowName, style | WS_VISIBLE | WS_BORDER, cell,
-                       parentView ? parentView->Sheet() : nullptr, id);
+    const bool created = CWnd::CreateEx(0, nullptr, windowName, style | WS_VISIBLE | WS_BORDER, cell,
+                                        parentView ? parentView->Sheet() : nullptr, id);
     if (!created)
         return false;
 

@@ -449,7 +449,8 @@ void CTessel3View::KeepSheetCovering() {
     CRect sheet = m_wndSheet.GetClientRect();
     sheet.OffsetRect(origin);
     const int pitch = Geometry().RowPitch();
-    if (sheet.left <= 0 && sheet.right >= client.right && sheet.top <= -pitch && sheet.bottom >= client.bottom + pitch)
+    if (sheet.left <= 0 && sheet.right >= client.right && sheet.top <= -pitch &&
+        sheet.bottom >= client.bottom + pitch)
         return;
     // Back to the margin above the client area; every control moves the other way by as much, so nothing
     // moves on the screen and nothing needs painting. What waits to be painted is painted first: it is
@@ -484,7 +485,8 @@ void CTessel3View::KeepSheetCovering() {
 }
 
 void CTessel3View::DrawSheet(CDC& dc) {
-    dc.FillSolidRect(m_wndSheet.GetClientRect(), ::GetSysColor(COLOR_SCROLLBAR));
+    if (m_wndSheet.m_hWnd) // without a sheet the controls sit on the view, whose paint fills the background
+        dc.FillSolidRect(m_wndSheet.GetClientRect(), ::GetSysColor(COLOR_SCROLLBAR));
     for (const auto& control : m_pool) {
         CThumbLabel& label = control->Label();
         if (label.m_hWnd && label.IsRenaming())
@@ -501,7 +503,8 @@ void CTessel3View::CreateRow(int row, int rowTop) {
     for (int column = 0; column < m_nColumns; ++column) {
         const grid::Cell cell = grid::CellOf(g, m_nColumns, poolSize, row, column, rowTop);
         exCDwgThumbnail& control = PoolControl(cell.slot);
-        CRect rect(cell.left, cell.top, cell.right, cell.bottom); // in the view; the controls sit on the sheet
+        // The cell in the view's coordinates; the controls sit on the sheet.
+        CRect rect(cell.left, cell.top, cell.right, cell.bottom);
         rect.OffsetRect(-sheet.x, -sheet.y);
         // A row scrolled into view takes over the windows of the row that left it.
         if (cell.index < m_nCount && control.Rebind(DwgList[cell.index].m_strName, cell.index, rect))
@@ -738,12 +741,10 @@ void CTessel3View::OnDraw(CDC* pDC) {
     const CRect client = GetClientRect();
     pDC->IntersectClipRect(client);
     pDC->FillSolidRect(client, ::GetSysColor(COLOR_SCROLLBAR));
-    if (m_wndSheet.m_hWnd) {
-        // What lies on the sheet, where the sheet lies (the view's own paint never shows under it).
-        const CPoint sheet = SheetOrigin();
-        pDC->SetViewportOrg(sheet.x, sheet.y);
-        DrawSheet(*pDC);
-    }
+    // What lies on the sheet, where the sheet lies (the view's own paint never shows under it).
+    const CPoint sheet = SheetOrigin();
+    pDC->SetViewportOrg(sheet.x, sheet.y);
+    DrawSheet(*pDC);
     pDC->RestoreDC(saved);
 }
 
