@@ -16,15 +16,6 @@ namespace {
 
 std::string g_fileName;
 
-void WriteBytes(const uint8_t* data, size_t size) {
-    std::FILE* file = std::fopen(g_fileName.c_str(), "wb");
-    if (!file)
-        std::abort();
-    if (size != 0 && std::fwrite(data, 1, size, file) != size)
-        std::abort();
-    std::fclose(file);
-}
-
 } // namespace
 
 extern "C" int LLVMFuzzerInitialize(int*, char***) {
@@ -34,7 +25,7 @@ extern "C" int LLVMFuzzerInitialize(int*, char***) {
 }
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    WriteBytes(data, size);
+    testsupport::WriteScratchBytes(g_fileName, data, size);
     DwgPreview fromFile;
     const bool read = ReadDwgPreview(g_fileName, fromFile);
     DwgPreview fromMemory;

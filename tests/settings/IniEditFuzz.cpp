@@ -21,28 +21,6 @@ namespace {
 
 std::string g_fileName;
 
-void WriteBytes(const std::string& bytes) {
-    std::FILE* file = std::fopen(g_fileName.c_str(), "wb");
-    if (!file)
-        std::abort();
-    if (!bytes.empty() && std::fwrite(bytes.data(), 1, bytes.size(), file) != bytes.size())
-        std::abort();
-    std::fclose(file);
-}
-
-std::string ReadBytes() {
-    std::string bytes;
-    std::FILE* file = std::fopen(g_fileName.c_str(), "rb");
-    if (!file)
-        std::abort();
-    char buffer[4096];
-    size_t n;
-    while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0)
-        bytes.append(buffer, n);
-    std::fclose(file);
-    return bytes;
-}
-
 // A section heading the format can carry: one line that reads back as the same name.
 bool SectionFits(const std::string& name) {
     return name.find('\n') == std::string::npos &&
@@ -100,7 +78,7 @@ extern "C" int LLVMFuzzerInitialize(int*, char***) {
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     FuzzedDataProvider in(data, size);
     const std::string original = in.ConsumeRandomLengthString(4096);
-    WriteBytes(original);
+    testsupport::WriteScratchBytes(g_fileName, original.data(), original.size());
 
     CIniFile ini(g_fileName);
     const bool read = ini.ReadFile();
@@ -164,7 +142,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     const bool written = ini.WriteFile();
     if (!written) {
         // Only a file the store did not hold whole is refused, and then it is left exactly as it was.
-        if (ReadBytes() != original)
+        if (testsupport::ReadScratchBytes(g_fileName) != original)
             std::abort();
         return 0;
     }
@@ -174,8 +152,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         back.GetNumKeys() != static_cast<int>(Saved(ini).size()))
         std::abort();
     // And that file is one the store writes back unchanged.
-    const std::string bytes = ReadBytes();
-    if (!back.WriteFile() || ReadBytes() != bytes)
+    const std::string bytes = testsupport::ReadScratchBytes(g_fileName);
+    if (!back.WriteFile() || testsupport::ReadScratchBytes(g_fileName) != bytes)
         std::abort();
     return 0;
 }

@@ -16,28 +16,6 @@ namespace {
 
 std::string g_fileName;
 
-void WriteBytes(const std::string& fileName, const uint8_t* data, size_t size) {
-    std::FILE* file = std::fopen(fileName.c_str(), "wb");
-    if (!file)
-        std::abort();
-    if (size != 0 && std::fwrite(data, 1, size, file) != size)
-        std::abort();
-    std::fclose(file);
-}
-
-std::string ReadBytes(const std::string& fileName) {
-    std::string bytes;
-    std::FILE* file = std::fopen(fileName.c_str(), "rb");
-    if (!file)
-        std::abort();
-    char buffer[4096];
-    size_t n;
-    while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0)
-        bytes.append(buffer, n);
-    std::fclose(file);
-    return bytes;
-}
-
 bool SameStore(const CIniFile& a, const CIniFile& b) {
     if (a.GetNumKeys() != b.GetNumKeys())
         return false;
@@ -62,19 +40,20 @@ extern "C" int LLVMFuzzerInitialize(int*, char***) {
 }
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-    WriteBytes(g_fileName, data, size);
+    testsupport::WriteScratchBytes(g_fileName, data, size);
     const std::string input(reinterpret_cast<const char*>(data), size);
 
     CIniFile first(g_fileName);
     if (!first.ReadFile()) {
         // Only a file over the limit is refused; it is never written over.
-        if (size <= kMaxIniFileBytes || first.WriteFile() || ReadBytes(g_fileName) != input)
+        if (size <= kMaxIniFileBytes || first.WriteFile() ||
+            testsupport::ReadScratchBytes(g_fileName) != input)
             std::abort();
         return 0;
     }
-    if (!first.WriteFile() && ReadBytes(g_fileName) != input)
+    if (!first.WriteFile() && testsupport::ReadScratchBytes(g_fileName) != input)
         std::abort();
-    const std::string written = ReadBytes(g_fileName);
+    const std::string written = testsupport::ReadScratchBytes(g_fileName);
 
     CIniFile second(g_fileName);
     if (!second.ReadFile())
@@ -82,7 +61,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     if (!SameStore(first, second))
         std::abort();
     second.WriteFile();
-    if (ReadBytes(g_fileName) != written)
+    if (testsupport::ReadScratchBytes(g_fileName) != written)
         std::abort();
     return 0;
 }

@@ -1,9 +1,11 @@
 // The file a fuzz target writes each input to: in memory-backed /dev/shm when there is one, else in /tmp;
-// removed when the process ends. POSIX only (the fuzz targets are built natively).
+// removed when the process ends; and the writing and reading of its bytes. POSIX only (the fuzz targets are
+// built natively).
 #pragma once
 
 #include <unistd.h>
 
+#include <cstddef>
 #include <cstdio>
 #include <cstdlib>
 #include <string>
@@ -24,6 +26,30 @@ inline std::string FuzzScratchFile(const std::string& stem, const std::string& s
         return made;
     }
     std::abort();
+}
+
+// Writes size bytes at data to the file, replacing what it held; aborts when it cannot.
+inline void WriteScratchBytes(const std::string& fileName, const void* data, std::size_t size) {
+    std::FILE* file = std::fopen(fileName.c_str(), "wb");
+    if (!file)
+        std::abort();
+    if (size != 0 && std::fwrite(data, 1, size, file) != size)
+        std::abort();
+    std::fclose(file);
+}
+
+// The file's bytes; aborts when it cannot be opened.
+inline std::string ReadScratchBytes(const std::string& fileName) {
+    std::string bytes;
+    std::FILE* file = std::fopen(fileName.c_str(), "rb");
+    if (!file)
+        std::abort();
+    char buffer[4096];
+    std::size_t n;
+    while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0)
+        bytes.append(buffer, n);
+    std::fclose(file);
+    return bytes;
 }
 
 } // namespace testsupport
