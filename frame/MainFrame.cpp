@@ -217,6 +217,12 @@ void CMainFrame::WireFolderTree() {
         if (m_pGridView && m_pGridView->m_hWnd)
             m_pGridView->SetFocus();
     };
+    // A walk that did not get to the start folder (renamed, or a drive named otherwise since) leaves the
+    // keyboard in the grid: the tree would select its top node as soon as it got the focus.
+    tree->onWalkEnded = [this](bool reached) {
+        if (!reached && m_pGridView && m_pGridView->m_hWnd)
+            SetActiveView(m_pGridView, true);
+    };
     if (m_pGridView)
         m_pGridView->onRefreshFolder = [this] {
             if (CChildView* folders = GetFolderTree(); folders && folders->GetSelectedItem()) {

@@ -144,18 +144,14 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // 5. The posted accept and cancel messages go to the dialog.
     m_pMainWnd = dialog;
     frame->InitialUpdateFrame(doc, false);
-    // The folder tree has opened along the start folder's (or the saved) label path; without a tree the
-    // grid shows the start folder by its path.
-    // When the walk did not get there (a folder renamed, a drive named otherwise since) the grid still
-    // shows the folder by its path, and the keyboard starts in the grid: the tree would select its top
-    // node as soon as it got the focus.
+    // The folder tree walks to the start folder once the grid has drawn its pictures (step 9); until then
+    // it is hidden, the grid shows the start folder by its path and has the keyboard (a tree control given
+    // the focus selects its first item on its own).
     CChildView* tree = frame->GetFolderTree();
-    const bool treeOpened = tree && tree->m_hPathTarget;
-    const std::string scanProblem =
-        treeOpened ? std::string() : ShowStartFolder(*frame, *doc, call.startPath);
-    if (!treeOpened)
-        if (CTessel3View* grid = frame->GetGridView())
-            frame->SetActiveView(grid, false);
+    if (tree)
+        tree->ShowWindow(SW_HIDE);
+    if (CTessel3View* grid = frame->GetGridView())
+        frame->SetActiveView(grid, false);
 
     // 6. Placement from the dialog's rectangle and the stored size, on a monitor of this desktop.
     const CRect rcDialog = dialog->GetWindowRect();
@@ -169,32 +165,11 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
         frame->ShowWindow(SW_SHOWNORMAL);
     }
 
-    // 7. The node the tree's walk reached is selected: the selection scans it and the grid shows it. Only
-    // from here on does a selection scan its folder: showing the frame gave the tree the focus, and the
-    // tree control then selected its first visible item on its own.
-    if (tree)
-        tree->FollowSelection(true);
-    if (treeOpened) {
-        if (HTREEITEM target = tree->m_hPathTarget) {
-            // The tree paints once the grid has drawn its pictures, not when the grid takes the focus on
-            // the way: its first paint asks the shell for every visible folder's icon.
-            tree->SendMessage(WM_SETREDRAW, FALSE);
-            tree->SelectItem(nullptr); // the target may be the item the control chose: selected anew
-            tree->SelectSetFirstVisible(target);
-            tree->SelectDropTarget(target);
-            tree->SelectItem(target);
-            tree->EnsureVisible(target); // sideways too: a deep folder in a narrow pane
-            tree->SendMessage(WM_SETREDRAW, TRUE);
-            tree->SetFocus();
-        }
-    }
-
-    // Nothing is chosen yet.
+    // 7. The start folder is scanned and laid out at the size the frame is shown at, and drawn. Nothing is
+    // chosen yet.
+    const std::string scanProblem = ShowStartFolder(*frame, *doc, call.startPath);
     frame->UpdateWindow();
     frame->EnablePick(false);
-    // The pictures are up: the tree now opens the start folder to show its sub-folders.
-    if (treeOpened)
-        tree->OpenPathTargetLater();
 
     // 8. The drawing of the last run is chosen again: its name starts the search, and the drawing itself is
     // selected (the search may have found another name first). It stays the current drawing, so accept
@@ -210,5 +185,10 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // Said last: the search above has its own message for the status bar.
     if (!scanProblem.empty())
         frame->SetMessageText(scanProblem);
+
+    // 9. The pictures are up: the tree walks to the start folder (the frame puts the keyboard in the grid
+    // when it does not get there), then opens it to show its sub-folders.
+    if (tree)
+        tree->WalkToStartLater();
     return true;
 }

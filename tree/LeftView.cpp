@@ -2,7 +2,6 @@
 
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
-#include "tree/ShellNamespace.h"
 #include "tree/StartShellPath.h"
 
 #include "res/resource.h"
@@ -55,15 +54,8 @@ bool CLeftView::Create(const char* className, const char* windowName, DWORD styl
         return true; // an empty pane: the explorer works on without its tree
     auto* doc = dynamic_cast<CTessel3Doc*>(m_pDocument);
     m_wndTree.SetDocument(doc);
-    // Until the frame has shown itself and selected the folder it opens on (it turns this on again).
+    // Until the frame has shown itself and the tree has walked to the folder it opens on.
     m_wndTree.FollowSelection(false);
-    {
-        CDesktopFolderRef desktop;
-        if (doc)
-            // Asks the shell about the folder once before the tree walks to it (a network folder wakes
-            // up here); the answer does not matter.
-            ShellPidlOfPath(desktop.get(), doc->m_strPath);
-    }
     m_wndTree.PopulateTree(nullptr, 0);
     if (!doc)
         return true;
@@ -71,8 +63,7 @@ bool CLeftView::Create(const char* className, const char* windowName, DWORD styl
         doc->m_strShellPath = m_strStartShellPath;
     else if (doc->m_strShellPath.empty() && !doc->m_strPath.empty())
         doc->m_strShellPath = StartShellPathOf(doc->m_strPath + "\\"); // settings that only know the folder
-    // The folder itself is opened once the explorer has drawn its pictures (OpenPathTargetLater).
-    m_wndTree.ExpandToLabelPath(doc->m_strShellPath, false);
+    // The walk along that path is the frame's to start (WalkToStartLater), once the grid has its pictures.
     return true;
 }
 

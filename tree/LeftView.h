@@ -32,8 +32,9 @@ public:
     // The tree, or nullptr when it could not be created.
     CChildView* GetTree() { return m_wndTree.m_hWnd ? &m_wndTree : nullptr; }
 
-    // Creates the view, then the tree, rooted at the Desktop and opened along the saved (or the start)
-    // label path. A tree that cannot be created leaves an empty pane; the frame still stands.
+    // Creates the view, then the tree, rooted at the Desktop, and gives the document the label path the
+    // tree is to walk along (the start folder's, or the saved one). A tree that cannot be created leaves
+    // an empty pane; the frame still stands.
     bool Create(const char* className, const char* windowName, DWORD style, const RECT& rect, CWnd* parent,
                 UINT id, CCreateContext* context = nullptr) override;
 

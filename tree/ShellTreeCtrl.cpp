@@ -71,6 +71,18 @@ void CopyLabel(TVITEMA& item, const std::string& label, bool wideText) {
     wide[item.cchTextMax - 1] = L'\0';
 }
 
+// Whether two paths name the same folder as written: case, the kind of separator and a trailing one aside.
+bool SameFolderPath(std::string a, std::string b) {
+    for (std::string* path : {&a, &b}) {
+        for (char& c : *path)
+            if (c == '/')
+                c = '\\';
+        while (path->size() > 3 && path->back() == '\\')
+            path->pop_back();
+    }
+    return !a.empty() && ::lstrcmpiA(a.c_str(), b.c_str()) == 0;
+}
+
 } // namespace
 
 CShellTreeCtrl::CShellTreeCtrl() = default;
@@ -79,6 +91,15 @@ CShellTreeCtrl::~CShellTreeCtrl() = default;
 
 void CShellTreeCtrl::PreSubclassWindow() {
     CWaitingTreeCtrl::PreSubclassWindow();
+    // Asked for once the control is set up and the messages queued before are done: the first request
+    // makes the shell build its image lists (tens of milliseconds), which the explorer's first pictures
+    // need not wait for.
+    PostMessage(WM_ORVEX_TREE_ICONS);
+}
+
+void CShellTreeCtrl::TakeShellIcons() {
+    if (GetImageList(TVSIL_NORMAL))
+        return;
     CShellPidl desktop;
     if (FAILED(::SHGetSpecialFolderLocation(m_hWnd, CSIDL_DESKTOP, desktop.Receive())) || !desktop)
         return;
@@ -86,9 +107,8 @@ void CShellTreeCtrl::PreSubclassWindow() {
     const auto list = reinterpret_cast<HIMAGELIST>(
         ::SHGetFileInfoA(reinterpret_cast<LPCSTR>(desktop.get()), 0, &info, sizeof info,
                          SHGFI_SYSICONINDEX | SHGFI_SMALLICON | SHGFI_PIDL));
-    // Posted: the control may still be in the middle of its creation here.
     if (list)
-        PostImageList(list, TVSIL_NORMAL);
+        SetImageList(list, TVSIL_NORMAL);
 }
 
 void CShellTreeCtrl::OnDestroy() {
@@ -297,6 +317,9 @@ void CShellTreeCtrl::ExpandToLabelPath(const std::string& labelPath, bool openTa
         if (!candidate)
             return; // the path target keeps what it had
         const bool last = position >= labelPath.size() || labelPath[position] == '\\'; // no component follows
+        // The nodes on the way are filled at once: an animated filling costs a thread and a paint apiece.
+        if (!last)
+            FillWithoutAnimation(candidate);
         if (openTarget || !last)
             Expand(candidate, TVE_EXPAND);
         current = candidate;
@@ -311,14 +334,64 @@ void CShellTreeCtrl::OpenPathTargetLater() {
         PostMessage(WM_ORVEX_OPEN_TARGET);
 }
 
+void CShellTreeCtrl::WalkToStartLater() {
+    PostMessage(WM_ORVEX_WALK_START);
+}
+
+void CShellTreeCtrl::WalkToStart() {
+    if (m_bClosing)
+        return;
+    TakeShellIcons(); // normally queued before and taken already
+    // Shown, but drawn once the walk is done.
+    ShowWindow(SW_SHOW);
+    SendMessage(WM_SETREDRAW, FALSE);
+    const std::string shownFolder = m_pDoc ? m_pDoc->m_strPath : std::string();
+    if (m_pDoc)
+        ExpandToLabelPath(m_pDoc->m_strShellPath, false);
+    HTREEITEM target = m_hPathTarget;
+    if (target) {
+        const bool shown = SameFolderPath(FolderPathOf(target), shownFolder);
+        SelectItem(nullptr); // the target may be the item the control chose on its own: selected anew
+        SelectSetFirstVisible(target);
+        SelectDropTarget(target);
+        FollowSelection(!shown);
+        SelectItem(target);
+        if (shown) {
+            if (m_pDoc)
+                m_pDoc->m_strShellPath = GetLabelPath(target);
+            HighlightSelected(target);
+        }
+        EnsureVisible(target); // sideways too: a deep folder in a narrow pane
+    }
+    FollowSelection(true);
+    SendMessage(WM_SETREDRAW, TRUE);
+    Invalidate();
+    if (target) {
+        SetFocus();
+        OpenPathTargetLater();
+    }
+    if (onWalkEnded)
+        onWalkEnded(target != nullptr);
+}
+
 LRESULT CShellTreeCtrl::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
-    if (message != WM_ORVEX_OPEN_TARGET)
+    switch (message) {
+    case WM_ORVEX_TREE_ICONS:
+        TakeShellIcons();
+        return 0;
+    case WM_ORVEX_WALK_START:
+        WalkToStart();
+        return 0;
+    case WM_ORVEX_OPEN_TARGET: {
+        HTREEITEM item = m_hOpenLater;
+        m_hOpenLater = nullptr;
+        if (item && !m_bClosing)
+            Expand(item, TVE_EXPAND);
+        return 0;
+    }
+    default:
         return CWaitingTreeCtrl::WindowProc(message, wParam, lParam);
-    HTREEITEM item = m_hOpenLater;
-    m_hOpenLater = nullptr;
-    if (item && !m_bClosing)
-        Expand(item, TVE_EXPAND);
-    return 0;
+    }
 }
 
 std::string CShellTreeCtrl::FolderPathOf(HTREEITEM item) const {
@@ -371,6 +444,12 @@ void CShellTreeCtrl::OnSelChanged(HTREEITEM item) {
         onEnablePick(false);
     std::string problem;
     const int scanned = ScanFolder(item, ".dwg", &problem);
+    HighlightSelected(item);
+    ShowScanned(item, scanned, problem);
+    SetFocus();
+}
+
+void CShellTreeCtrl::HighlightSelected(HTREEITEM item) {
     // Stays highlighted while the focus is in the grid.
     SelectDropTarget(item);
     if (GetDropHilightItem() != item) {
@@ -379,8 +458,6 @@ void CShellTreeCtrl::OnSelChanged(HTREEITEM item) {
         SelectDropTarget(nullptr);
         ModifyStyle(0, TVS_SHOWSELALWAYS);
     }
-    ShowScanned(item, scanned, problem);
-    SetFocus();
 }
 
 bool CShellTreeCtrl::OnNotifyReflect(NMHDR* hdr, LRESULT* result) {

@@ -38,6 +38,8 @@ public:
     std::function<void(const std::string& folderPath, const std::string& label)> onFolderShown;
     std::function<void(const std::string&)> onStatusText; // what the scan has to say (empty: all well)
     std::function<void(HTREEITEM, CPoint)> onFolderMenu;  // right click on a node (screen point)
+    // The walk to the start folder has ended (WalkToStartLater); reached: a node was selected.
+    std::function<void(bool reached)> onWalkEnded;
     void SetDocument(CTessel3Doc* doc) { m_pDoc = doc; }
 
     UINT GetCallbackMask() const { return m_nCallbackMask; }
@@ -61,6 +63,15 @@ public:
     // sub-folders (the better part of a second for 100,000 drawings under Wine), which the first
     // pictures need not wait for. Nothing happens when the node has gone meanwhile.
     void OpenPathTargetLater();
+    // The walk the explorer makes when it opens, once the messages queued now have been handled: the grid
+    // shows the start folder by its path first, and the tree follows. Expands the nodes along the
+    // document's label path and selects the node reached; its folder is scanned only when it is not the
+    // document's folder already (then the grid keeps what it shows). The tree is shown (the explorer
+    // hides it until then: a tree drawn before it has walked would show the Desktop alone and ask the
+    // shell for icons the first pictures need not wait for), takes the focus when a node was reached, and
+    // opens that node (OpenPathTargetLater). Selections are followed from then on. onWalkEnded says how
+    // it went.
+    void WalkToStartLater();
     // The file-system path of a node, or empty for a virtual folder and for the Desktop at the top.
     std::string FolderPathOf(HTREEITEM item) const;
     // Scans the item's folder into the drawing list: the document's label path first, then the list
@@ -92,6 +103,9 @@ private:
     int PlainFolderIcon(const std::string& path, bool open) const;
     bool PopulateNode(HTREEITEM item, LPCITEMIDLIST absoluteId, std::uint32_t flags);
     void OnSelChanged(HTREEITEM item);
+    void HighlightSelected(HTREEITEM item);
+    void WalkToStart();
+    void TakeShellIcons();
     static int CALLBACK CompareNodes(LPARAM a, LPARAM b, LPARAM);
 
     CDesktopFolderRef m_desktop;

@@ -137,6 +137,19 @@ void CWaitingTreeCtrl::PrepareLoadingItem(HTREEITEM node) {
     m_nItemCount = 0;
 }
 
+bool CWaitingTreeCtrl::FillWithoutAnimation(HTREEITEM node) {
+    if (!node || node == TVI_ROOT || GetChildItem(node))
+        return node && GetChildItem(node);
+    if (PopulateItem(node)) {
+        TVITEMA tvi{};
+        tvi.mask = TVIF_HANDLE | TVIF_CHILDREN;
+        tvi.hItem = node;
+        tvi.cChildren = GetChildItem(node) ? 1 : 0;
+        SetItem(&tvi);
+    }
+    return GetChildItem(node) != nullptr;
+}
+
 void CWaitingTreeCtrl::DeleteChildren(HTREEITEM node) {
     HTREEITEM child = GetChildItem(node);
     while (child) {

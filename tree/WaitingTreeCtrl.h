@@ -40,6 +40,12 @@ public:
     // The node an expand-to-path walk reached last, null until then (for derived trees).
     HTREEITEM m_hPathTarget = nullptr;
 
+    // Fills a node that has no children yet at once: no loading item, no animation, nothing drawn. For a
+    // walk along a path, whose nodes a following expansion then shows as they are (unless the tree wants
+    // them filled again). A node that stays empty keeps or loses its button as PopulateItem says. Returns
+    // whether the node has children.
+    bool FillWithoutAnimation(HTREEITEM node);
+
 protected:
     // Animation hooks. PreAnimation and PostAnimation run on the user-interface thread before the
     // animation thread starts and after it ended; DoAnimation runs on the animation thread, on a timer
