@@ -20,7 +20,7 @@ phases=(
   "call -> settings file looked for"
   "settings read, run dialog"
   "frame, splitter, panes, tree control"
-  "tree filled (Desktop, the path)"
+  "tree's Desktop item (walk after the paint)"
   "toolbars, status bar"
   "-> folder scan begins"
   "folder scan"

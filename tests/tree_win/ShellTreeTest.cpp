@@ -378,4 +378,101 @@ TEST_F(ShellTree, RefreshingRescansTheSelectedFolder) {
     EXPECT_EQ(shown, 2);
 }
 
+// The explorer's opening: the grid has shown the start folder by its path; the tree, hidden until then,
+// walks there on a queued message and selects it without scanning it again.
+TEST_F(ShellTree, TheWalkToTheStartFolderSelectsItWithoutScanningWhatTheGridShowsAlready) {
+    CTessel3Doc doc(folder.File("Orvex1.ini"));
+    ASSERT_EQ(ScanFolderPath(b.c_str(), ".dwg"), 1);
+    doc.m_strPath = b + "\\"; // as the caller wrote it: a trailing separator
+    CharUpperA(doc.m_strPath.data());
+    std::string shellPath = StartShellPathOf(b + "\\");
+    CharLowerA(shellPath.data());
+    doc.m_strShellPath = shellPath;
+    testsupport::WriteBytes(b + "\\three.dwg", "AC1018"); // a rescan would list it
+    CountingTree tree;
+    tree.SetDocument(&doc);
+    int shown = 0;
+    std::vector<bool> ended;
+    tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
+    tree.onWalkEnded = [&](bool reached) { ended.push_back(reached); };
+    ASSERT_TRUE(tree.Create(kTreeStyle & ~WS_VISIBLE, CRect(0, 0, 600, 700), &parent, 1));
+    tree.FollowSelection(false);
+    tree.PopulateTree(nullptr, 0);
+    tree.WalkToStartLater();
+    EXPECT_EQ(tree.GetSelectedItem(), nullptr) << "nothing happens before the queued messages";
+    EXPECT_EQ(tree.m_hPathTarget, nullptr);
+    PumpPending();
+
+    HTREEITEM target = tree.m_hPathTarget;
+    ASSERT_NE(target, nullptr);
+    EXPECT_TRUE(SameText(tree.FolderPathOf(target), b));
+    EXPECT_EQ(tree.GetSelectedItem(), target);
+    EXPECT_EQ(tree.GetDropHilightItem(), target) << "highlighted while the focus is elsewhere";
+    EXPECT_EQ(ended, std::vector<bool>{true});
+    EXPECT_EQ(shown, 0) << "the grid keeps what it shows";
+    EXPECT_EQ(DwgList.GetSize(), 2);
+    EXPECT_EQ(doc.m_strShellPath, tree.GetLabelPath(target)) << "the label path as the tree spells it";
+    EXPECT_TRUE(tree.IsWindowVisible());
+    EXPECT_EQ(::GetFocus(), tree.m_hWnd);
+    EXPECT_NE(tree.GetImageList(TVSIL_NORMAL), nullptr) << "the shell's icons";
+    EXPECT_TRUE(tree.GetItemState(target, TVIS_EXPANDED) & TVIS_EXPANDED) << "opened after the walk";
+    EXPECT_NE(ChildNamed(tree, target, "c"), nullptr);
+
+    // From then on a selection is followed.
+    ASSERT_TRUE(tree.SelectItem(tree.GetParentItem(target)));
+    PumpPending();
+    EXPECT_EQ(shown, 1);
+    EXPECT_TRUE(SameText(doc.m_strPath, a)) << doc.m_strPath;
+}
+
+TEST_F(ShellTree, AWalkToAnotherFolderThanTheGridShowsScansTheFolderReached) {
+    // Settings whose label path names another folder than their folder path: the tree's folder wins, as
+    // it did when the tree was walked first.
+    CTessel3Doc doc(folder.File("Orvex1.ini"));
+    ASSERT_EQ(ScanFolderPath(a.c_str(), ".dwg"), 1);
+    doc.m_strPath = a;
+    doc.m_strShellPath = StartShellPathOf(b + "\\");
+    CountingTree tree;
+    tree.SetDocument(&doc);
+    std::vector<std::string> shown;
+    tree.onFolderShown = [&](const std::string& path, const std::string&) { shown.push_back(path); };
+    ASSERT_TRUE(tree.Create(kTreeStyle, CRect(0, 0, 600, 700), &parent, 1));
+    tree.FollowSelection(false);
+    tree.PopulateTree(nullptr, 0);
+    tree.WalkToStartLater();
+    PumpPending();
+    ASSERT_NE(tree.m_hPathTarget, nullptr);
+    EXPECT_EQ(tree.GetSelectedItem(), tree.m_hPathTarget);
+    ASSERT_EQ(shown.size(), 1u);
+    EXPECT_TRUE(SameText(shown[0], b)) << shown[0];
+    EXPECT_TRUE(SameText(doc.m_strPath, b)) << doc.m_strPath;
+    EXPECT_EQ(DwgList.GetSize(), 2);
+}
+
+TEST_F(ShellTree, AWalkThatDoesNotGetThereSelectsNothingAndSaysSo) {
+    CTessel3Doc doc(folder.File("Orvex1.ini"));
+    doc.m_strPath = b;
+    std::string shellPath = StartShellPathOf(b + "\\");
+    shellPath.insert(shellPath.rfind('\\'), "\\missing");
+    doc.m_strShellPath = shellPath;
+    CountingTree tree;
+    tree.SetDocument(&doc);
+    int shown = 0;
+    std::vector<bool> ended;
+    tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
+    tree.onWalkEnded = [&](bool reached) { ended.push_back(reached); };
+    ASSERT_TRUE(tree.Create(kTreeStyle & ~WS_VISIBLE, CRect(0, 0, 600, 700), &parent, 1));
+    tree.FollowSelection(false);
+    tree.PopulateTree(nullptr, 0);
+    tree.WalkToStartLater();
+    PumpPending();
+    EXPECT_EQ(tree.m_hPathTarget, nullptr);
+    EXPECT_EQ(tree.GetSelectedItem(), nullptr);
+    EXPECT_EQ(ended, std::vector<bool>{false});
+    EXPECT_EQ(shown, 0);
+    EXPECT_TRUE(tree.IsWindowVisible()) << "the tree shows how far it got";
+    HTREEITEM aNode = tree.GetRootItem();
+    EXPECT_TRUE(tree.GetItemState(aNode, TVIS_EXPANDED) & TVIS_EXPANDED);
+}
+
 } // namespace
