@@ -6,6 +6,7 @@
 #include "thumbs/DwgList.h"
 
 #include <algorithm>
+#include <utility>
 
 namespace {
 
@@ -410,6 +411,13 @@ void CTessel3View::Layout() {
         m_pool.push_back(std::make_unique<exCDwgThumbnail>());
     int top = m_ptOrigin.y;
     for (int row = m_nFirstRow; row < m_nFirstRow + m_nPoolRows; ++row) {
+        // A row wholly below the client area is made once the grid has drawn: a first step finds it made.
+        if (row > m_nFirstRow && top >= clientHeight) {
+            if (!m_bRowsPending && PostMessage(WM_ORVEX_MORE_ROWS))
+                m_bRowsPending = true;
+            if (m_bRowsPending)
+                break;
+        }
         CreateRow(row, top);
         top += g.RowPitch();
     }
@@ -495,6 +503,22 @@ void CTessel3View::DrawSheet(CDC& dc) {
 }
 
 void CTessel3View::CreateRow(int row, int rowTop) {
+    PlaceRow(row, rowTop, false);
+    SetFocus();
+}
+
+void CTessel3View::CreatePendingRows() {
+    // Rows are laid out from the first row at the top with nothing scrolled sideways (after a layout and
+    // after each row step); otherwise a step makes what it needs.
+    if (!std::exchange(m_bRowsPending, false) || m_nCount == 0 || GetScrollPosition().x != 0)
+        return;
+    const int pitch = Geometry().RowPitch();
+    int top = m_ptOrigin.y;
+    for (int row = m_nFirstRow; row < m_nFirstRow + m_nPoolRows; ++row, top += pitch)
+        PlaceRow(row, top, true);
+}
+
+void CTessel3View::PlaceRow(int row, int rowTop, bool onlyMissing) {
     const int poolSize = PoolSize();
     if (row < 0 || poolSize == 0)
         return;
@@ -503,6 +527,8 @@ void CTessel3View::CreateRow(int row, int rowTop) {
     for (int column = 0; column < m_nColumns; ++column) {
         const grid::Cell cell = grid::CellOf(g, m_nColumns, poolSize, row, column, rowTop);
         exCDwgThumbnail& control = PoolControl(cell.slot);
+        if (onlyMissing && control.m_hWnd)
+            continue;
         // The cell in the view's coordinates; the controls sit on the sheet.
         CRect rect(cell.left, cell.top, cell.right, cell.bottom);
         rect.OffsetRect(-sheet.x, -sheet.y);
@@ -514,7 +540,6 @@ void CTessel3View::CreateRow(int row, int rowTop) {
         if (cell.index < m_nCount)
             control.Create(DwgList[cell.index].m_strName, cell.index, nullptr, WS_CHILD, rect, this, 0);
     }
-    SetFocus();
 }
 
 void CTessel3View::Refit(bool resizeFrame) {
@@ -757,6 +782,9 @@ LRESULT CTessel3View::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
     switch (message) {
     case WM_ORVEX_REFRESH:
         Refresh();
+        return 0;
+    case WM_ORVEX_MORE_ROWS:
+        CreatePendingRows();
         return 0;
     case WM_PRINTCLIENT: {
         // Drawing into a given DC (screenshots, print-window): the background and the rename edge.

@@ -168,6 +168,10 @@ private:
     void Refit(bool resizeFrame);
     void Relayout();
     void CreateRow(int row, int rowTop);
+    // Binds or creates the windows of a row's cells (onlyMissing: only of cells whose control has none).
+    void PlaceRow(int row, int rowTop, bool onlyMissing);
+    // The pool rows Layout left for later (wholly below the client area), made once the grid has drawn.
+    void CreatePendingRows();
     // Creates the sheet, or places it afresh: a margin above and below the client area.
     void PlaceSheet();
     // Moves the sheet back when a step has left part of the client area uncovered.
@@ -199,6 +203,7 @@ private:
     int m_nRows = 0;
     int m_nVisibleRows = 0;
     bool m_bAligning = false;
+    bool m_bRowsPending = false; // WM_ORVEX_MORE_ROWS is posted and not handled yet
     int m_nTotalHeight = 0; // capped scroll height of the last layout
     int m_nTotalWidth = 0;  // width of the grid's columns in the last layout
     CGridSheet m_wndSheet{*this};

@@ -285,6 +285,50 @@ TEST(GridScroll, ALongScrollKeepsEveryRowInPlaceAndTheScreenAsARepaintDrawsIt) {
     EXPECT_EQ(ClientPixels(view), atTop);
 }
 
+// The rows wholly below the client area are not needed for the first paint: they are made once the messages
+// queued by then are handled, in their cells, and the first step down shows them as a repaint would.
+TEST(GridScroll, RowsBelowTheClientAreaAreMadeAfterTheFirstPaintInTheirCells) {
+    GridBench bench(1000, 600);
+    FillList(300);
+    CTessel3View& view = bench.view();
+    view.Rebuild();
+    const int pitch = RowPitch(view);
+    const int columns = view.GetColumns();
+    const int clientHeight = view.GetClientRect().Height();
+    const int touching = (clientHeight + pitch - 1) / pitch;
+    ASSERT_LT(touching, view.GetPoolRows()) << "a pool row lies wholly below the client area";
+    EXPECT_EQ(LiveThumbnails(view.m_hWnd), touching * columns) << "before the queued messages";
+    for (int index = touching * columns; index < view.GetPoolRows() * columns; ++index)
+        EXPECT_EQ(view.ControlOf(index), nullptr) << index;
+    Pump();
+    EXPECT_EQ(LiveThumbnails(view.m_hWnd), view.GetPoolRows() * columns);
+    ExpectControlsShowTheirDrawings(view, 0);
+    for (int index = 0; index < view.GetPoolRows() * columns; ++index) {
+        exCDwgThumbnail* control = view.ControlOf(index);
+        ASSERT_NE(control, nullptr) << index;
+        EXPECT_EQ(RectInView(control->m_hWnd, view.m_hWnd).top, index / columns * pitch) << index;
+        EXPECT_TRUE(control->Label().IsWindowVisible()) << index;
+    }
+    for (int step = 1; step <= 3; ++step) {
+        view.SetFocus();
+        PressKey(VK_DOWN);
+        ASSERT_EQ(view.GetFirstRow(), step);
+        ExpectFirstRowAtTop(view);
+        ExpectControlsShowTheirDrawings(view, step);
+        ASSERT_EQ(DiffersFromARepaint(view), 0) << "step " << step;
+    }
+
+    // A layout made again before the message came (a resize) leaves the same rows for it.
+    view.Rebuild();
+    CRect frame;
+    ::GetWindowRect(::GetAncestor(view.m_hWnd, GA_ROOT), &frame);
+    ::SetWindowPos(::GetAncestor(view.m_hWnd, GA_ROOT), nullptr, 0, 0, frame.Width(), frame.Height() + pitch,
+                   SWP_NOMOVE | SWP_NOZORDER | SWP_NOACTIVATE);
+    Pump();
+    EXPECT_EQ(LiveThumbnails(view.m_hWnd), view.GetPoolRows() * columns);
+    ExpectControlsShowTheirDrawings(view, 4);
+}
+
 TEST(GridScroll, EndHomePageDownPageUp) {
     GridBench bench(700, 600);
     FillList(900); // 300 rows: beyond the capped range
