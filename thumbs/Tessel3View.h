@@ -204,8 +204,8 @@ private:
     int m_nVisibleRows = 0;
     bool m_bAligning = false;
     bool m_bRowsPending = false; // WM_ORVEX_MORE_ROWS is posted and not handled yet
-    int m_nTotalHeight = 0; // capped scroll height of the last layout
-    int m_nTotalWidth = 0;  // width of the grid's columns in the last layout
+    int m_nTotalHeight = 0;      // capped scroll height of the last layout
+    int m_nTotalWidth = 0;       // width of the grid's columns in the last layout
     CGridSheet m_wndSheet{*this};
     // The controls live on the heap: resizing the pool never moves or copies a live window.
     std::vector<std::unique_ptr<exCDwgThumbnail>> m_pool;

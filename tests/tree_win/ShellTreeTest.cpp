@@ -93,6 +93,15 @@ protected:
         tree.ExpandToLabelPath(StartShellPathOf(dir + "\\"));
         PumpPending();
     }
+    // The tree as the explorer opens it: created (hidden until its walk), the Desktop in it, selections not
+    // followed, then the walk to the document's start folder on the messages it is posted.
+    void WalkAsTheExplorerDoes(CountingTree& tree, bool hidden) {
+        ASSERT_TRUE(
+            tree.Create(hidden ? kTreeStyle & ~WS_VISIBLE : kTreeStyle, CRect(0, 0, 600, 700), &parent, 1));
+        tree.FollowSelection(false);
+        tree.PopulateTree(nullptr, 0);
+        tree.WalkToStartLater();
+    }
     HTREEITEM ChildNamed(CShellTreeCtrl& tree, HTREEITEM node, const std::string& label) {
         for (HTREEITEM child = tree.GetChildItem(node); child; child = tree.GetNextSiblingItem(child))
             if (SameText(tree.GetItemText(child), label))
@@ -395,10 +404,7 @@ TEST_F(ShellTree, TheWalkToTheStartFolderSelectsItWithoutScanningWhatTheGridShow
     std::vector<bool> ended;
     tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
     tree.onWalkEnded = [&](bool reached) { ended.push_back(reached); };
-    ASSERT_TRUE(tree.Create(kTreeStyle & ~WS_VISIBLE, CRect(0, 0, 600, 700), &parent, 1));
-    tree.FollowSelection(false);
-    tree.PopulateTree(nullptr, 0);
-    tree.WalkToStartLater();
+    WalkAsTheExplorerDoes(tree, true);
     EXPECT_EQ(tree.GetSelectedItem(), nullptr) << "nothing happens before the queued messages";
     EXPECT_EQ(tree.m_hPathTarget, nullptr);
     PumpPending();
@@ -436,10 +442,7 @@ TEST_F(ShellTree, AWalkToAnotherFolderThanTheGridShowsScansTheFolderReached) {
     tree.SetDocument(&doc);
     std::vector<std::string> shown;
     tree.onFolderShown = [&](const std::string& path, const std::string&) { shown.push_back(path); };
-    ASSERT_TRUE(tree.Create(kTreeStyle, CRect(0, 0, 600, 700), &parent, 1));
-    tree.FollowSelection(false);
-    tree.PopulateTree(nullptr, 0);
-    tree.WalkToStartLater();
+    WalkAsTheExplorerDoes(tree, false);
     PumpPending();
     ASSERT_NE(tree.m_hPathTarget, nullptr);
     EXPECT_EQ(tree.GetSelectedItem(), tree.m_hPathTarget);
@@ -461,10 +464,7 @@ TEST_F(ShellTree, AWalkThatDoesNotGetThereSelectsNothingAndSaysSo) {
     std::vector<bool> ended;
     tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
     tree.onWalkEnded = [&](bool reached) { ended.push_back(reached); };
-    ASSERT_TRUE(tree.Create(kTreeStyle & ~WS_VISIBLE, CRect(0, 0, 600, 700), &parent, 1));
-    tree.FollowSelection(false);
-    tree.PopulateTree(nullptr, 0);
-    tree.WalkToStartLater();
+    WalkAsTheExplorerDoes(tree, true);
     PumpPending();
     EXPECT_EQ(tree.m_hPathTarget, nullptr);
     EXPECT_EQ(tree.GetSelectedItem(), nullptr);
