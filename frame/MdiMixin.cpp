@@ -145,8 +145,7 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     m_pMainWnd = dialog;
     frame->InitialUpdateFrame(doc, false);
     // The folder tree walks to the start folder once the grid has drawn its pictures (step 9); until then
-    // it is hidden, the grid shows the start folder by its path and has the keyboard (a tree control given
-    // the focus selects its first item on its own).
+    // it is hidden, and the grid shows the start folder by its path.
     CChildView* tree = frame->GetFolderTree();
     if (tree)
         tree->ShowWindow(SW_HIDE);
@@ -165,9 +164,12 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
         frame->ShowWindow(SW_SHOWNORMAL);
     }
 
-    // 7. The start folder is scanned and laid out at the size the frame is shown at, and drawn. Nothing is
+    // 7. The start folder is scanned and laid out at the size the frame is shown at. The keyboard starts in
+    // the tree (which selects nothing of its own before its walk); then the frame is drawn. Nothing is
     // chosen yet.
     const std::string scanProblem = ShowStartFolder(*frame, *doc, call.startPath);
+    if (tree)
+        tree->SetFocus();
     frame->UpdateWindow();
     frame->EnablePick(false);
 
@@ -186,8 +188,8 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     if (!scanProblem.empty())
         frame->SetMessageText(scanProblem);
 
-    // 9. The pictures are up: the tree walks to the start folder (the frame puts the keyboard in the grid
-    // when it does not get there), then opens it to show its sub-folders.
+    // 9. The pictures are up: the tree walks to the start folder, then opens it to show its sub-folders.
+    // When it does not get there, the keyboard goes to the grid.
     if (tree)
         tree->WalkToStartLater();
     return true;

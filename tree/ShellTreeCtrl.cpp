@@ -362,14 +362,14 @@ void CShellTreeCtrl::WalkToStart() {
             HighlightSelected(target);
         }
         EnsureVisible(target); // sideways too: a deep folder in a narrow pane
+    } else {
+        SelectItem(nullptr); // the item the control chose when it got the focus, if it did
     }
     FollowSelection(true);
     SendMessage(WM_SETREDRAW, TRUE);
     Invalidate();
-    if (target) {
-        SetFocus();
+    if (target)
         OpenPathTargetLater();
-    }
     if (onWalkEnded)
         onWalkEnded(target != nullptr);
 }

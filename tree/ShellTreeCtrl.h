@@ -66,11 +66,11 @@ public:
     // The walk the explorer makes when it opens, once the messages queued now have been handled: the grid
     // shows the start folder by its path first, and the tree follows. Expands the nodes along the
     // document's label path and selects the node reached; its folder is scanned only when it is not the
-    // document's folder already (then the grid keeps what it shows). The tree is shown (the explorer
-    // hides it until then: a tree drawn before it has walked would show the Desktop alone and ask the
-    // shell for icons the first pictures need not wait for), takes the focus when a node was reached, and
-    // opens that node (OpenPathTargetLater). Selections are followed from then on. onWalkEnded says how
-    // it went.
+    // document's folder already (then the grid keeps what it shows); when none is reached, nothing stays
+    // selected. The tree is shown (the explorer hides it until then: a tree drawn before it has walked
+    // would show the Desktop alone and ask the shell for icons the first pictures need not wait for) and
+    // opens the node reached (OpenPathTargetLater). The focus stays where it is. Selections are followed
+    // from then on. onWalkEnded says how it went.
     void WalkToStartLater();
     // The file-system path of a node, or empty for a virtual folder and for the Desktop at the top.
     std::string FolderPathOf(HTREEITEM item) const;

@@ -10,6 +10,7 @@
 #include "tests/support/TempFolder.h"
 #include "thumbs/AppMessages.h"
 #include "thumbs/Tessel3View.h"
+#include "tree/LeftView.h"
 #include "tree/StartShellPath.h"
 
 #include "res/resource.h"
@@ -37,7 +38,8 @@ constexpr INT_PTR kTimedOut = -77;
 // The run dialog of the tests: like the library's, plus a script of steps and a watchdog.
 class RunDialog : public CDialog {
 public:
-    RunDialog() : CDialog(IDD_DIALOG_RUN, nullptr) {}
+    // Shown without activation, as the library's: the explorer's frame keeps the keyboard.
+    RunDialog() : CDialog(IDD_DIALOG_RUN, nullptr) { m_nShowCommand = SW_SHOWNA; }
     ~RunDialog() override {
         if (g_app.m_pMainWnd == this)
             g_app.m_pMainWnd = nullptr;
@@ -62,7 +64,7 @@ public:
         ::MoveWindow(m_hWnd, 0, 0, 0, 0, TRUE);
         SetTimer(kWatchdog, 15000);
         PostMessage(WM_TEST_STEP, 0);
-        return true;
+        return false; // as the library's run dialog: the explorer has placed the keyboard focus
     }
 
     bool PreTranslateMessage(MSG* pMsg) override {
@@ -618,6 +620,46 @@ TEST_F(ExplorerFrame, SavedDrawingIsChosenAgainAndTheAcceptButtonTakesIt) {
     ASSERT_NE(g_pTessel3Doc, nullptr);
     EXPECT_EQ(g_pTessel3Doc->m_strName, "plan.dwg");
     RemoveFolder(folder, files);
+}
+
+// The keyboard starts in the folder tree, on the start folder the tree walked to, also when the grid has
+// scrolled to the saved drawing (it lays rows out with the focus, and gives it back).
+TEST_F(ExplorerFrame, TheKeyboardStartsInTheTreeAlsoWhenTheGridScrollsToTheSavedDrawing) {
+    const std::string folder = TempFolder("orvex-frame-focus");
+    std::vector<std::string> names;
+    for (int i = 0; i < 200; ++i) {
+        char name[32];
+        std::snprintf(name, sizeof name, "d%03d.dwg", i);
+        names.push_back(name);
+        std::ofstream(folder + "\\" + name, std::ios::binary) << "";
+    }
+    for (const std::string& saved : {std::string(), std::string("d199.dwg")}) {
+        SCOPED_TRACE(saved.empty() ? "no saved drawing" : saved);
+        WriteSettings("[CurrentPath]\r\nPath=" + folder + "\r\nName=" + saved + "\r\n");
+        RunDialog dialog;
+        HWND focus = nullptr, tree = nullptr;
+        int firstRow = -1;
+        std::string selected;
+        dialog.steps.push_back([&](CMainFrame& frame) {
+            focus = ::GetFocus();
+            firstRow = frame.GetGridView()->GetFirstRow();
+            ASSERT_NE(frame.GetFolderTree(), nullptr);
+            tree = frame.GetFolderTree()->m_hWnd;
+            selected = frame.GetFolderTree()->FolderPathOf(frame.GetFolderTree()->GetSelectedItem());
+            frame.PostMessage(WM_CLOSE);
+        });
+        Run(dialog);
+        EXPECT_EQ(lstrcmpiA(selected.c_str(), folder.c_str()), 0) << selected;
+        EXPECT_EQ(focus, tree);
+        if (saved.empty())
+            EXPECT_EQ(firstRow, 0);
+        else
+            EXPECT_GT(firstRow, 0) << "the grid scrolled to the saved drawing";
+        DestroyDocument();
+    }
+    for (const std::string& name : names)
+        std::remove((folder + "\\" + name).c_str());
+    ::RemoveDirectoryA(folder.c_str());
 }
 
 TEST_F(ExplorerFrame, SavedDrawingStaysChosenForTheAcceptMessage) {
