@@ -93,6 +93,15 @@ protected:
         tree.ExpandToLabelPath(StartShellPathOf(dir + "\\"));
         PumpPending();
     }
+    // What a walk told its owner: folders shown (scanned) and how the walk ended.
+    struct WalkRecord {
+        int shown = 0;
+        std::vector<bool> ended;
+    };
+    static void Watch(CountingTree& tree, WalkRecord& record) {
+        tree.onFolderShown = [&record](const std::string&, const std::string&) { ++record.shown; };
+        tree.onWalkEnded = [&record](bool reached) { record.ended.push_back(reached); };
+    }
     // The tree as the explorer opens it: created (hidden until its walk), the Desktop in it, selections not
     // followed, then the walk to the document's start folder on the messages it is posted.
     void WalkAsTheExplorerDoes(CountingTree& tree, bool hidden) {
@@ -400,10 +409,8 @@ TEST_F(ShellTree, TheWalkToTheStartFolderSelectsItWithoutScanningWhatTheGridShow
     testsupport::WriteBytes(b + "\\three.dwg", "AC1018"); // a rescan would list it
     CountingTree tree;
     tree.SetDocument(&doc);
-    int shown = 0;
-    std::vector<bool> ended;
-    tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
-    tree.onWalkEnded = [&](bool reached) { ended.push_back(reached); };
+    WalkRecord seen;
+    Watch(tree, seen);
     WalkAsTheExplorerDoes(tree, true);
     parent.SetFocus();
     EXPECT_EQ(tree.GetSelectedItem(), nullptr) << "nothing happens before the queued messages";
@@ -415,8 +422,8 @@ TEST_F(ShellTree, TheWalkToTheStartFolderSelectsItWithoutScanningWhatTheGridShow
     EXPECT_TRUE(SameText(tree.FolderPathOf(target), b));
     EXPECT_EQ(tree.GetSelectedItem(), target);
     EXPECT_EQ(tree.GetDropHilightItem(), target) << "highlighted while the focus is elsewhere";
-    EXPECT_EQ(ended, std::vector<bool>{true});
-    EXPECT_EQ(shown, 0) << "the grid keeps what it shows";
+    EXPECT_EQ(seen.ended, std::vector<bool>{true});
+    EXPECT_EQ(seen.shown, 0) << "the grid keeps what it shows";
     EXPECT_EQ(DwgList.GetSize(), 2);
     EXPECT_EQ(doc.m_strShellPath, tree.GetLabelPath(target)) << "the label path as the tree spells it";
     EXPECT_TRUE(tree.IsWindowVisible());
@@ -428,7 +435,7 @@ TEST_F(ShellTree, TheWalkToTheStartFolderSelectsItWithoutScanningWhatTheGridShow
     // From then on a selection is followed.
     ASSERT_TRUE(tree.SelectItem(tree.GetParentItem(target)));
     PumpPending();
-    EXPECT_EQ(shown, 1);
+    EXPECT_EQ(seen.shown, 1);
     EXPECT_TRUE(SameText(doc.m_strPath, a)) << doc.m_strPath;
 }
 
@@ -461,17 +468,15 @@ TEST_F(ShellTree, AWalkThatDoesNotGetThereSelectsNothingAndSaysSo) {
     doc.m_strShellPath = shellPath;
     CountingTree tree;
     tree.SetDocument(&doc);
-    int shown = 0;
-    std::vector<bool> ended;
-    tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
-    tree.onWalkEnded = [&](bool reached) { ended.push_back(reached); };
+    WalkRecord seen;
+    Watch(tree, seen);
     WalkAsTheExplorerDoes(tree, true);
     tree.SetFocus(); // as the explorer gives it: the control may select its first item on its own
     PumpPending();
     EXPECT_EQ(tree.m_hPathTarget, nullptr);
     EXPECT_EQ(tree.GetSelectedItem(), nullptr);
-    EXPECT_EQ(ended, std::vector<bool>{false});
-    EXPECT_EQ(shown, 0);
+    EXPECT_EQ(seen.ended, std::vector<bool>{false});
+    EXPECT_EQ(seen.shown, 0);
     EXPECT_TRUE(tree.IsWindowVisible()) << "the tree shows how far it got";
     HTREEITEM aNode = tree.GetRootItem();
     EXPECT_TRUE(tree.GetItemState(aNode, TVIS_EXPANDED) & TVIS_EXPANDED);
