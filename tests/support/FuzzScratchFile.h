@@ -3,6 +3,8 @@
 // built natively).
 #pragma once
 
+#include "tests/support/FileBytes.h"
+
 #include <unistd.h>
 
 #include <cstddef>
@@ -41,14 +43,8 @@ inline void WriteScratchBytes(const std::string& fileName, const void* data, std
 // The file's bytes; aborts when it cannot be opened.
 inline std::string ReadScratchBytes(const std::string& fileName) {
     std::string bytes;
-    std::FILE* file = std::fopen(fileName.c_str(), "rb");
-    if (!file)
+    if (!ReadFileBytes(fileName, bytes))
         std::abort();
-    char buffer[4096];
-    std::size_t n;
-    while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0)
-        bytes.append(buffer, n);
-    std::fclose(file);
     return bytes;
 }
 

@@ -1,5 +1,7 @@
 #include "tests/support/TempFolder.h"
 
+#include "tests/support/FileBytes.h"
+
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -83,15 +85,7 @@ void WriteBytes(const std::string& fileName, const std::string& bytes) {
 
 std::string ReadBytes(const std::string& fileName) {
     std::string bytes;
-    std::FILE* file = std::fopen(fileName.c_str(), "rb");
-    if (!file)
-        return "<missing>";
-    char buffer[4096];
-    std::size_t n;
-    while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0)
-        bytes.append(buffer, n);
-    std::fclose(file);
-    return bytes;
+    return ReadFileBytes(fileName, bytes) ? bytes : "<missing>";
 }
 
 bool FileExists(const std::string& fileName) {
