@@ -2,7 +2,13 @@
 # Builds everything and runs every test: native unit tests (under ASan and UBSan), a short run of each
 # fuzz target, and the Windows tests and end-to-end tests under Wine. Installs what is missing first.
 set -uo pipefail
-cd "$(dirname "$0")"
+cd "$(dirname "$0")" || exit 1
+# The wine server and the Xvfb the Windows tests start end with this script, however it ends: all steps
+# done, a step failed, Ctrl+C or a kill. An interrupt ends the script (status 130 or 143) instead of going
+# on with the next step.
+trap 'tools/wine-stop' EXIT
+trap 'echo; echo "test.sh: interrupted" >&2; exit 130' INT
+trap 'exit 143' TERM
 tools/ensure-packages || exit 1
 FUZZ_SECONDS=${FUZZ_SECONDS:-15}
 summary=()
@@ -27,17 +33,23 @@ fi
 step "fuzz targets (${FUZZ_SECONDS}s each)"
 fuzz_rc=0; fuzz_n=0; fuzz_bad=0
 if cmake --preset fuzz >/dev/null && cmake --build --preset fuzz --target orvex_fuzz_all; then
-  for t in $(cat build/fuzz/fuzz-targets.txt 2>/dev/null); do
-    corpus=tests/fuzz/corpus/$(basename "$t")
-    dict=tests/fuzz/dict/$(basename "$t").dict
-    work=build/fuzz/corpus/$(basename "$t"); mkdir -p "$work"
+  targets=()
+  [ -f build/fuzz/fuzz-targets.txt ] && mapfile -t targets <build/fuzz/fuzz-targets.txt
+  for t in "${targets[@]}"; do
+    [ -n "$t" ] || continue
+    name=$(basename "$t")
+    corpus=tests/fuzz/corpus/$name
+    dict=tests/fuzz/dict/$name.dict
+    work=build/fuzz/corpus/$name; mkdir -p "$work"
+    options=(-max_total_time="$FUZZ_SECONDS" -rss_limit_mb=2048)
+    [ -f "$dict" ] && options+=("-dict=$dict")
+    folders=("$work")
+    [ -d "$corpus" ] && folders+=("$corpus")
     fuzz_n=$((fuzz_n + 1))
-    if "$t" -max_total_time="$FUZZ_SECONDS" -rss_limit_mb=2048 $( [ -f "$dict" ] && echo "-dict=$dict" ) \
-        "$work" $( [ -d "$corpus" ] && echo "$corpus" ) \
-        >"build/fuzz/$(basename "$t").log" 2>&1; then
-      echo "fuzz $(basename "$t"): ok"
+    if "$t" "${options[@]}" "${folders[@]}" >"build/fuzz/$name.log" 2>&1; then
+      echo "fuzz $name: ok"
     else
-      echo "fuzz $(basename "$t"): FAILED"; tail -30 "build/fuzz/$(basename "$t").log"; fuzz_bad=$((fuzz_bad + 1)); fuzz_rc=1
+      echo "fuzz $name: FAILED"; tail -30 "build/fuzz/$name.log"; fuzz_bad=$((fuzz_bad + 1)); fuzz_rc=1
     fi
   done
 else
@@ -52,7 +64,6 @@ if cmake --preset windows >/dev/null && cmake --build --preset windows; then
 else
   record windows 1
 fi
-tools/wine-stop
 
 step "summary"
 printf '%s\n' "${summary[@]}"
