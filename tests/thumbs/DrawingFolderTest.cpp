@@ -1,0 +1,227 @@
+#include "thumbs/DrawingFolder.h"
+
+#include "settings/Tessel3Doc.h"
+
+#include <gtest/gtest.h>
+
+#include <map>
+#include <string>
+#include <vector>
+
+namespace {
+
+// Folders held in memory: what each lists, and where the current directory went.
+struct MemoryReader : FolderReader {
+    std::map<std::string, std::vector<DwgData>> folders;
+    std::map<std::string, std::string> problems;
+    std::vector<std::string> reads;
+    std::vector<std::string> currentDirectories;
+
+    bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem) override {
+        reads.push_back(folder);
+        if (auto said = problems.find(folder); said != problems.end())
+            problem = said->second;
+        const auto found = folders.find(folder);
+        if (found == folders.end())
+            return false;
+        drawings = found->second;
+        return true;
+    }
+    void MakeCurrentDirectory(const std::string& folder) override { currentDirectories.push_back(folder); }
+};
+
+DwgData Drawing(const std::string& name, std::int64_t time = 0, std::uint32_t size = 0) {
+    DwgFindEntry entry;
+    entry.name = name;
+    entry.timeWrite = time;
+    entry.size = size;
+    return DwgData(entry);
+}
+
+class DrawingFolderTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        reader.folders["C:\\dwg"] = {Drawing("c.dwg", 3, 30), Drawing("a.dwg", 1, 10),
+                                     Drawing("b.dwg", 2, 20)};
+        reader.folders["C:\\"] = {Drawing("root.dwg")};
+        reader.folders["\\\\server\\share\\dir"] = {Drawing("net.dwg")};
+        folder.onShown = [this] { ++shown; };
+        folder.onChosen = [this] { ++chosen; };
+    }
+    void TearDown() override { BeginScan(); }
+
+    MemoryReader reader;
+    CTessel3Doc doc{std::string()};
+    DrawingFolder folder{reader, &doc};
+    int shown = 0;
+    int chosen = 0;
+};
+
+} // namespace
+
+TEST(DrawingFolderSpelling, AFolderHasNoSeparatorAtItsEndWithOrWithoutOneGiven) {
+    EXPECT_EQ(DrawingFolder::Spelling("C:\\dwg"), "C:\\dwg");
+    EXPECT_EQ(DrawingFolder::Spelling("C:\\dwg\\"), "C:\\dwg");
+    EXPECT_EQ(DrawingFolder::Spelling("C:\\dwg\\\\"), "C:\\dwg");
+    EXPECT_EQ(DrawingFolder::Spelling("C:/dwg/doors/"), "C:/dwg/doors");
+}
+
+TEST(DrawingFolderSpelling, ADriveRootKeepsItsSeparator) {
+    EXPECT_EQ(DrawingFolder::Spelling("C:\\"), "C:\\");
+    EXPECT_EQ(DrawingFolder::Spelling("C:"), "C:\\");
+    EXPECT_EQ(DrawingFolder::Spelling("C:\\\\"), "C:\\");
+    EXPECT_EQ(DrawingFolder::Spelling("z:/"), "z:/");
+}
+
+TEST(DrawingFolderSpelling, ANetworkShareIsSpelledLikeAFolderAndItsRootKeepsItsSeparator) {
+    EXPECT_EQ(DrawingFolder::Spelling("\\\\server\\share\\dir"), "\\\\server\\share\\dir");
+    EXPECT_EQ(DrawingFolder::Spelling("\\\\server\\share\\dir\\"), "\\\\server\\share\\dir");
+    EXPECT_EQ(DrawingFolder::Spelling("\\\\server\\share"), "\\\\server\\share\\");
+    EXPECT_EQ(DrawingFolder::Spelling("\\\\server\\share\\"), "\\\\server\\share\\");
+    EXPECT_EQ(DrawingFolder::Spelling(""), "");
+}
+
+TEST(DrawingFolderJoin, AFolderAndANameMakeOnePathWithOneSeparator) {
+    EXPECT_EQ(DrawingFolder::Join("C:\\dwg", "a.dwg"), "C:\\dwg\\a.dwg");
+    EXPECT_EQ(DrawingFolder::Join("C:\\", "a.dwg"), "C:\\a.dwg");
+    EXPECT_EQ(DrawingFolder::Join("\\\\server\\share\\", "a.dwg"), "\\\\server\\share\\a.dwg");
+    EXPECT_EQ(DrawingFolder::Join("\\\\server\\share\\dir", "a.dwg"), "\\\\server\\share\\dir\\a.dwg");
+}
+
+TEST_F(DrawingFolderTest, ShowReadsTheFolderInItsOneSpellingAndMakesItCurrentAndTheDocuments) {
+    EXPECT_TRUE(folder.Show("C:\\dwg\\"));
+    EXPECT_EQ(folder.Folder(), "C:\\dwg");
+    EXPECT_EQ(reader.reads, std::vector<std::string>{"C:\\dwg"});
+    EXPECT_EQ(reader.currentDirectories, std::vector<std::string>{"C:\\dwg"});
+    EXPECT_EQ(doc.m_strPath, "C:\\dwg");
+    ASSERT_EQ(folder.Count(), 3);
+    EXPECT_EQ(folder.Drawing(0).m_strName, "c.dwg"); // the file system's order until sorted
+    EXPECT_EQ(shown, 1);
+}
+
+TEST_F(DrawingFolderTest, ShowFillsTheOneListOfTheProcess) {
+    folder.Show("C:\\dwg");
+    ASSERT_EQ(DwgList.GetSize(), 3);
+    EXPECT_EQ(DwgList[1].m_strName, "a.dwg");
+}
+
+TEST_F(DrawingFolderTest, ADriveRootAndANetworkFolderAreShownAndJoinedRightly) {
+    folder.Show("C:");
+    EXPECT_EQ(folder.Folder(), "C:\\");
+    folder.Choose(0);
+    EXPECT_EQ(folder.ChosenPath(), "C:\\root.dwg");
+    folder.Show("\\\\server\\share\\dir\\");
+    EXPECT_EQ(folder.Folder(), "\\\\server\\share\\dir");
+    folder.Choose(0);
+    EXPECT_EQ(folder.ChosenPath(), "\\\\server\\share\\dir\\net.dwg");
+    EXPECT_EQ(doc.m_strPath, "\\\\server\\share\\dir");
+}
+
+TEST_F(DrawingFolderTest, AFolderThatCannotBeReadIsShownEmptyAndTheCurrentDirectoryStays) {
+    folder.Show("C:\\dwg");
+    reader.problems["C:\\gone"] = "The folder cannot be read";
+    EXPECT_FALSE(folder.Show("C:\\gone\\"));
+    EXPECT_EQ(folder.Folder(), "C:\\gone");
+    EXPECT_EQ(folder.Count(), 0);
+    EXPECT_EQ(folder.Problem(), "The folder cannot be read");
+    EXPECT_EQ(reader.currentDirectories, std::vector<std::string>{"C:\\dwg"});
+    EXPECT_EQ(doc.m_strPath, "C:\\gone"); // title, settings and list name one folder
+}
+
+TEST_F(DrawingFolderTest, RefreshReadsTheSameFolderAgainAndDropsTheChoice) {
+    folder.Show("C:\\dwg");
+    folder.Choose(1);
+    reader.folders["C:\\dwg"].push_back(Drawing("new.dwg"));
+    EXPECT_TRUE(folder.Refresh());
+    EXPECT_EQ(folder.Count(), 4);
+    EXPECT_EQ(folder.Chosen(), -1);
+    EXPECT_EQ(reader.reads.size(), 2u);
+}
+
+TEST_F(DrawingFolderTest, NoFolderEmptiesTheListAndKeepsTheFolderAndTheCurrentDirectory) {
+    folder.Show("C:\\dwg");
+    folder.ShowNoFolder();
+    EXPECT_EQ(folder.Count(), 0);
+    EXPECT_EQ(folder.Folder(), "C:\\dwg");
+    EXPECT_EQ(doc.m_strPath, "C:\\dwg");
+    EXPECT_EQ(reader.currentDirectories.size(), 1u);
+    EXPECT_EQ(shown, 2);
+}
+
+TEST_F(DrawingFolderTest, ChooseMakesTheDrawingTheOneAcceptReturnsAndTheDocumentsName) {
+    folder.Show("C:\\dwg");
+    folder.Choose(1);
+    EXPECT_EQ(folder.Chosen(), 1);
+    EXPECT_EQ(folder.ChosenName(), "a.dwg");
+    EXPECT_EQ(folder.ChosenPath(), "C:\\dwg\\a.dwg");
+    EXPECT_EQ(doc.m_strName, "a.dwg");
+    EXPECT_EQ(chosen, 1);
+    folder.ChooseNone();
+    EXPECT_EQ(folder.Chosen(), -1);
+    EXPECT_EQ(folder.ChosenPath(), "");
+    EXPECT_EQ(doc.m_strName, "");
+    EXPECT_EQ(chosen, 2);
+}
+
+TEST_F(DrawingFolderTest, ChoosingOutsideTheListChoosesNothing) {
+    folder.Show("C:\\dwg");
+    folder.Choose(1);
+    folder.Choose(3);
+    EXPECT_EQ(folder.Chosen(), -1);
+    EXPECT_EQ(folder.ChosenPath(), "");
+}
+
+TEST_F(DrawingFolderTest, ShowingAnotherFolderChoosesNothing) {
+    folder.Show("C:\\dwg");
+    folder.Choose(0);
+    folder.Show("C:\\");
+    EXPECT_EQ(folder.Chosen(), -1);
+    EXPECT_EQ(doc.m_strName, "");
+}
+
+TEST_F(DrawingFolderTest, TheChosenDrawingStaysChosenThroughASort) {
+    folder.Show("C:\\dwg");
+    folder.Choose(0); // c.dwg
+    folder.Sort(DwgSortByName);
+    EXPECT_EQ(folder.ChosenName(), "c.dwg");
+    EXPECT_EQ(folder.ChosenPath(), "C:\\dwg\\c.dwg");
+}
+
+TEST_F(DrawingFolderTest, SelectedPathsAreTheSelectedDrawingsInTheFolder) {
+    folder.Show("C:\\dwg");
+    folder.Select(0);
+    folder.Select(2);
+    EXPECT_EQ(folder.SelectedPaths(), (std::vector<std::string>{"C:\\dwg\\c.dwg", "C:\\dwg\\b.dwg"}));
+    EXPECT_TRUE(folder.AnySelected());
+    folder.DeselectAll();
+    EXPECT_FALSE(folder.AnySelected());
+    folder.SelectAll();
+    EXPECT_EQ(folder.SelectedPaths().size(), 3u);
+    folder.Deselect(1);
+    EXPECT_FALSE(folder.IsSelected(1));
+    EXPECT_FALSE(folder.IsSelected(7));
+}
+
+TEST_F(DrawingFolderTest, FindIgnoresCase) {
+    folder.Show("C:\\dwg");
+    EXPECT_EQ(folder.Find("A.DWG"), 1);
+    EXPECT_EQ(folder.Find("x.dwg"), -1);
+    EXPECT_EQ(folder.CountNamed("a.dwg"), 1);
+}
+
+TEST_F(DrawingFolderTest, TheSearchSelectsTheFirstMatchOnly) {
+    folder.Show("C:\\dwg");
+    folder.Select(0);
+    const DwgPrefixSearch found = folder.SelectFirstStartingWith("B");
+    EXPECT_TRUE(found.ran);
+    EXPECT_EQ(found.match, 2);
+    EXPECT_FALSE(folder.IsSelected(0));
+    EXPECT_TRUE(folder.IsSelected(2));
+}
+
+TEST_F(DrawingFolderTest, WithoutADocumentNothingIsKeptButTheFolderWorks) {
+    DrawingFolder alone(reader, nullptr);
+    EXPECT_TRUE(alone.Show("C:\\dwg\\"));
+    alone.Choose(2);
+    EXPECT_EQ(alone.ChosenPath(), "C:\\dwg\\b.dwg");
+}

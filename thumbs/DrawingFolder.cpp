@@ -1,0 +1,246 @@
+#include "thumbs/DrawingFolder.h"
+
+#include "settings/Tessel3Doc.h"
+#include "thumbs/NameFold.h"
+
+#include <utility>
+
+namespace {
+
+constexpr char kSeparator = '\\';
+constexpr char kOtherSeparator = '/';
+
+// The start of each character of text, in the names' code page: a lead byte and the byte after it are one
+// character, whatever that second byte looks like.
+std::vector<std::size_t> CharacterStarts(const std::string& text) {
+    const NameFoldTable& fold = NameFold();
+    std::vector<std::size_t> starts;
+    starts.reserve(text.size());
+    for (std::size_t i = 0; i < text.size();) {
+        starts.push_back(i);
+        const bool lead = fold.leadByte[static_cast<unsigned char>(text[i])];
+        i += lead && i + 1 < text.size() ? 2 : 1;
+    }
+    return starts;
+}
+
+// True when the character is a one-byte separator ("\" or "/").
+bool SeparatorAt(const std::string& text, const std::vector<std::size_t>& starts, std::size_t character) {
+    const std::size_t start = starts[character];
+    const std::size_t end = character + 1 < starts.size() ? starts[character + 1] : text.size();
+    return end - start == 1 && (text[start] == kSeparator || text[start] == kOtherSeparator);
+}
+
+bool EndsWithSeparator(const std::string& text) {
+    const std::vector<std::size_t> starts = CharacterStarts(text);
+    return !starts.empty() && SeparatorAt(text, starts, starts.size() - 1);
+}
+
+// "\\server\share" (a share's root, which keeps a separator at its end): two separators, a server name, a
+// separator, a share name and nothing more.
+bool IsShareRoot(const std::string& text, const std::vector<std::size_t>& starts) {
+    if (starts.size() < 5 || !SeparatorAt(text, starts, 0) || !SeparatorAt(text, starts, 1))
+        return false;
+    int separators = 0;
+    for (std::size_t c = 2; c < starts.size(); ++c) {
+        if (SeparatorAt(text, starts, c)) {
+            if (c == 2 || c + 1 == starts.size())
+                return false; // no server name, or no share name
+            ++separators;
+        }
+    }
+    return separators == 1;
+}
+
+} // namespace
+
+DrawingFolder::DrawingFolder(FolderReader& reader, CTessel3Doc* document)
+    : m_reader(reader), m_pDocument(document) {}
+
+std::string DrawingFolder::Spelling(const std::string& folder) {
+    std::string text = folder;
+    std::vector<std::size_t> starts = CharacterStarts(text);
+    // Separators at the end go, but for the one a root keeps.
+    while (starts.size() > 1 && SeparatorAt(text, starts, starts.size() - 1)) {
+        const bool driveRoot = starts.size() == 3 && text[1] == ':' && starts[2] == 2;
+        if (driveRoot)
+            break;
+        text.erase(starts.back());
+        starts.pop_back();
+    }
+    if (starts.size() == 2 && text.size() == 2 && text[1] == ':')
+        text += kSeparator; // "C:" is C's current folder elsewhere; here it names the drive's root
+    else if (IsShareRoot(text, starts))
+        text += kSeparator;
+    return text;
+}
+
+std::string DrawingFolder::Join(const std::string& folder, const std::string& name) {
+    if (folder.empty())
+        return name;
+    std::string path = folder;
+    if (!EndsWithSeparator(folder))
+        path += kSeparator;
+    return path + name;
+}
+
+// ---- the folder shown ----------------------------------------------------------------------------------
+
+bool DrawingFolder::Show(const std::string& folder) {
+    m_strFolder = Spelling(folder);
+    m_strProblem.clear();
+    std::vector<DwgData> drawings;
+    bool read = false;
+    if (!m_strFolder.empty()) {
+        // The reader refuses a path the runtime's buffers cannot hold before anything uses it.
+        read = m_reader.Read(m_strFolder, drawings, m_strProblem);
+        if (read)
+            m_reader.MakeCurrentDirectory(m_strFolder);
+    }
+    if (m_pDocument)
+        m_pDocument->m_strPath = m_strFolder;
+    Fill(std::move(drawings));
+    return read;
+}
+
+bool DrawingFolder::Refresh() {
+    if (m_strFolder.empty()) {
+        ShowNoFolder();
+        return false;
+    }
+    return Show(m_strFolder);
+}
+
+void DrawingFolder::ShowNoFolder() {
+    m_strProblem.clear();
+    Fill({});
+}
+
+void DrawingFolder::Fill(std::vector<DwgData>&& drawings) {
+    m_nChosen = -1;
+    if (m_pDocument)
+        m_pDocument->m_strName.clear();
+    BeginScan();
+    AppendScanRecords(std::move(drawings));
+    EndScan();
+    TellShown();
+}
+
+void DrawingFolder::TellShown() {
+    if (onShown)
+        onShown();
+}
+
+void DrawingFolder::TellChosen() {
+    if (onChosen)
+        onChosen();
+}
+
+// ---- the drawings --------------------------------------------------------------------------------------
+
+int DrawingFolder::Count() const {
+    return DwgList.GetSize();
+}
+
+const DwgData& DrawingFolder::Drawing(int index) const {
+    return static_cast<const CDwgArray&>(DwgList)[index];
+}
+
+std::string DrawingFolder::PathOf(int index) const {
+    if (index < 0 || index >= Count())
+        return {};
+    return Join(m_strFolder, Drawing(index).m_strName);
+}
+
+std::vector<std::string> DrawingFolder::SelectedPaths() const {
+    std::vector<std::string> paths;
+    for (int i = 0; i < Count(); ++i)
+        if (Drawing(i).IsSelected())
+            paths.push_back(PathOf(i));
+    return paths;
+}
+
+int DrawingFolder::Find(const std::string& name) const {
+    const NameFoldTable& fold = NameFold();
+    for (int i = 0; i < Count(); ++i)
+        if (CompareNamesNoCase(Drawing(i).m_strName, name, fold) == 0)
+            return i;
+    return -1;
+}
+
+int DrawingFolder::CountNamed(const std::string& name) const {
+    return CountListed(name);
+}
+
+void DrawingFolder::Sort(int mode) {
+    const std::string chosen = ChosenName();
+    SortDwgList(mode);
+    if (m_nChosen < 0)
+        return;
+    // The same drawing, wherever the sort put it (two of the same name are one to the user anyway).
+    for (int i = 0; i < Count(); ++i) {
+        if (Drawing(i).m_strName == chosen) {
+            m_nChosen = i;
+            return;
+        }
+    }
+}
+
+// ---- selection -----------------------------------------------------------------------------------------
+
+bool DrawingFolder::IsSelected(int index) const {
+    return index >= 0 && index < Count() && Drawing(index).IsSelected();
+}
+
+void DrawingFolder::Select(int index) {
+    DwgList[index].Select();
+}
+
+void DrawingFolder::Deselect(int index) {
+    DwgList[index].Deselect();
+}
+
+void DrawingFolder::SelectAll() {
+    for (int i = 0; i < Count(); ++i)
+        DwgList[i].Select();
+}
+
+void DrawingFolder::DeselectAll() {
+    DeselectAllFlags();
+}
+
+bool DrawingFolder::AnySelected() const {
+    return ::AnySelected();
+}
+
+DwgPrefixSearch DrawingFolder::SelectFirstStartingWith(const std::string& text) {
+    return FindByPrefix(text);
+}
+
+// ---- the chosen drawing --------------------------------------------------------------------------------
+
+void DrawingFolder::Choose(int index) {
+    if (index < 0 || index >= Count()) {
+        ChooseNone();
+        return;
+    }
+    m_nChosen = index;
+    if (m_pDocument)
+        m_pDocument->m_strName = Drawing(index).m_strName;
+    TellChosen();
+}
+
+void DrawingFolder::ChooseNone() {
+    m_nChosen = -1;
+    if (m_pDocument)
+        m_pDocument->m_strName.clear();
+    TellChosen();
+}
+
+std::string DrawingFolder::ChosenName() const {
+    return m_nChosen >= 0 && m_nChosen < Count() ? Drawing(m_nChosen).m_strName : std::string();
+}
+
+std::string DrawingFolder::ChosenPath() const {
+    return PathOf(m_nChosen);
+}
