@@ -1,6 +1,6 @@
-// Scanning folders of 10,000 and 100,000 files with ScanFolderPath against a bare FindFirstFileA loop
+// Showing folders of 10,000 and 100,000 files with DrawingFolder::Show against a bare FindFirstFileA loop
 // over the same folder. The folders are made here (small files, mostly drawing names) on first run.
-#include "thumbs/DwgList.h"
+#include "thumbs/DrawingFolder.h"
 
 #include "BenchClock.h"
 #include "SyntheticDwg.h"
@@ -65,7 +65,7 @@ int main(int argc, char** argv) {
     const std::string base = full;
     const int runs = 5;
     std::printf("bench_scan: median of %d runs (ms)\n\n", runs);
-    std::printf("%10s %10s %16s %16s %8s\n", "files", "records", "ScanFolderPath", "FindFirstFileA", "ratio");
+    std::printf("%10s %10s %16s %16s %8s\n", "files", "records", "Show", "FindFirstFileA", "ratio");
     std::printf("%10s %10s %16s %16s %8s\n", "----------", "----------", "----------------",
                 "----------------", "--------");
     for (int count : {10000, 100000}) {
@@ -78,11 +78,13 @@ int main(int argc, char** argv) {
         const double made = bench::NowMs() - t0;
         std::vector<double> scan, bare;
         int records = 0;
+        FileSystemFolderReader reader;
+        DrawingFolder shown(reader, nullptr);
         for (int r = 0; r < runs; ++r) {
             double t = bench::NowMs();
-            ScanFolderPath(folder.c_str(), ".dwg");
+            shown.Show(folder);
             scan.push_back(bench::NowMs() - t);
-            records = DwgList.GetSize();
+            records = shown.Count();
             t = bench::NowMs();
             BareLoop(folder);
             bare.push_back(bench::NowMs() - t);

@@ -79,12 +79,6 @@ bool ListHoldsDrawings(const std::vector<std::string>& names) {
     return false;
 }
 
-std::string FolderWithSlash(std::string folder) {
-    if (!folder.empty() && folder.back() != '\\')
-        folder += '\\';
-    return folder;
-}
-
 std::string CopyTargetName(const std::string& chosen) {
     if (chosen.empty() || !PathExtension(chosen).empty())
         return chosen;

@@ -35,8 +35,5 @@ bool IsDrawingPath(const std::string& path);
 // True when some name of the list is a drawing: what enables Paste.
 bool ListHoldsDrawings(const std::vector<std::string>& names);
 
-// The folder with a backslash at its end (a drive root keeps its one backslash).
-std::string FolderWithSlash(std::string folder);
-
 // Copy to file: the chosen target, given ".DWG" when it has no extension.
 std::string CopyTargetName(const std::string& chosen);

@@ -5,7 +5,6 @@
 #include "fileops/ShellFileOp.h"
 #include "framework/afxfiledlg.h"
 #include "framework/afxwin.h"
-#include "thumbs/DwgList.h"
 
 #include <shellapi.h>
 #include <shlobj.h>
@@ -45,12 +44,6 @@ public:
 private:
     bool m_open = false;
 };
-
-std::string CurrentDirectory() {
-    char buffer[260] = "";
-    const DWORD n = ::GetCurrentDirectoryA(259, buffer);
-    return n > 0 && n < 259 ? std::string(buffer, n) : std::string();
-}
 
 } // namespace
 
@@ -112,13 +105,12 @@ bool ForFileCommands::ClipboardHoldsDrawings() const {
     return ListHoldsDrawings(ClipboardFileList());
 }
 
-bool ForFileCommands::PasteIntoCurrentFolder(HWND owner) const {
+bool ForFileCommands::PasteInto(const std::string& folder, HWND owner) const {
     const std::vector<std::string> names = ClipboardFileList();
     // What Paste is offered for: a list that names a drawing. Then every file of it is pasted.
     if (!ListHoldsDrawings(names))
         return false;
     const bool move = g_cutSequence != 0 && g_cutSequence == ::GetClipboardSequenceNumber();
-    const std::string folder = CurrentDirectory();
     if (folder.empty())
         return false;
     CShellFileOp op;
@@ -175,23 +167,12 @@ int ForFileCommands::CopyToFile(const std::string& source, HWND owner) const {
     return 1;
 }
 
-std::vector<std::string> SelectedPaths(const std::string& folder) {
-    const std::string prefix = FolderWithSlash(folder);
-    std::vector<std::string> paths;
-    for (int i = 0; i < DwgList.GetSize(); ++i)
-        if (DwgList[i].IsSelected())
-            paths.push_back(prefix + DwgList[i].m_strName);
-    return paths;
-}
-
-bool CopySelectionToClipboard(const std::string& folder, bool cut) {
-    return PutFileListOnClipboard(SelectedPaths(folder), cut);
-}
-
-int DeleteSelection(HWND owner, const std::string& folder) {
+int DeleteFiles(HWND owner, const std::vector<std::string>& paths) {
+    if (paths.empty())
+        return 1;
     CShellFileOp op;
     op.SetOwner(owner);
-    for (const std::string& path : SelectedPaths(folder))
+    for (const std::string& path : paths)
         op.AddName(CShellFileOp::kSource, path);
     return op.Delete();
 }

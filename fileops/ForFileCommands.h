@@ -21,9 +21,9 @@ class ForFileCommands {
 public:
     // True when the clipboard's file list names at least one drawing (".dwg", case ignored).
     bool ClipboardHoldsDrawings() const;
-    // Pastes the clipboard's files into the current directory (copy, or move after a cut); true when the
-    // shell did it. A list without a drawing pastes nothing.
-    bool PasteIntoCurrentFolder(HWND owner) const;
+    // Pastes the clipboard's files into folder (copy, or move after a cut); true when the shell did it.
+    // A list without a drawing pastes nothing.
+    bool PasteInto(const std::string& folder, HWND owner) const;
     // Renames source to destination (full paths) with the shell; a non-zero result (the shell's) puts the
     // old name back into the label editor, when there is one.
     int RenameFile(const std::string& source, const std::string& destination, CEdit* label) const;
@@ -37,13 +37,9 @@ std::vector<std::string> ClipboardFileList();
 // next paste. False when the clipboard could not be opened.
 bool PutFileListOnClipboard(const std::vector<std::string>& paths, bool cut);
 
-// The selected drawings of the list, as full paths in folder (list order).
-std::vector<std::string> SelectedPaths(const std::string& folder);
-// Copy (or cut) the selected drawings of folder to the clipboard.
-bool CopySelectionToClipboard(const std::string& folder, bool cut);
-// Deletes the selected drawings of folder to the Recycle Bin (the shell confirms); the shell's result, or
-// a non-zero value when nothing is selected.
-int DeleteSelection(HWND owner, const std::string& folder);
+// Deletes the files (full paths) to the Recycle Bin (the shell confirms); the shell's result, or a
+// non-zero value for an empty list.
+int DeleteFiles(HWND owner, const std::vector<std::string>& paths);
 // Opens the shell's property sheet of the file at path.
 bool ShowFileProperties(const std::string& path);
 

@@ -7,6 +7,7 @@
 #include "settings/IniFile.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
+#include "thumbs/DrawingFolder.h"
 #include "thumbs/Tessel3View.h"
 #include "tree/LeftView.h"
 
@@ -85,7 +86,15 @@ std::string LayerLabelText(const std::string& folder) {
     return " Layer name: " + layer;
 }
 
-CMainFrame::CMainFrame(const ExplorerCall& call) : m_call(call) {}
+CMainFrame::CMainFrame(const ExplorerCall& call, DrawingFolder& folder) : m_call(call), m_folder(folder) {
+    WireDrawingFolder();
+}
+
+CMainFrame::~CMainFrame() {
+    // The folder model outlives the frame: it must not call into a frame that is gone.
+    m_folder.onShown = nullptr;
+    m_folder.onChosen = nullptr;
+}
 
 HFONT CMainFrame::LabelFont() {
     return static_cast<HFONT>(::GetStockObject(DEFAULT_GUI_FONT));
@@ -98,6 +107,7 @@ CSize CMainFrame::MeasureLabelText(const std::string& text) {
 }
 
 int CMainFrame::OnCreate(LPCREATESTRUCTA cs) {
+    m_fileCommands.SetOwner(m_hWnd);
     if (CFrameWnd::OnCreate(cs) == -1)
         return -1;
     if (!m_wndToolBar.CreateEx(this, TBSTYLE_FLAT,
@@ -200,18 +210,9 @@ void CMainFrame::WireFolderTree() {
     CChildView* tree = GetFolderTree();
     if (!tree)
         return;
-    tree->onEnablePick = [this](bool enable) { EnablePick(enable); };
-    tree->onFolderShown = [this](const std::string& folderPath, const std::string& label) {
-        if (m_pGridView && m_pGridView->m_hWnd)
-            m_pGridView->Rebuild();
-        // A folder without a file-system path shows its name; the grid is empty.
-        if (folderPath.empty())
-            SetTitleText(label);
-    };
-    tree->onStatusText = [this](const std::string& text) {
-        if (m_hWnd && !text.empty())
-            SetMessageText(text);
-    };
+    tree->SetDrawingFolder(&m_folder);
+    // A folder without a file-system path shows its name; the grid is empty.
+    tree->onNoFolderShown = [this](const std::string& label) { SetTitleText(label); };
     tree->onFolderMenu = [this](HTREEITEM item, CPoint) { ShowFolderMenu(item); };
     tree->onFocusGrid = [this] {
         if (m_pGridView && m_pGridView->m_hWnd)
@@ -223,14 +224,31 @@ void CMainFrame::WireFolderTree() {
         if (!reached && m_pGridView && m_pGridView->m_hWnd)
             SetActiveView(m_pGridView, true);
     };
-    if (m_pGridView)
-        m_pGridView->onRefreshFolder = [this] {
-            if (CChildView* folders = GetFolderTree(); folders && folders->GetSelectedItem()) {
-                folders->RefreshCurrentFolder();
-                return true;
-            }
-            return false;
-        };
+}
+
+void CMainFrame::WireDrawingFolder() {
+    m_folder.onShown = [this] { OnFolderShown(); };
+    m_folder.onChosen = [this] { OnDrawingChosen(); };
+}
+
+void CMainFrame::OnFolderShown() {
+    if (!m_hWnd)
+        return;
+    SetTitleText(m_folder.Folder());
+    EnablePick(false);
+    if (m_pGridView && m_pGridView->m_hWnd)
+        m_pGridView->Rebuild();
+    UpdateLayerLabel();
+    if (!m_folder.Problem().empty())
+        SetMessageText(m_folder.Problem());
+}
+
+void CMainFrame::OnDrawingChosen() {
+    if (!m_hWnd)
+        return;
+    const bool chosen = m_folder.Chosen() >= 0;
+    SetTitleText(chosen ? m_folder.ChosenPath() : m_folder.Folder());
+    EnablePick(chosen);
 }
 
 void CMainFrame::ShowFolderMenu(HTREEITEM item) {
@@ -266,10 +284,14 @@ void CMainFrame::ShowFolderMenu(HTREEITEM item) {
 
 CView* CMainFrame::MakeGridView() {
     auto* grid = new CTessel3View;
+    grid->SetFolder(&m_folder);
+    grid->SetFileCommands(&m_fileCommands);
     grid->onSortMode = [this] { return m_nSort; };
-    grid->onEnablePick = [this](bool enable) { EnablePick(enable); };
-    grid->onSetTitle = [this](const std::string& text) { SetTitleText(text); };
-    grid->onFolderShown = [this] { UpdateLayerLabel(); };
+    grid->onSort = [this](int mode) { SetSortMode(mode); };
+    grid->onGrowFrame = [this](int widthChange, int heightChange) {
+        const CRect rc = GetWindowRect();
+        MoveWindow(rc.left, rc.top, rc.Width() + widthChange, rc.Height() + heightChange);
+    };
     grid->onStatusText = [this](const std::string& text) {
         if (m_hWnd)
             SetMessageText(text);
@@ -281,30 +303,32 @@ CView* CMainFrame::MakeGridView() {
         else if (m_pFolderPane && m_pFolderPane->m_hWnd)
             m_pFolderPane->SetFocus();
     };
-    WireFileCommands(*grid);
     m_pGridView = grid;
     return grid;
 }
 
-void CMainFrame::WireFileCommands(CTessel3View& grid) {
-    // The current folder is the document's; the process's current directory follows it.
-    const auto folder = [this] {
-        std::string path = m_pDoc ? m_pDoc->m_strPath : std::string();
-        if (path.empty()) {
-            char buffer[MAX_PATH + 1] = "";
-            const DWORD n = ::GetCurrentDirectoryA(sizeof buffer, buffer);
-            path.assign(buffer, n < sizeof buffer ? n : 0);
-        }
-        return path;
-    };
-    grid.onClipboardHoldsDrawings = [] { return ForFileCommands().ClipboardHoldsDrawings(); };
-    grid.onCopySelection = [folder](bool cut) { CopySelectionToClipboard(folder(), cut); };
-    grid.onPaste = [this] { return ForFileCommands().PasteIntoCurrentFolder(m_hWnd); };
-    grid.onDeleteSelection = [this, folder] { DeleteSelection(m_hWnd, folder()); };
-    grid.onRenameFile = [](const std::string& source, const std::string& destination) {
-        return ForFileCommands().RenameFile(source, destination, nullptr);
-    };
-    grid.onShowProperties = [](const std::string& path) { ShowFileProperties(path); };
+bool ExplorerFileCommands::ClipboardHoldsDrawings() {
+    return ForFileCommands().ClipboardHoldsDrawings();
+}
+
+void ExplorerFileCommands::Copy(const std::vector<std::string>& paths, bool cut) {
+    PutFileListOnClipboard(paths, cut);
+}
+
+bool ExplorerFileCommands::Paste(const std::string& folder) {
+    return ForFileCommands().PasteInto(folder, m_owner);
+}
+
+void ExplorerFileCommands::Delete(const std::vector<std::string>& paths) {
+    DeleteFiles(m_owner, paths);
+}
+
+int ExplorerFileCommands::Rename(const std::string& source, const std::string& destination) {
+    return ForFileCommands().RenameFile(source, destination, nullptr);
+}
+
+void ExplorerFileCommands::ShowProperties(const std::string& path) {
+    ShowFileProperties(path);
 }
 
 bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {
@@ -374,9 +398,9 @@ void CMainFrame::SetTitleText(const std::string& text) {
 }
 
 void CMainFrame::UpdateLayerLabel() {
-    if (!m_wndLayerLabel.m_hWnd || !m_pDoc)
+    if (!m_wndLayerLabel.m_hWnd)
         return;
-    m_wndLayerLabel.SetWindowText(LayerLabelText(m_pDoc->m_strPath));
+    m_wndLayerLabel.SetWindowText(LayerLabelText(m_folder.Folder()));
 }
 
 void CMainFrame::OnUpdateFrameTitle(bool addToTitle) {
@@ -418,7 +442,7 @@ bool CMainFrame::OnCmdMsg(UINT id, int code) {
         return true;
     case ID_ACCEPT:
         // Only a chosen drawing can be taken.
-        if (m_pDoc && !m_pDoc->m_strName.empty())
+        if (m_folder.Chosen() >= 0)
             PostAppResult(kAppAccept);
         return true;
     case ID_CANCEL_PICK:

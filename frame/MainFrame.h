@@ -17,6 +17,7 @@
 #include "framework/afxframe.h"
 #include "framework/afxbars.h"
 #include "framework/afxsplit.h"
+#include "thumbs/Tessel3View.h" // GridFileCommands
 
 #include <functional>
 #include <string>
@@ -24,7 +25,24 @@
 class CChildView;
 class CLeftView;
 class CTessel3Doc;
-class CTessel3View;
+class DrawingFolder;
+
+// The grid's file commands, carried out with the shell's file operations.
+class ExplorerFileCommands : public GridFileCommands {
+public:
+    // The window the shell's confirmations belong to.
+    void SetOwner(HWND owner) { m_owner = owner; }
+
+    bool ClipboardHoldsDrawings() override;
+    void Copy(const std::vector<std::string>& paths, bool cut) override;
+    bool Paste(const std::string& folder) override;
+    void Delete(const std::vector<std::string>& paths) override;
+    int Rename(const std::string& source, const std::string& destination) override;
+    void ShowProperties(const std::string& path) override;
+
+private:
+    HWND m_owner = nullptr;
+};
 
 // The toolbar's search edit: every change of its text runs the search by name prefix.
 class CEditSearch : public CEdit {
@@ -42,7 +60,10 @@ class CEditEx : public CEdit {};
 
 class CMainFrame : public CFrameWnd {
 public:
-    explicit CMainFrame(const ExplorerCall& call);
+    // folder: the folder model of the call, which outlives the frame; the frame is its owner's voice while
+    // it stands (title, pick, grid, layer label).
+    CMainFrame(const ExplorerCall& call, DrawingFolder& folder);
+    ~CMainFrame() override;
 
     // Sort mode: 0 by name, 1 by date, 2 by size.
     int GetSortMode() const { return m_nSort; }
@@ -95,7 +116,10 @@ private:
     CView* MakeGridView();
     CView* MakeFolderPane();
     void WireFolderTree();
-    void WireFileCommands(CTessel3View& grid);
+    void WireDrawingFolder();
+    // What the folder model says changed.
+    void OnFolderShown();
+    void OnDrawingChosen();
     // The folder tree's right-click menu, "&Folder settings", and the dialog it opens.
     void ShowFolderMenu(HTREEITEM item);
     bool ForwardToGrid(UINT id);
@@ -115,9 +139,11 @@ private:
     int m_nSort = 0;
     bool m_bPickEnabled = true;
     ExplorerCall m_call;
-    CTessel3Doc* m_pDoc = nullptr;          // of the creation context; outlives the frame
-    CTessel3View* m_pGridView = nullptr;    // the right pane
-    CLeftView* m_pFolderPane = nullptr;     // the left pane
+    DrawingFolder& m_folder;
+    ExplorerFileCommands m_fileCommands;
+    CTessel3Doc* m_pDoc = nullptr;       // of the creation context; outlives the frame
+    CTessel3View* m_pGridView = nullptr; // the right pane
+    CLeftView* m_pFolderPane = nullptr;  // the left pane
 };
 
 // The one command of the folder tree's right-click menu.

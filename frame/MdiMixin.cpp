@@ -15,19 +15,15 @@
 
 namespace {
 
-// Shows the folder the explorer starts in: scans it into the drawing list, makes it the current folder
-// and lays the grid out. Returns what the scan has to say (a refused folder, files left out), or empty.
-std::string ShowStartFolder(CMainFrame& frame, CTessel3Doc& doc, const std::string& startPath) {
-    const std::string folder = StartFolder(startPath, doc.m_strPath);
-    if (folder.empty())
+// Shows the folder the explorer starts in (the frame hears it and lays the grid out). Returns what the
+// scan has to say (a refused folder, files left out), or empty.
+std::string ShowStartFolder(DrawingFolder& folder, const std::string& startPath,
+                            const std::string& savedPath) {
+    const std::string start = StartFolder(startPath, savedPath);
+    if (start.empty())
         return {};
-    std::string problem;
-    ScanFolderPath(folder.c_str(), ".dwg", &problem);
-    doc.m_strPath = folder;
-    if (CTessel3View* grid = frame.GetGridView(); grid && grid->m_hWnd)
-        grid->Rebuild();
-    frame.UpdateLayerLabel();
-    return problem;
+    folder.Show(start);
+    return folder.Problem();
 }
 
 RECT VirtualScreen() {
@@ -123,8 +119,12 @@ CMainFrame* CMdiMixin::ExplorerFrame() const {
 bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // 1. The document reads the explorer's settings; it lives until the LISP function ends the run.
     auto* doc = new CTessel3Doc();
-    // 2. The frame deletes itself when its window is destroyed; its views are given the document.
-    auto* frame = new CMainFrame(call);
+    // The drawing chosen in the last run, before the first folder shown drops it.
+    const std::string saved = doc->m_strName;
+    m_pFolder = std::make_unique<DrawingFolder>(m_folderReader, doc);
+    // 2. The frame deletes itself when its window is destroyed; its views are given the document, and it
+    // speaks for the folder model while it stands.
+    auto* frame = new CMainFrame(call, *m_pFolder);
     CCreateContext context;
     context.m_pCurrentDoc = doc;
     // 3. The host takes no input while the explorer is open.
@@ -167,7 +167,7 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // 7. The start folder is scanned and laid out at the size the frame is shown at. The keyboard starts in
     // the tree (which selects nothing of its own before its walk); then the frame is drawn. Nothing is
     // chosen yet.
-    const std::string scanProblem = ShowStartFolder(*frame, *doc, call.startPath);
+    const std::string scanProblem = ShowStartFolder(*m_pFolder, call.startPath, doc->m_strPath);
     if (tree)
         tree->SetFocus();
     frame->UpdateWindow();
@@ -176,8 +176,6 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // 8. The drawing of the last run is chosen again: its name starts the search, and the drawing itself is
     // selected (the search may have found another name first). It stays the current drawing, so accept
     // takes it; when the folder no longer holds it, nothing is chosen.
-    const std::string saved = doc->m_strName;
-    doc->m_strName.clear();
     CEditSearch& search = frame->GetSearchEdit();
     if (search.m_hWnd && !saved.empty()) {
         search.SetWindowText(SearchTextOf(saved));

@@ -4,8 +4,10 @@
 
 #include "frame/ExplorerCall.h"
 #include "framework/afxwin.h"
+#include "thumbs/DrawingFolder.h"
 
 #include <functional>
+#include <memory>
 #include <string>
 
 class CMainFrame;
@@ -25,9 +27,16 @@ public:
     UINT FrameResourceId() const { return m_nIDFrameResource; }
     // The explorer frame while its window exists, else nullptr.
     CMainFrame* ExplorerFrame() const;
+    // The folder model of the call: made with the explorer, kept after its windows are gone (the LISP
+    // function reads the chosen drawing from it) until EndRun. nullptr outside a call.
+    DrawingFolder* Folder() const { return m_pFolder.get(); }
+    // The call is over: the folder model goes, before the document it writes to.
+    void EndRun() { m_pFolder.reset(); }
 
 private:
     UINT m_nIDFrameResource = 0;
+    FileSystemFolderReader m_folderReader;
+    std::unique_ptr<DrawingFolder> m_pFolder;
     HWND m_hExplorerFrame = nullptr; // looked up again each time: the frame deletes itself with its window
 };
 

@@ -3,35 +3,25 @@
 #include "host/ArxApp.h"
 #include "hostapi/HostApi.h"
 #include "host/Orvex.h"
-#include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
-#include "thumbs/DwgList.h"
+#include "thumbs/DrawingFolder.h"
 
 #include <string>
 
 namespace {
 
-// The drawing an accept would return: the document's folder and current name, or "" when none is chosen.
-std::string ChosenDrawing() {
-    if (!g_pTessel3Doc || g_pTessel3Doc->m_strName.empty())
-        return {};
-    std::string folder = g_pTessel3Doc->m_strPath;
-    if (folder.empty() || folder.back() != '\\')
-        folder += '\\';
-    return folder + g_pTessel3Doc->m_strName;
-}
-
 // Why the chosen drawing cannot be handed back, or empty when it can.
-std::string PickRefusal(const std::string& drawing) {
-    const std::string& name = g_pTessel3Doc->m_strName;
+std::string PickRefusal(const DrawingFolder& folder) {
+    const std::string drawing = folder.ChosenPath();
+    const std::string name = folder.ChosenName();
     const DWORD attributes = ::GetFileAttributesA(drawing.c_str());
     // A file listed once under a name without the code page's '?' is the one the user chose: no need
     // to read the folder again (it may hold a million files).
     if (attributes != INVALID_FILE_ATTRIBUTES && !(attributes & FILE_ATTRIBUTE_DIRECTORY) &&
-        CountListed(name) == 1 && name.find('?') == std::string::npos)
+        folder.CountNamed(name) == 1 && name.find('?') == std::string::npos)
         return {};
     const std::string head = "The drawing\n" + drawing + "\n";
-    switch (CheckPickedName(g_pTessel3Doc->m_strPath, name)) {
+    switch (CheckPickedName(folder.Folder(), name)) {
     case PickedName::NotInCodePage:
         // Its narrow name is a best fit ('l' for a Polish l with stroke) or question marks: the path
         // would name another file or none.
@@ -94,13 +84,13 @@ bool CDialogRun::PreTranslateMessage(MSG* pMsg) {
         if ((pMsg->wParam != kAppAccept && pMsg->wParam != kAppCancel) || pMsg->lParam != 0)
             return true;
         if (pMsg->wParam == kAppAccept) {
-            const std::string drawing = ChosenDrawing();
-            if (drawing.empty()) {
+            const DrawingFolder* folder = theApp.Folder();
+            if (!folder || folder->Chosen() < 0) {
                 EndDialog(kAppCancel); // accept with nothing chosen: the call returns nil
                 return true;
             }
             // The path must name the file the user chose, or the user is told and chooses again.
-            const std::string refused = PickRefusal(drawing);
+            const std::string refused = PickRefusal(*folder);
             if (!refused.empty()) {
                 HWND owner = ::GetActiveWindow();
                 ::MessageBoxA(owner ? owner : m_hWnd, refused.c_str(), "Orvex1", MB_OK | MB_ICONWARNING);

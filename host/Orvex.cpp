@@ -3,8 +3,9 @@
 #include "host/AdsListUser.h"
 #include "hostapi/HostApi.h"
 #include "hostapi/TextConv.h"
+#include "settings/FolderSettings.h"
 #include "settings/IniFile.h"
-#include "settings/Tessel3Doc.h"
+#include "thumbs/DrawingFolder.h"
 
 #include <cstring>
 #include <cwchar>
@@ -45,7 +46,7 @@ bool RefuseTooLong(const wchar_t* what, std::size_t length, std::size_t limit) {
 
 void AppendParameters(ads_list_user& list, const std::string& folder) {
     CIniFile ini;
-    ini.SetPath(folder + "datains.ini");
+    ini.SetPath(FolderSettingsFilePath(folder));
     if (ini.ReadFile()) {
         const std::string layer = ini.GetValue("Default Parameters", "Layer");
         const std::string color = ini.GetValue("Default Parameters", "Color");
@@ -57,12 +58,6 @@ void AppendParameters(ads_list_user& list, const std::string& folder) {
 }
 
 } // namespace
-
-std::string PickedPath(CTessel3Doc& doc) {
-    if (doc.m_strPath.empty() || doc.m_strPath.back() != '\\')
-        doc.m_strPath += '\\';
-    return doc.m_strPath + doc.m_strName;
-}
 
 namespace {
 PickerPlatform* g_pPickerPlatform = nullptr;
@@ -174,13 +169,13 @@ int OrvexWith(PickerPlatform& platform) {
     } endOfRun{platform};
 
     const int result = platform.RunDialog();
-    CTessel3Doc* doc = platform.Document();
+    const DrawingFolder* folder = platform.Folder();
     // Accept with no drawing chosen is a cancel: a folder is never returned as the picked drawing.
-    if (result == 1 && doc && !doc->m_strName.empty()) {
-        const std::string picked = PickedPath(*doc);
+    const std::string picked = result == 1 && folder ? folder->ChosenPath() : std::string();
+    if (!picked.empty()) {
         ads_list_user list;
         list + picked.c_str();
-        AppendParameters(list, doc->m_strPath);
+        AppendParameters(list, folder->Folder());
         list.RetList();
         list.Release();
     } else {

@@ -19,6 +19,7 @@ extern char g_szStartPath[kPathChars];        // the start path as given (file-s
 // What the picker needs from the platform: the shell, the run dialog and the explorer document.
 // The Windows build supplies the real ones; unit tests supply fakes.
 class CTessel3Doc;
+class DrawingFolder;
 struct PickerPlatform {
     virtual ~PickerPlatform() = default;
     // The shell's display-name path of a file-system path (folder part only), or "" when it has none.
@@ -29,6 +30,8 @@ struct PickerPlatform {
     virtual int RunDialog() = 0;
     // The explorer document of this run (created while the dialog initialised), or nullptr.
     virtual CTessel3Doc* Document() = 0;
+    // The folder model of this run, with the drawing chosen when the dialog ended, or nullptr.
+    virtual const DrawingFolder* Folder() { return nullptr; }
     // Destroys the explorer document, which saves the explorer's settings.
     virtual void DestroyDocument() = 0;
     // Gives the keyboard focus back to the host's active drawing view.
@@ -44,7 +47,3 @@ PickerPlatform& DefaultPickerPlatform(); // per build: Windows shell and dialog,
 // Returns 1 after a completed run (picked or cancelled), 0 after an argument error.
 int Orvex();
 int OrvexWith(PickerPlatform& platform);
-
-// The path picked in the explorer's document: its folder (given a trailing separator, in the document
-// itself) followed by its current file name. Exposed for the result list and its tests.
-std::string PickedPath(CTessel3Doc& doc);

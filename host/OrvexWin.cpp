@@ -65,7 +65,10 @@ public:
 
     CTessel3Doc* Document() override { return g_pTessel3Doc; }
 
+    const DrawingFolder* Folder() override { return theApp.Folder(); }
+
     void DestroyDocument() override {
+        theApp.EndRun();      // the folder model writes to the document: it goes first
         delete g_pTessel3Doc; // saves the explorer's settings and clears the pointer
     }
 

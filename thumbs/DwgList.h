@@ -72,6 +72,9 @@ void EndScan();
 // at least one entry, 0 for none; the Windows scan gives the same answers.
 int ScanEntries(const DwgFindEntry* entries, int count, const char* needle);
 
+// What a file name must contain to be listed.
+constexpr const char* kDrawingNeedle = ".dwg";
+
 // Longest path the runtime library's file functions take: MAX_PATH less the terminator.
 constexpr std::size_t kMaxPathChars = 259;
 
@@ -115,13 +118,6 @@ DwgPrefixSearch FindByPrefix(const std::string& text);
 int FindByPrefixIndex(const std::string& text);
 
 #ifdef _WIN32
-// Scans one folder with the runtime library's file search: makes path the current directory, lists
-// "path\*" and fills DwgList with the entries AcceptScanEntry takes. 1 when the folder was read to its
-// end, 0 when it could not be searched (the list is then empty). A path too long for the runtime's
-// buffers is refused before it is used, and files whose full path is too long are left out; problem,
-// when given, receives what the user should be told (empty when all went well).
-int ScanFolderPath(const char* path, const char* needle, std::string* problem = nullptr);
-
 // Whether the drawing folder\name, as the scan listed it, can be handed back as a path that names that
 // one file.
 enum class PickedName {

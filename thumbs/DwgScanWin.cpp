@@ -1,4 +1,5 @@
-// The folder scan over the runtime library's file search (Windows build only).
+// The folder scan over the runtime library's file search, and the pick's check of a name (Windows only).
+#include "thumbs/DrawingFolder.h"
 #include "thumbs/DwgList.h"
 #include "thumbs/NameFold.h"
 
@@ -38,11 +39,7 @@ DwgFindEntry EntryOf(const struct _finddata64i32_t& found) {
 }
 
 bool IsReadableEntry(const std::string& folder, const char* name) {
-    std::string path = folder;
-    if (path.back() != '\\' && path.back() != '/')
-        path += '\\';
-    path += name;
-    return ::GetFileAttributesA(path.c_str()) != INVALID_FILE_ATTRIBUTES;
+    return ::GetFileAttributesA(DrawingFolder::Join(folder, name).c_str()) != INVALID_FILE_ATTRIBUTES;
 }
 
 std::wstring Widened(const std::string& text) {
@@ -85,10 +82,7 @@ private:
 PickedName CheckPickedName(const std::string& folder, const std::string& name) {
     if (folder.empty() || name.empty())
         return PickedName::Missing;
-    std::wstring pattern = Widened(folder);
-    if (pattern.back() != L'\\' && pattern.back() != L'/')
-        pattern += L'\\';
-    pattern += L'*';
+    const std::wstring pattern = Widened(DrawingFolder::Join(folder, "*"));
     WIN32_FIND_DATAW found;
     WideFindHandle search(::FindFirstFileW(pattern.c_str(), &found));
     if (search.get() == INVALID_HANDLE_VALUE)
@@ -115,34 +109,26 @@ PickedName CheckPickedName(const std::string& folder, const std::string& name) {
     return listed == 1 ? PickedName::Exact : PickedName::Missing;
 }
 
-int ScanFolderPath(const char* path, const char* needle, std::string* problem) {
-    BeginScan();
-    if (problem)
-        problem->clear();
-    if (path == nullptr || *path == '\0')
-        return 0;
-    const std::string folder(path);
-    // Refused before the current directory or the pattern is made: neither may be cut short.
+bool FileSystemFolderReader::Read(const std::string& folder, std::vector<DwgData>& drawings,
+                                  std::string& problem) {
+    drawings.clear();
+    problem.clear();
+    if (folder.empty())
+        return false;
+    // Refused before the pattern is made: it may not be cut short.
     if (std::string refused = FolderPathProblem(folder); !refused.empty()) {
-        if (problem)
-            *problem = std::move(refused);
-        return 0;
+        problem = std::move(refused);
+        return false;
     }
-    ::SetCurrentDirectoryA(folder.c_str());
-
-    std::string pattern = folder;
-    if (pattern.back() != '\\' && pattern.back() != '/')
-        pattern += '\\';
-    pattern += '*';
+    std::string pattern = DrawingFolder::Join(folder, "*");
     struct _finddata64i32_t found;
     FindHandle search(_findfirst64i32(pattern.c_str(), &found));
     if (search.get() == -1)
-        return 0;
-    std::vector<DwgData> records;
+        return false;
     int tooLong = 0;
     do {
         DwgFindEntry entry = EntryOf(found);
-        if (!AcceptScanEntry(entry, needle))
+        if (!AcceptScanEntry(entry, kDrawingNeedle))
             continue;
         // A pipe or a socket shows as an empty file whose attributes cannot be read (under Wine): it is
         // no drawing, and opening it for its preview could wait for a writer for good.
@@ -152,11 +138,12 @@ int ScanFolderPath(const char* path, const char* needle, std::string* problem) {
             ++tooLong; // its preview could not be opened by its name
             continue;
         }
-        records.emplace_back(std::move(entry));
+        drawings.emplace_back(std::move(entry));
     } while (_findnext64i32(search.get(), &found) == 0);
-    AppendScanRecords(std::move(records));
-    EndScan();
-    if (problem)
-        *problem = SkippedFilesMessage(tooLong);
-    return 1;
+    problem = SkippedFilesMessage(tooLong);
+    return true;
+}
+
+void FileSystemFolderReader::MakeCurrentDirectory(const std::string& folder) {
+    ::SetCurrentDirectoryA(folder.c_str());
 }

@@ -3,11 +3,8 @@
 #include "hostapi/TextConv.h"
 #include "preview/ShowPreview.h"
 #include "res/resource.h"
-#include "settings/Tessel3Doc.h"
-#include "thumbs/AppMessages.h"
-#include "thumbs/DwgList.h"
-#include "thumbs/RenameRules.h"
-#include "thumbs/Tessel3View.h"
+#include "thumbs/DrawingFolder.h"
+#include "thumbs/GridMath.h"
 #include "thumbs/TooltipText.h"
 
 namespace {
@@ -15,39 +12,16 @@ namespace {
 // Every redraw of the control and its label repaints at once, background included.
 constexpr UINT kRedrawNow = RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW;
 
-std::string CurrentDirectory() {
-    char buffer[MAX_PATH + 1] = {};
-    DWORD n = ::GetCurrentDirectoryA(sizeof buffer, buffer);
-    return n > 0 && n < sizeof buffer ? std::string(buffer, n) : std::string();
-}
-
-std::string WithSlash(std::string folder) {
-    if (folder.empty() || folder.back() != '\\')
-        folder += '\\';
-    return folder;
-}
-
-DwgData& RecordAt(int index) {
-    return DwgList[index]; // outside the list: invalid-argument error, caught at the window procedure
-}
-
-// Makes the drawing the current one: the document's name, the title, the pick.
-void MakeCurrent(CTessel3View& view, const std::string& name) {
-    if (CTessel3Doc* doc = view.Document())
-        doc->m_strName = name;
-    view.SetTitle(CurrentDirectory() + "\\" + name);
-    view.EnablePick(true);
-    view.SetStatusText(std::string()); // a search's "no drawing starts with" is over
-}
-
 } // namespace
 
-std::string CurrentFolder() {
-    return CurrentDirectory();
-}
-
-std::string CurrentFolderWithSlash() {
-    return WithSlash(CurrentDirectory());
+int ThumbnailLabelHeight() {
+    static const int height = [] {
+        CClientDC dc(nullptr);
+        TEXTMETRICA tm{};
+        dc.GetTextMetrics(&tm);
+        return grid::LabelHeight(tm.tmHeight, ::GetSystemMetrics(SM_CYEDGE));
+    }();
+    return height;
 }
 
 // ---- the label --------------------------------------------------------------------------------------
@@ -113,8 +87,7 @@ void CThumbLabel::OnLeave() {
         SetWindowText(m_strSaved);
     SetReadOnly(true);
     // Setting the text drops the highlight; a selected drawing keeps it.
-    if (m_pOwner && m_pOwner->m_nListIndex >= 0 && m_pOwner->m_nListIndex < DwgList.GetSize() &&
-        DwgList[m_pOwner->m_nListIndex].IsSelected())
+    if (m_pOwner && m_pOwner->IsDrawingSelected())
         SetSel(0, -1);
     RedrawWindow(nullptr, nullptr, kRedrawNow);
     HWND view = ::GetParent(m_hWnd);
@@ -124,42 +97,20 @@ void CThumbLabel::OnLeave() {
 
 bool CThumbLabel::Commit() {
     m_bRenaming = false;
-    CTessel3View* view = m_pOwner ? m_pOwner->m_pView : nullptr;
-    const CTessel3Doc* doc = view ? view->Document() : nullptr;
-    std::string folder = doc ? doc->m_strPath : std::string();
-    if (folder.empty())
-        folder = CurrentDirectory();
-    folder = WithSlash(folder);
+    ThumbnailOwner* owner = m_pOwner ? m_pOwner->m_pOwner : nullptr;
     const std::string oldName = m_strSaved;
     const std::string newName = GetWindowText();
-    const RenameVerdict verdict = CheckRename(folder, oldName, newName, [&folder](const std::string& name) {
-        return ::GetFileAttributesA((folder + name).c_str()) != INVALID_FILE_ATTRIBUTES;
-    });
-    if (verdict != RenameVerdict::Rename) {
-        // The old name comes back before the user is told why.
-        SetWindowText(oldName);
-        RedrawEdge();
-        if (verdict != RenameVerdict::Unchanged && view)
-            view->TellUser(RenameRefusalText(verdict, newName));
-        return true;
-    }
-    // The shell renames; its loop may let the grid re-create its controls, so this label is looked at again
-    // only if it still stands.
+    // The owner may run the shell's rename, whose loop may let the grid re-create its controls: this
+    // label is looked at again only if it still stands.
     const HWND self = m_hWnd;
-    const int result = view ? view->RenameFile(folder + oldName, folder + newName) : -1;
+    const ThumbnailOwner::RenameOutcome outcome =
+        owner ? owner->OnThumbnailRename(oldName, newName) : ThumbnailOwner::RenameOutcome::Refused;
     const bool alive = ::IsWindow(self) && CWnd::FromHandle(self) == this;
-    if (result != 0) {
-        if (alive) {
+    if (alive) {
+        if (outcome != ThumbnailOwner::RenameOutcome::Renamed)
             SetWindowText(oldName);
-            RedrawEdge();
-        }
-        return alive;
-    }
-    // The rescan rebuilds the grid, which destroys this label: it runs once this message is done.
-    if (view)
-        view->PostRefresh();
-    if (alive)
         RedrawEdge();
+    }
     return alive;
 }
 
@@ -193,32 +144,34 @@ exCDwgThumbnail::~exCDwgThumbnail() {
 }
 
 bool exCDwgThumbnail::Create(const std::string& name, int listIndex, const char* windowName, DWORD style,
-                             const RECT& cell, CTessel3View* parentView, UINT id) {
-    const bool created = CWnd::CreateEx(0, nullptr, windowName, style | WS_VISIBLE | WS_BORDER, cell,
-                                        parentView ? parentView->Sheet() : nullptr, id);
+                             const RECT& cell, CWnd* parent, ThumbnailOwner* owner, UINT id) {
+    const bool created =
+        CWnd::CreateEx(0, nullptr, windowName, style | WS_VISIBLE | WS_BORDER, cell, parent, id);
     if (!created)
         return false;
 
-    m_pView = parentView;
+    m_pOwner = owner;
     m_nListIndex = listIndex;
     ShowWindow(SW_SHOW);
     m_strName = name;
 
     // The tooltip's window is made when the mouse first moves over the picture (CreateToolTip): most
     // thumbnails are scrolled past without it, and a window less for each makes the grid quicker to build.
-    const DwgData& record = RecordAt(listIndex);
-    const ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
-    m_strToolTip = tip.text;
-    m_nToolTipWidth = tip.width;
-    CreateLabel(name, cell);
+    if (m_pOwner) {
+        const DwgData& record = m_pOwner->Folder().Drawing(listIndex);
+        const ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
+        m_strToolTip = tip.text;
+        m_nToolTipWidth = tip.width;
+    }
+    CreateLabel(name, cell, parent);
     return true;
 }
 
 bool exCDwgThumbnail::Rebind(const std::string& name, int listIndex, const RECT& cell) {
     // A label being renamed keeps its edit until the control is destroyed, as before any scroll.
-    if (!m_hWnd || !m_wndLabel.m_hWnd || m_wndLabel.m_bRenaming)
+    if (!m_hWnd || !m_wndLabel.m_hWnd || m_wndLabel.m_bRenaming || !m_pOwner)
         return false;
-    const DwgData& record = RecordAt(listIndex);
+    const DwgData& record = m_pOwner->Folder().Drawing(listIndex);
     m_nListIndex = listIndex;
     m_strName = name;
     // A tooltip of the drawing before would show its text: made again when the mouse comes.
@@ -254,17 +207,17 @@ CRect exCDwgThumbnail::LabelRect(const RECT& cell) {
     const int cxEdge = ::GetSystemMetrics(SM_CXEDGE);
     const int cyEdge = ::GetSystemMetrics(SM_CYEDGE);
     return CRect(cell.left + cxEdge, cell.bottom + cyEdge, cell.right - cxEdge,
-                 cell.bottom + CTessel3View::LabelHeight() - cyEdge);
+                 cell.bottom + ThumbnailLabelHeight() - cyEdge);
 }
 
-bool exCDwgThumbnail::CreateLabel(const std::string& name, const RECT& cell) {
+bool exCDwgThumbnail::CreateLabel(const std::string& name, const RECT& cell, CWnd* parent) {
     const CRect rc = LabelRect(cell);
     m_wndLabel.m_pOwner = this;
     if (!m_wndLabel.CreateEx(0, "EDIT", "", WS_CHILD | ES_READONLY | ES_NOHIDESEL | ES_AUTOHSCROLL, rc,
-                             m_pView ? m_pView->Sheet() : nullptr, 0))
+                             parent, 0))
         return false;
     m_wndLabel.SetWindowText(name);
-    if (RecordAt(m_nListIndex).IsSelected())
+    if (IsDrawingSelected())
         HighlightLabel();
     m_wndLabel.ShowWindow(SW_SHOW);
     m_wndLabel.RedrawWindow(nullptr, nullptr, kRedrawNow);
@@ -277,7 +230,7 @@ bool exCDwgThumbnail::DestroyWindow() {
     m_wndLabel.m_pOwner = nullptr;
     m_wndToolTip.DestroyWindow();
     m_bToolTipActive = false;
-    m_pView = nullptr;
+    m_pOwner = nullptr;
     return CWnd::DestroyWindow();
 }
 
@@ -312,57 +265,15 @@ void exCDwgThumbnail::DropLabelHighlight() {
     m_wndLabel.SetWindowText(m_wndLabel.GetWindowText());
 }
 
-void exCDwgThumbnail::Unselect() {
-    DropLabelHighlight();
-    RecordAt(m_nListIndex).Deselect();
+bool exCDwgThumbnail::IsDrawingSelected() const {
+    return m_pOwner && m_pOwner->Folder().IsSelected(m_nListIndex);
 }
 
 void exCDwgThumbnail::ShowSelection() {
-    if (m_nListIndex >= 0 && m_nListIndex < DwgList.GetSize() && DwgList[m_nListIndex].IsSelected())
+    if (IsDrawingSelected())
         HighlightLabel();
-}
-
-void exCDwgThumbnail::SelectThis(bool clearOthers) {
-    if (clearOthers) {
-        if (m_pView)
-            m_pView->DeselectAll();
-        else
-            DeselectAllFlags();
-    }
-    DwgData& record = RecordAt(m_nListIndex);
-    HighlightLabel();
-    record.Select();
-    if (m_pView)
-        MakeCurrent(*m_pView, record.m_strName);
-}
-
-void exCDwgThumbnail::ToggleSelection() {
-    SetFocus();
-    DwgData& record = RecordAt(m_nListIndex);
-    if (record.IsSelected()) {
+    else
         DropLabelHighlight();
-        record.Deselect();
-        if (m_pView) {
-            m_pView->EnablePick(false);
-            if (CTessel3Doc* doc = m_pView->Document())
-                doc->m_strName.clear();
-            m_pView->SetTitle(CurrentDirectory());
-        }
-    } else {
-        HighlightLabel();
-        record.Select();
-        if (m_pView)
-            MakeCurrent(*m_pView, record.m_strName);
-    }
-}
-
-void exCDwgThumbnail::Pick() {
-    const DwgData& record = RecordAt(m_nListIndex);
-    if (CTessel3Doc* doc = m_pView ? m_pView->Document() : nullptr) {
-        doc->m_strName = record.m_strName;
-        doc->m_strPath = CurrentFolderWithSlash();
-    }
-    PostAppResult(kAppAccept);
 }
 
 bool exCDwgThumbnail::PreTranslateMessage(MSG* pMsg) {
@@ -397,35 +308,30 @@ bool exCDwgThumbnail::TranslateInput(MSG* pMsg) {
     case WM_LBUTTONDOWN:
         if (m_wndToolTip.m_hWnd)
             m_wndToolTip.RelayEvent(pMsg);
-        // A click in the grid takes the keyboard there (from the folder tree, the search edit).
-        if (HWND view = m_pView ? m_pView->m_hWnd : nullptr) {
-            HWND focus = ::GetFocus();
-            if (focus != view && !::IsChild(view, focus))
-                ::SetFocus(view);
-        }
-        if (pMsg->wParam == MK_LBUTTON) {
-            SelectThis(true);
-            RedrawWindow(nullptr, nullptr, kRedrawNow);
-        } else if (pMsg->wParam == (MK_LBUTTON | MK_CONTROL)) {
-            ToggleSelection();
+        if (m_pOwner) {
+            const HWND self = m_hWnd;
+            m_pOwner->OnThumbnailMouseDown();
+            if (pMsg->wParam == MK_LBUTTON || pMsg->wParam == (MK_LBUTTON | MK_CONTROL))
+                m_pOwner->OnThumbnailClick(m_nListIndex, pMsg->wParam != MK_LBUTTON);
+            if (pMsg->wParam == MK_LBUTTON && ::IsWindow(self))
+                RedrawWindow(nullptr, nullptr, kRedrawNow);
         }
         return false;
     case WM_LBUTTONDBLCLK:
-        Pick();
+        if (m_pOwner)
+            m_pOwner->OnThumbnailPick(m_nListIndex);
         return true;
     case WM_RBUTTONDOWN: {
-        SelectThis(false);
         CPoint pt(pMsg->lParam);
         ClientToScreen(&pt);
-        ShowContextMenu(pt);
+        // The menu's loop may let the grid re-create its controls: nothing of this one is touched after.
+        if (m_pOwner)
+            m_pOwner->OnThumbnailMenu(m_nListIndex, pt);
         return true;
     }
     case WM_KEYDOWN:
-        // Keyboard navigation belongs to the grid.
-        if (HWND view = m_pView ? m_pView->m_hWnd : nullptr) {
-            ::SetFocus(view);
-            ::PostMessageA(view, WM_KEYDOWN, pMsg->wParam, pMsg->lParam);
-        }
+        if (m_pOwner)
+            m_pOwner->OnThumbnailKey(pMsg->wParam, pMsg->lParam);
         return true;
     default:
         return false;
@@ -446,58 +352,4 @@ CMenu BuildThumbnailMenu(CMenu& menu, int sortMode, bool canPaste) {
     if (sortMode >= 0 && sortMode < 3)
         popup.CheckMenuItem(kSortIds[sortMode], MF_BYCOMMAND | MF_CHECKED);
     return popup;
-}
-
-void exCDwgThumbnail::ShowContextMenu(POINT screenPoint) {
-    CMenu menu;
-    CMenu popup = BuildThumbnailMenu(menu, m_pView ? m_pView->SortMode() : 0,
-                                     m_pView && m_pView->ClipboardHoldsDrawings());
-    if (!popup.m_hMenu)
-        return;
-    HWND self = m_hWnd;
-    const int command = popup.TrackPopupMenu(TPM_RETURNCMD | TPM_RIGHTBUTTON | TPM_NONOTIFY, screenPoint.x,
-                                             screenPoint.y, self);
-    // The menu's own loop may have let the grid re-create its controls: act only if this one still stands.
-    if (!::IsWindow(self) || CWnd::FromHandle(self) != this)
-        return;
-    OnContextCommand(command);
-}
-
-void exCDwgThumbnail::OnContextCommand(int command) {
-    switch (command) {
-    case ID_SORT_NAME:
-    case ID_SORT_DATE:
-    case ID_SORT_SIZE:
-        // The sort belongs to the window the grid lives in.
-        if (HWND frame = ::GetAncestor(m_hWnd, GA_ROOT); frame && frame != m_hWnd)
-            ::PostMessageA(frame, WM_COMMAND, static_cast<WPARAM>(command), 0);
-        break;
-    // The file commands run the shell's loops: nothing of this control is touched after them.
-    case ID_THUMB_COPY:
-        if (m_pView)
-            m_pView->CopySelection(false);
-        break;
-    case ID_THUMB_DELETE:
-        if (m_pView)
-            m_pView->DeleteSelection();
-        break;
-    case ID_THUMB_PASTE:
-        if (m_pView)
-            m_pView->PasteFiles();
-        break;
-    case ID_THUMB_RENAME:
-        m_wndLabel.BeginRename();
-        break;
-    case ID_THUMB_PROPERTY:
-        ShowProperties();
-        break;
-    default:
-        break;
-    }
-}
-
-void exCDwgThumbnail::ShowProperties() {
-    // The full path: the property sheet does not depend on the current directory.
-    if (m_pView)
-        m_pView->ShowProperties(CurrentFolderWithSlash() + RecordAt(m_nListIndex).m_strName);
 }

@@ -3,9 +3,9 @@
 // size and date. The grid re-creates these as rows scroll into view, so a control is bound to a list
 // index only between its creation and its destruction; the selection lives in the record.
 //
-// Ownership: the grid's pool owns the controls; a control owns its label (a sibling window, child of the
-// grid view) and its tooltip, and DestroyWindow takes both down. A control reaches the grid (and through
-// it the document and the frame) through the view it was created in.
+// Ownership: the grid's pool owns the controls; a control owns its label (a sibling window on the same
+// parent) and its tooltip, and DestroyWindow takes both down. A control knows its owner only as a
+// ThumbnailOwner: it reads its drawing from the owner's folder and reports the user's gestures to it.
 #pragma once
 
 #include "framework/afxwin.h"
@@ -13,7 +13,35 @@
 
 #include <string>
 
-class CTessel3View;
+class DrawingFolder;
+
+// What the user did on a thumbnail, as its owner (the grid) hears it, and what the thumbnail asks of it.
+// The owner decides what each gesture means for the selection, the chosen drawing and the files.
+class ThumbnailOwner {
+public:
+    // The folder whose drawings the thumbnails show.
+    virtual const DrawingFolder& Folder() const = 0;
+    // A click on the picture (toggle: with Ctrl held).
+    virtual void OnThumbnailClick(int index, bool toggle) = 0;
+    // A double click on the picture: the drawing is picked.
+    virtual void OnThumbnailPick(int index) = 0;
+    // A right click on the picture, at a point on the screen.
+    virtual void OnThumbnailMenu(int index, POINT screenPoint) = 0;
+    // A key pressed on the picture: the keyboard belongs to the owner.
+    virtual void OnThumbnailKey(WPARAM key, LPARAM data) = 0;
+    // A mouse button went down on the picture: the keyboard moves to the owner.
+    virtual void OnThumbnailMouseDown() = 0;
+    // Enter in a label being renamed. Renamed: the file has its new name (the owner reads the folder
+    // again once the message is done); anything else: the old name must come back.
+    enum class RenameOutcome { Renamed, Refused };
+    virtual RenameOutcome OnThumbnailRename(const std::string& oldName, const std::string& newName) = 0;
+
+protected:
+    ~ThumbnailOwner() = default;
+};
+
+// Height of a thumbnail's label, measured once from the system's font.
+int ThumbnailLabelHeight();
 
 // The label: a read-only edit that becomes the rename field.
 class CThumbLabel : public CEdit {
@@ -51,17 +79,17 @@ public:
     exCDwgThumbnail() = default;
     ~exCDwgThumbnail() override;
 
+    // The picture at cell and its label below it, children of parent; owner hears what the user does.
     bool Create(const std::string& name, int listIndex, const char* windowName, DWORD style, const RECT& cell,
-                CTessel3View* parentView, UINT id);
+                CWnd* parent, ThumbnailOwner* owner, UINT id);
     // Shows another drawing in the existing windows, moved to another cell: what destroying the control
     // and creating it anew would show, at a fraction of the cost. False (nothing changed) when the control
     // has no window or its label is being renamed.
     bool Rebind(const std::string& name, int listIndex, const RECT& cell);
     bool DestroyWindow() override;
     bool PreTranslateMessage(MSG* pMsg) override;
-    // Drops the label's highlight and the record's selection.
-    void Unselect();
-    // Highlights the label when the record is selected (after the selection changed elsewhere).
+    // Highlights the label when the drawing is selected, drops the highlight when it is not (after the
+    // selection changed).
     void ShowSelection();
     int ListIndex() const { return m_nListIndex; }
     const std::string& Name() const { return m_strName; }
@@ -78,23 +106,17 @@ protected:
 
 private:
     friend class CThumbLabel;
-    bool CreateLabel(const std::string& name, const RECT& cell);
+    bool CreateLabel(const std::string& name, const RECT& cell, CWnd* parent);
     static CRect LabelRect(const RECT& cell);
     void CreateToolTip();
     // The mouse and key table of PreTranslateMessage; true when the message was consumed.
     bool TranslateInput(MSG* pMsg);
-    // Marks this drawing selected and current; clearOthers first drops every other selection.
-    void SelectThis(bool clearOthers);
-    void ToggleSelection();
-    void Pick();
-    void ShowContextMenu(POINT screenPoint);
-    void OnContextCommand(int command);
-    void ShowProperties();
+    bool IsDrawingSelected() const;
     void HighlightLabel();
     void DropLabelHighlight();
 
-    CTessel3View* m_pView = nullptr; // the grid that created the window, while it exists
-    std::string m_strName;           // the file name shown
+    ThumbnailOwner* m_pOwner = nullptr; // the grid that created the window, while it exists
+    std::string m_strName;              // the file name shown
     CThumbLabel m_wndLabel;
     int m_nListIndex = -1;
     CToolTipCtrl m_wndToolTip;
@@ -102,10 +124,6 @@ private:
     int m_nToolTipWidth = 0;
     bool m_bToolTipActive = false;
 };
-
-// The current directory, and the same with a "\" at its end.
-std::string CurrentFolder();
-std::string CurrentFolderWithSlash();
 
 // Loads the thumbnail's context menu into menu and returns its popup (not owned), prepared: "&Paste"
 // greyed unless canPaste (the clipboard holds drawings), sortMode (0 name, 1 date, 2 size) checked. Empty

@@ -3,7 +3,8 @@
 #include "res/resource.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
-#include "thumbs/DwgList.h"
+#include "thumbs/DrawingFolder.h"
+#include "thumbs/RenameRules.h"
 
 #include <algorithm>
 #include <utility>
@@ -120,16 +121,6 @@ int CTessel3View::SortMode() const {
     return doc ? doc->m_nSort : 0;
 }
 
-void CTessel3View::EnablePick(bool enable) {
-    if (onEnablePick)
-        onEnablePick(enable);
-}
-
-void CTessel3View::SetTitle(const std::string& text) {
-    if (onSetTitle)
-        onSetTitle(text);
-}
-
 void CTessel3View::SetStatusText(const std::string& text) {
     if (onStatusText)
         onStatusText(text);
@@ -138,16 +129,6 @@ void CTessel3View::SetStatusText(const std::string& text) {
 void CTessel3View::TellUser(const std::string& text) {
     if (onTellUser)
         onTellUser(text);
-}
-
-int CTessel3View::LabelHeight() {
-    static const int height = [] {
-        CClientDC dc(nullptr);
-        TEXTMETRICA tm{};
-        dc.GetTextMetrics(&tm);
-        return grid::LabelHeight(tm.tmHeight, ::GetSystemMetrics(SM_CYEDGE));
-    }();
-    return height;
 }
 
 grid::Geometry CTessel3View::Geometry() const {
@@ -177,10 +158,6 @@ void CTessel3View::OnInitialUpdate() {
 // ---- operations -------------------------------------------------------------------------------------
 
 void CTessel3View::Rebuild() {
-    const CTessel3Doc* doc = Document();
-    SetTitle(doc ? doc->m_strPath : std::string());
-    if (onFolderShown)
-        onFolderShown();
     m_nPoolRows = grid::kDefaultPoolRows;
     ScrollToBegin(true);
 }
@@ -189,8 +166,8 @@ void CTessel3View::ScrollToBegin(bool sort) {
     RedrawHold hold(m_hWnd);
     m_nColumns = grid::ColumnsForWidth(GetClientRect().Width(), m_nCellWidth, m_nGap);
     m_nOldColumns = m_nColumns; // a later relayout keeps the first drawing where it is
-    if (sort)
-        SortDwgList(SortMode());
+    if (sort && m_pFolder)
+        m_pFolder->Sort(SortMode());
     m_nFirstRow = 0;
     // The controls are re-created below, so the contents need not be moved.
     ::SetScrollPos(m_hWnd, SB_HORZ, 0, TRUE);
@@ -199,11 +176,11 @@ void CTessel3View::ScrollToBegin(bool sort) {
 }
 
 void CTessel3View::ShowIndex(int index) {
-    if (index < 0 || index >= DwgList.GetSize())
+    if (index < 0 || index >= DrawingCount())
         return;
     // Already in the first row shown: only the selection changes (typing a longer prefix).
     const int columns = grid::ColumnsForWidth(GetClientRect().Width(), m_nCellWidth, m_nGap);
-    if (columns == m_nColumns && m_nCount == DwgList.GetSize() &&
+    if (columns == m_nColumns && m_nCount == DrawingCount() &&
         index / std::max(1, m_nColumns) == m_nFirstRow) {
         if (exCDwgThumbnail* control = ControlOf(index)) {
             control->ShowSelection();
@@ -217,16 +194,17 @@ void CTessel3View::ShowIndex(int index) {
 }
 
 void CTessel3View::DeselectAll() {
-    DeselectAllFlags();
+    if (m_pFolder)
+        m_pFolder->DeselectAll();
     for (const auto& control : m_pool) {
         if (control->m_hWnd)
-            control->Unselect();
+            control->ShowSelection();
     }
 }
 
 void CTessel3View::SelectAll() {
-    for (int i = 0; i < DwgList.GetSize(); ++i)
-        DwgList[i].Select();
+    if (m_pFolder)
+        m_pFolder->SelectAll();
 }
 
 void CTessel3View::Increase() {
@@ -249,63 +227,174 @@ void CTessel3View::PostRefresh() {
 }
 
 void CTessel3View::Refresh() {
-    if (onRefreshFolder && onRefreshFolder())
-        return;
-    const CTessel3Doc* doc = Document();
-    std::string folder = doc ? doc->m_strPath : std::string();
-    if (folder.empty()) {
-        char buffer[MAX_PATH + 1] = {};
-        DWORD n = ::GetCurrentDirectoryA(sizeof buffer, buffer);
-        folder.assign(buffer, n < sizeof buffer ? n : 0);
-    }
-    if (folder.size() > 3 && folder.back() == '\\') // "C:\" keeps its separator
-        folder.pop_back();
-    std::string problem;
-    ScanFolderPath(folder.c_str(), ".dwg", &problem);
-    Rebuild();
-    if (!problem.empty())
-        SetStatusText(problem);
+    // The folder's owner hears that it was read again and has the grid rebuilt.
+    if (m_pFolder)
+        m_pFolder->Refresh();
 }
 
 bool CTessel3View::ClipboardHoldsDrawings() const {
-    return onClipboardHoldsDrawings && onClipboardHoldsDrawings();
+    return m_pFileCommands && m_pFileCommands->ClipboardHoldsDrawings();
 }
 
 bool CTessel3View::AnySelected() const {
-    return ::AnySelected();
+    return m_pFolder && m_pFolder->AnySelected();
 }
 
 void CTessel3View::CopySelection(bool cut) {
-    if (onCopySelection)
-        onCopySelection(cut);
+    if (m_pFileCommands && m_pFolder)
+        m_pFileCommands->Copy(m_pFolder->SelectedPaths(), cut);
 }
 
 void CTessel3View::PasteFiles() {
-    if (onPaste && onPaste())
+    if (m_pFileCommands && m_pFolder && m_pFileCommands->Paste(m_pFolder->Folder()))
         PostRefresh();
 }
 
 void CTessel3View::DeleteSelection() {
-    if (!onDeleteSelection)
+    if (!m_pFileCommands || !m_pFolder)
         return;
-    onDeleteSelection();
+    const std::vector<std::string> paths = m_pFolder->SelectedPaths();
+    if (paths.empty())
+        return;
+    m_pFileCommands->Delete(paths);
     PostRefresh();
 }
 
-int CTessel3View::RenameFile(const std::string& source, const std::string& destination) {
-    if (onRenameFile)
-        return onRenameFile(source, destination);
-    if (::MoveFileA(source.c_str(), destination.c_str()))
-        return 0;
-    const DWORD error = ::GetLastError();
-    TellUser("Cannot rename \"" + source + "\" to \"" + destination + "\" (error " + std::to_string(error) +
-             ").");
-    return static_cast<int>(error ? error : 1);
+ThumbnailOwner::RenameOutcome CTessel3View::RenameDrawing(const std::string& oldName,
+                                                          const std::string& newName) {
+    if (!m_pFolder)
+        return RenameOutcome::Refused;
+    const std::string& folder = m_pFolder->Folder();
+    const RenameVerdict verdict = CheckRename(folder, oldName, newName, [&folder](const std::string& name) {
+        return ::GetFileAttributesA(DrawingFolder::Join(folder, name).c_str()) != INVALID_FILE_ATTRIBUTES;
+    });
+    if (verdict != RenameVerdict::Rename) {
+        if (verdict != RenameVerdict::Unchanged)
+            TellUser(RenameRefusalText(verdict, newName));
+        return RenameOutcome::Refused;
+    }
+    // The shell's loop runs inside: the grid may re-create its controls meanwhile.
+    if (!m_pFileCommands || m_pFileCommands->Rename(DrawingFolder::Join(folder, oldName),
+                                                    DrawingFolder::Join(folder, newName)) != 0)
+        return RenameOutcome::Refused;
+    // The rescan rebuilds the grid, which destroys the label: it runs once this message is done.
+    PostRefresh();
+    return RenameOutcome::Renamed;
 }
 
-void CTessel3View::ShowProperties(const std::string& path) {
-    if (onShowProperties)
-        onShowProperties(path);
+void CTessel3View::ShowProperties(int index) {
+    // The full path: the property sheet does not depend on the current directory.
+    if (m_pFileCommands && m_pFolder && index >= 0 && index < m_pFolder->Count())
+        m_pFileCommands->ShowProperties(m_pFolder->PathOf(index));
+}
+
+// ---- what the thumbnails report ---------------------------------------------------------------------
+
+int CTessel3View::DrawingCount() const {
+    return m_pFolder ? m_pFolder->Count() : 0;
+}
+
+const DrawingFolder& CTessel3View::Folder() const {
+    return *m_pFolder; // thumbnails exist only while the grid shows a folder's drawings
+}
+
+void CTessel3View::SelectAndChoose(int index, bool clearOthers) {
+    Folder().Drawing(index); // a control left over from a list that changed: the invalid-argument error
+    if (clearOthers)
+        DeselectAll();
+    m_pFolder->Select(index);
+    if (exCDwgThumbnail* control = ControlOf(index))
+        control->ShowSelection();
+    m_pFolder->Choose(index);
+    SetStatusText(std::string()); // a search's "no drawing starts with" is over
+}
+
+void CTessel3View::OnThumbnailMouseDown() {
+    // A click in the grid takes the keyboard there (from the folder tree, the search edit).
+    HWND focus = ::GetFocus();
+    if (m_hWnd && focus != m_hWnd && !::IsChild(m_hWnd, focus))
+        ::SetFocus(m_hWnd);
+}
+
+void CTessel3View::OnThumbnailClick(int index, bool toggle) {
+    if (!toggle) {
+        SelectAndChoose(index, true);
+        return;
+    }
+    Folder().Drawing(index); // a control left over from a list that changed: the invalid-argument error
+    exCDwgThumbnail* control = ControlOf(index);
+    if (control)
+        control->SetFocus();
+    if (m_pFolder->IsSelected(index)) {
+        m_pFolder->Deselect(index);
+        if (control)
+            control->ShowSelection();
+        m_pFolder->ChooseNone();
+    } else {
+        SelectAndChoose(index, false);
+    }
+}
+
+void CTessel3View::OnThumbnailPick(int index) {
+    Folder().Drawing(index); // a control left over from a list that changed: the invalid-argument error
+    m_pFolder->Choose(index);
+    PostAppResult(kAppAccept);
+}
+
+void CTessel3View::OnThumbnailKey(WPARAM key, LPARAM data) {
+    // Keyboard navigation belongs to the grid.
+    if (!m_hWnd)
+        return;
+    ::SetFocus(m_hWnd);
+    ::PostMessageA(m_hWnd, WM_KEYDOWN, key, data);
+}
+
+ThumbnailOwner::RenameOutcome CTessel3View::OnThumbnailRename(const std::string& oldName,
+                                                              const std::string& newName) {
+    return RenameDrawing(oldName, newName);
+}
+
+void CTessel3View::OnThumbnailMenu(int index, POINT screenPoint) {
+    SelectAndChoose(index, false);
+    CMenu menu;
+    CMenu popup = BuildThumbnailMenu(menu, SortMode(), ClipboardHoldsDrawings());
+    if (!popup.m_hMenu)
+        return;
+    const int command = popup.TrackPopupMenu(TPM_RETURNCMD | TPM_RIGHTBUTTON | TPM_NONOTIFY, screenPoint.x,
+                                             screenPoint.y, m_hWnd);
+    RunThumbnailCommand(index, command);
+}
+
+void CTessel3View::RunThumbnailCommand(int index, int command) {
+    switch (command) {
+    case ID_SORT_NAME:
+    case ID_SORT_DATE:
+    case ID_SORT_SIZE:
+        // The sort belongs to the frame, which keeps it for the next run.
+        if (onSort)
+            onSort(command == ID_SORT_NAME ? 0 : command == ID_SORT_DATE ? 1 : 2);
+        break;
+    // The file commands run the shell's loops.
+    case ID_THUMB_COPY:
+        CopySelection(false);
+        break;
+    case ID_THUMB_DELETE:
+        DeleteSelection();
+        break;
+    case ID_THUMB_PASTE:
+        PasteFiles();
+        break;
+    case ID_THUMB_RENAME:
+        // The menu's loop may have let the grid re-create its controls: the one showing index now.
+        if (exCDwgThumbnail* control = ControlOf(index))
+            control->Label().BeginRename();
+        break;
+    case ID_THUMB_PROPERTY:
+        ShowProperties(index);
+        break;
+    default:
+        break;
+    }
 }
 
 int CTessel3View::RunContextMenu(POINT screenPoint) {
@@ -364,7 +453,7 @@ void CTessel3View::Layout() {
     RedrawHold hold(m_hWnd);
     DestroyPool();
     m_pool.clear();
-    m_nCount = DwgList.GetSize();
+    m_nCount = DrawingCount();
     {
         // A client beyond the largest screen would need more controls than the process can spare.
         const CRect client = GetClientRect();
@@ -533,12 +622,13 @@ void CTessel3View::PlaceRow(int row, int rowTop, bool onlyMissing) {
         CRect rect(cell.left, cell.top, cell.right, cell.bottom);
         rect.OffsetRect(-sheet.x, -sheet.y);
         // A row scrolled into view takes over the windows of the row that left it.
-        if (cell.index < m_nCount && control.Rebind(DwgList[cell.index].m_strName, cell.index, rect))
+        if (cell.index < m_nCount && control.Rebind(Folder().Drawing(cell.index).m_strName, cell.index, rect))
             continue;
         if (control.m_hWnd)
             control.DestroyWindow();
         if (cell.index < m_nCount)
-            control.Create(DwgList[cell.index].m_strName, cell.index, nullptr, WS_CHILD, rect, this, 0);
+            control.Create(Folder().Drawing(cell.index).m_strName, cell.index, nullptr, WS_CHILD, rect,
+                           Sheet(), this, 0);
     }
 }
 
@@ -546,19 +636,12 @@ void CTessel3View::Refit(bool resizeFrame) {
     if (m_nRows <= 0)
         return;
     FlagGuard guard(m_bAligning);
-    HWND frame = ::GetAncestor(m_hWnd, GA_ROOT);
-    CRect frameRect;
-    ::GetWindowRect(frame, &frameRect);
     const CRect client = GetClientRect();
-    const grid::RefitNumbers n =
-        grid::ComputeRefit(Geometry(), client.right, client.bottom, frameRect.Width(), frameRect.Height());
+    // With a frame of no size the numbers are what the frame must grow by.
+    const grid::RefitNumbers n = grid::ComputeRefit(Geometry(), client.right, client.bottom, 0, 0);
     m_nColumns = n.columns;
-    if (resizeFrame) {
-        // A frame that is a child window is placed in its parent's coordinates.
-        if (HWND parent = ::GetParent(frame); parent && (::GetWindowLongPtrA(frame, GWL_STYLE) & WS_CHILD))
-            ::MapWindowPoints(nullptr, parent, reinterpret_cast<POINT*>(&frameRect), 2);
-        ::MoveWindow(frame, frameRect.left, frameRect.top, n.frameWidth, n.frameHeight, TRUE);
-    }
+    if (resizeFrame && onGrowFrame)
+        onGrowFrame(n.frameWidth, n.frameHeight);
     Relayout();
 }
 

@@ -2,9 +2,11 @@
 // cells, keeps a ring of thumbnail controls for the visible rows plus two, and scrolls row by row over a
 // scroll range capped at 32768 pixels.
 //
-// The owner (the frame) creates the view with a context that holds the document, and sets the on...
-// handlers through which the grid and its thumbnails tell it what changed; a handler left empty is
-// simply not called. The thumbnails reach the grid through the view that created them.
+// The owner (the frame) creates the view with a context that holds the document, hands it the folder
+// model (SetFolder) and the file commands, and sets the on... handlers through which the grid tells it
+// what only the frame can do; a handler left empty is simply not called. The chosen drawing, the title
+// and the pick follow from the folder model, whose owner hears its changes. The thumbnails report what
+// the user does to the grid, their ThumbnailOwner.
 //
 // The controls sit on a sheet, a child window that covers the client area and a margin of rows above
 // and below it, with the first row shown at the top of the client area; the scroll position only mirrors
@@ -23,6 +25,28 @@
 
 class CTessel3Doc;
 class CTessel3View;
+class DrawingFolder;
+
+// The file commands the grid offers in its menus and keys, carried out by its owner's file operations.
+// Paths are full; the folder is the one shown.
+class GridFileCommands {
+public:
+    // Whether Paste is offered: the clipboard's file list names a drawing.
+    virtual bool ClipboardHoldsDrawings() = 0;
+    // Puts the drawings on the clipboard (cut: the next paste moves them).
+    virtual void Copy(const std::vector<std::string>& paths, bool cut) = 0;
+    // Pastes the clipboard's files into folder; true when files were pasted.
+    virtual bool Paste(const std::string& folder) = 0;
+    // Sends the drawings to the Recycle Bin, the shell confirming.
+    virtual void Delete(const std::vector<std::string>& paths) = 0;
+    // Renames a file; the shell's result, 0 when it was renamed.
+    virtual int Rename(const std::string& source, const std::string& destination) = 0;
+    // The shell's property sheet of a file.
+    virtual void ShowProperties(const std::string& path) = 0;
+
+protected:
+    ~GridFileCommands() = default;
+};
 
 // The sheet under the thumbnails and their labels. Scrolling a window moves each of its children, one
 // round trip to the window system apiece; with the controls on one sheet a row step moves one window, and
@@ -45,42 +69,35 @@ private:
 // The numbers of the grid's own context menu (built at run time).
 enum GridMenuCommand { kGridMenuCopy = 1, kGridMenuPaste = 2, kGridMenuDelete = 3, kGridMenuRename = 4 };
 
-class CTessel3View : public CScrollView {
+class CTessel3View : public CScrollView, private ThumbnailOwner {
 public:
     CTessel3View();
     ~CTessel3View() override;
 
     // Set by the owner when it creates the view.
     std::function<int()> onSortMode;                      // 0 by name, 1 by date, 2 by size
-    std::function<void(bool)> onEnablePick;               // the accept button and its label
-    std::function<void(const std::string&)> onSetTitle;   // the owner's window text
-    std::function<void()> onFolderShown;                  // a folder was scanned and laid out
+    std::function<void(int mode)> onSort;                 // a sort chosen in a thumbnail's menu
     std::function<void(const std::string&)> onStatusText; // the status bar's message (empty clears)
     std::function<void(const std::string&)> onTellUser;   // something the user must read
     std::function<void()> onFocusFolderTree;              // Tab leaves the grid for the folder tree
-    // Rescans the current folder through the folder tree and rebuilds; false when there is no tree to
-    // do it (the grid then rescans its folder by path itself).
-    std::function<bool()> onRefreshFolder;
-    // The file commands, carried out by the owner's file operations; the grid offers them in its menus
-    // and keys. Each looks at the records' selection and the current folder itself.
-    std::function<bool()> onClipboardHoldsDrawings; // whether Paste is offered
-    std::function<void(bool cut)> onCopySelection;  // the selected drawings onto the clipboard
-    std::function<bool()> onPaste;                  // true when files were pasted
-    std::function<void()> onDeleteSelection;        // to the Recycle Bin, the shell confirming
-    // Renames a file (full paths); the shell's result, 0 when it was renamed.
-    std::function<int(const std::string& source, const std::string& destination)> onRenameFile;
-    std::function<void(const std::string& path)> onShowProperties; // the shell's property sheet
+    // Align: the frame grows (or shrinks) by so many pixels, to hold whole columns and rows.
+    std::function<void(int widthChange, int heightChange)> onGrowFrame;
 
-    // The document of the creation context (the explorer's settings and current drawing), or nullptr.
+    // The folder whose drawings the grid shows (not owned; it outlives the view). Set before the view
+    // lays anything out.
+    void SetFolder(DrawingFolder* folder) { m_pFolder = folder; }
+    DrawingFolder* GetFolder() const { return m_pFolder; }
+    // The file commands (not owned); without them the menus offer nothing and rename refuses.
+    void SetFileCommands(GridFileCommands* commands) { m_pFileCommands = commands; }
+
+    // The document of the creation context (the explorer's settings), or nullptr.
     CTessel3Doc* Document() const;
-    // What the grid and its thumbnails tell the owner, through the handlers above.
+    // What the grid tells the owner, through the handlers above.
     int SortMode() const;
-    void EnablePick(bool enable);
-    void SetTitle(const std::string& text);
     void SetStatusText(const std::string& text);
     void TellUser(const std::string& text);
 
-    // After every scan of the current folder: title, status, then back to the first drawing, sorted.
+    // After every scan of the folder: back to the first drawing, sorted.
     void Rebuild();
     // Back to the first drawing: columns recomputed, optionally sorted by the frame's sort mode.
     void ScrollToBegin(bool sort);
@@ -93,8 +110,8 @@ public:
     void Increase();
     void Decrease();
     void Align();
-    // Rescans the current folder and rebuilds, once the message being handled is done (a control that
-    // asks for it is destroyed by the rebuild).
+    // Reads the folder again, once the message being handled is done (a control that asks for it is
+    // destroyed by the rebuild that follows).
     void PostRefresh();
 
     // The file commands, as the menus and keys of the grid and its thumbnails run them. Those that change
@@ -105,10 +122,9 @@ public:
     void CopySelection(bool cut);
     void PasteFiles();
     void DeleteSelection();
-    // Renames with the owner's file operation (without one, with a plain file move that says why it
-    // failed); 0 when the file was renamed.
-    int RenameFile(const std::string& source, const std::string& destination);
-    void ShowProperties(const std::string& path);
+    // Renames a drawing of the folder after checking the new name; a refusal is told to the user.
+    ThumbnailOwner::RenameOutcome RenameDrawing(const std::string& oldName, const std::string& newName);
+    void ShowProperties(int index);
     // The grid's own context menu at a screen point: "&Copy" 1, "&Delete" 3, "&Paste" 2, "&Rename" 4
     // (always greyed), in that order. Returns the number chosen (0 when dismissed) after running it.
     int RunContextMenu(POINT screenPoint);
@@ -135,8 +151,8 @@ public:
     // The live control showing list index `index`, or nullptr.
     exCDwgThumbnail* ControlOf(int index);
 
-    // Height of a thumbnail's label, measured once from the view's font.
-    static int LabelHeight();
+    // Height of a thumbnail's label, measured once from the system's font.
+    static int LabelHeight() { return ThumbnailLabelHeight(); }
     // The window the thumbnails and labels are children of (see CGridSheet); the view itself until its
     // first layout has made the sheet.
     CWnd* Sheet() { return m_wndSheet.m_hWnd ? static_cast<CWnd*>(&m_wndSheet) : this; }
@@ -163,6 +179,19 @@ protected:
     bool OnCmdMsg(UINT id, int code) override;
 
 private:
+    // What the thumbnails report (ThumbnailOwner).
+    const DrawingFolder& Folder() const override;
+    void OnThumbnailClick(int index, bool toggle) override;
+    void OnThumbnailPick(int index) override;
+    void OnThumbnailMenu(int index, POINT screenPoint) override;
+    void OnThumbnailKey(WPARAM key, LPARAM data) override;
+    void OnThumbnailMouseDown() override;
+    RenameOutcome OnThumbnailRename(const std::string& oldName, const std::string& newName) override;
+    void RunThumbnailCommand(int index, int command);
+    // Makes the drawing selected and chosen; clearOthers first drops every other selection.
+    void SelectAndChoose(int index, bool clearOthers);
+    int DrawingCount() const;
+
     grid::Geometry Geometry() const;
     void Layout();
     void Refit(bool resizeFrame);
@@ -203,6 +232,8 @@ private:
     int m_nRows = 0;
     int m_nVisibleRows = 0;
     bool m_bAligning = false;
+    DrawingFolder* m_pFolder = nullptr;
+    GridFileCommands* m_pFileCommands = nullptr;
     bool m_bRowsPending = false; // WM_ORVEX_MORE_ROWS is posted and not handled yet
     int m_nTotalHeight = 0;      // capped scroll height of the last layout
     int m_nTotalWidth = 0;       // width of the grid's columns in the last layout

@@ -2,7 +2,7 @@
 
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
-#include "thumbs/DwgList.h"
+#include "thumbs/DrawingFolder.h"
 #include "tree/ShellNamespace.h"
 
 #include <shellapi.h>
@@ -72,15 +72,9 @@ void CopyLabel(TVITEMA& item, const std::string& label, bool wideText) {
 }
 
 // Whether two paths name the same folder as written: case, the kind of separator and a trailing one aside.
-bool SameFolderPath(std::string a, std::string b) {
-    for (std::string* path : {&a, &b}) {
-        for (char& c : *path)
-            if (c == '/')
-                c = '\\';
-        while (path->size() > 3 && path->back() == '\\')
-            path->pop_back();
-    }
-    return !a.empty() && ::lstrcmpiA(a.c_str(), b.c_str()) == 0;
+bool SameFolderPath(const std::string& a, const std::string& b) {
+    const std::string one = DrawingFolder::Spelling(a);
+    return !one.empty() && ::lstrcmpiA(one.c_str(), DrawingFolder::Spelling(b).c_str()) == 0;
 }
 
 } // namespace
@@ -344,7 +338,7 @@ void CShellTreeCtrl::WalkToStart() {
     TakeShellIcons(); // normally queued before and taken already
     // Walked hidden, as the explorer keeps it until now: a tree that shows costs several times as much to
     // fill and select in (about 150 ms against 30 for the walk to a folder of the benchmarks).
-    const std::string shownFolder = m_pDoc ? m_pDoc->m_strPath : std::string();
+    const std::string shownFolder = m_pFolder ? m_pFolder->Folder() : std::string();
     if (m_pDoc)
         ExpandToLabelPath(m_pDoc->m_strShellPath, false);
     HTREEITEM target = m_hPathTarget;
@@ -402,48 +396,32 @@ std::string CShellTreeCtrl::FolderPathOf(HTREEITEM item) const {
     return path;
 }
 
-int CShellTreeCtrl::ScanFolder(HTREEITEM item, const char* needle, std::string* problem) {
-    if (problem)
-        problem->clear();
+bool CShellTreeCtrl::ShowFolder(HTREEITEM item) {
     if (m_pDoc)
         m_pDoc->m_strShellPath = GetLabelPath(item);
-    BeginScan();
+    if (!m_pFolder)
+        return false;
     const std::string path = FolderPathOf(item);
-    if (path.empty())
-        return 0; // Desktop, My Computer and the like: the current folder stays what it was
-    // The scan checks that the path fits the runtime's buffers before it is used anywhere.
-    const int scanned = ScanFolderPath(path.c_str(), needle, problem);
-    if (m_pDoc && FolderPathProblem(path).empty())
-        m_pDoc->m_strPath = path;
-    return scanned;
-}
-
-void CShellTreeCtrl::ShowScanned(HTREEITEM item, int, const std::string& problem) {
-    const std::string path = FolderPathOf(item);
-    if (onFolderShown)
-        onFolderShown(path, GetItemText(item));
-    if (onStatusText)
-        onStatusText(problem);
+    if (path.empty()) {
+        // Desktop, My Computer and the like: the folder shown stays what it was, with nothing in it.
+        m_pFolder->ShowNoFolder();
+        if (onNoFolderShown)
+            onNoFolderShown(GetItemText(item));
+        return false;
+    }
+    return m_pFolder->Show(path);
 }
 
 void CShellTreeCtrl::RefreshCurrentFolder() {
-    HTREEITEM item = GetSelectedItem();
-    if (!item)
-        return;
-    std::string problem;
-    const int scanned = ScanFolder(item, ".dwg", &problem);
-    ShowScanned(item, scanned, problem);
+    if (HTREEITEM item = GetSelectedItem())
+        ShowFolder(item);
 }
 
 void CShellTreeCtrl::OnSelChanged(HTREEITEM item) {
     if (m_bClosing || !m_bFollowSelection || !item)
         return;
-    if (onEnablePick)
-        onEnablePick(false);
-    std::string problem;
-    const int scanned = ScanFolder(item, ".dwg", &problem);
+    ShowFolder(item);
     HighlightSelected(item);
-    ShowScanned(item, scanned, problem);
     SetFocus();
 }
 

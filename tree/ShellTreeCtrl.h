@@ -17,6 +17,7 @@
 #include <string>
 
 class CTessel3Doc;
+class DrawingFolder;
 
 class CShellTreeCtrl : public CWaitingTreeCtrl {
 public:
@@ -32,15 +33,15 @@ public:
     ~CShellTreeCtrl() override;
 
     // Set by the owner.
-    std::function<void(bool)> onEnablePick; // the accept button: off while the folder changes
-    // A folder selection was scanned into the drawing list: the grid rebuilds. folderPath is empty for a
-    // node without a file-system path (Desktop, My Computer), whose label is then given.
-    std::function<void(const std::string& folderPath, const std::string& label)> onFolderShown;
-    std::function<void(const std::string&)> onStatusText; // what the scan has to say (empty: all well)
-    std::function<void(HTREEITEM, CPoint)> onFolderMenu;  // right click on a node (screen point)
+    // A node without a file-system path (Desktop, My Computer) was selected: the grid is empty, and the
+    // node's label names what is shown.
+    std::function<void(const std::string& label)> onNoFolderShown;
+    std::function<void(HTREEITEM, CPoint)> onFolderMenu; // right click on a node (screen point)
     // The walk to the start folder has ended (WalkToStartLater); reached: a node was selected.
     std::function<void(bool reached)> onWalkEnded;
     void SetDocument(CTessel3Doc* doc) { m_pDoc = doc; }
+    // The folder model the selected node's folder is shown in (not owned).
+    void SetDrawingFolder(DrawingFolder* folder) { m_pFolder = folder; }
 
     UINT GetCallbackMask() const { return m_nCallbackMask; }
     void SetCallbackMask(UINT mask) { m_nCallbackMask = mask & 0x63; }
@@ -74,12 +75,11 @@ public:
     void WalkToStartLater();
     // The file-system path of a node, or empty for a virtual folder and for the Desktop at the top.
     std::string FolderPathOf(HTREEITEM item) const;
-    // Scans the item's folder into the drawing list: the document's label path first, then the list
-    // emptied; a node with a file-system path becomes the document's folder and the current directory
-    // and its drawings (names containing needle) are listed. 1 when the folder was read to its end, 0
-    // when it has no folder or could not be read. problem receives what the user should be told.
-    int ScanFolder(HTREEITEM item, const char* needle, std::string* problem = nullptr);
-    // Rescans the selected folder and has the grid rebuild (after a rename or a file command).
+    // Shows the item's folder in the folder model: the document's label path first; a node with a
+    // file-system path is shown (read, made the current folder), one without shows no folder. True when
+    // a folder was read.
+    bool ShowFolder(HTREEITEM item);
+    // Shows the selected node's folder again.
     void RefreshCurrentFolder();
     // Whether a selection change scans its folder (on after construction). The explorer holds it off while
     // it opens: a tree control that gets the focus without a selection selects its first visible item,
@@ -92,9 +92,6 @@ protected:
     bool OnNotifyReflect(NMHDR* hdr, LRESULT* result) override;
     void OnDestroy() override;
     LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
-
-    // Tells the owner what a scan of the item found (title, grid, status).
-    void ShowScanned(HTREEITEM item, int scanned, const std::string& problem);
 
 private:
     HTREEITEM InsertNode(HTREEITEM parent, IShellFolder* parentFolder, LPCITEMIDLIST parentId,
@@ -113,6 +110,7 @@ private:
     // The plain folder's icon, closed and open, once the shell has been asked (-1: not yet).
     mutable int m_plainIcon[2] = {-1, -1};
     CTessel3Doc* m_pDoc = nullptr;
+    DrawingFolder* m_pFolder = nullptr;
     bool m_bClosing = false; // the window is going: selection changes are no longer folder changes
     bool m_bFollowSelection = true;
     HTREEITEM m_hOpenLater = nullptr; // the node OpenPathTargetLater will expand; cleared when it goes

@@ -140,12 +140,6 @@ TEST(DropBlock, ExtensionsAreSplitAsTheRuntimeDoes) {
     EXPECT_FALSE(IsDrawingPath(".dwgx"));
 }
 
-TEST(DropBlock, AFolderGetsOneBackslash) {
-    EXPECT_EQ(FolderWithSlash("C:\\dwg"), "C:\\dwg\\");
-    EXPECT_EQ(FolderWithSlash("C:\\"), "C:\\");
-    EXPECT_EQ(FolderWithSlash(""), "");
-}
-
 TEST(DropBlock, CopyToFileAddsDWGOnlyWithoutExtension) {
     EXPECT_EQ(CopyTargetName("C:\\out\\copy"), "C:\\out\\copy.DWG");
     EXPECT_EQ(CopyTargetName("C:\\out\\copy.txt"), "C:\\out\\copy.txt");

@@ -6,7 +6,7 @@
 #include "fileops/ShellContextMenu.h"
 #include "fileops/ShellFileOp.h"
 #include "framework/afxwin.h"
-#include "thumbs/DwgList.h"
+#include "thumbs/DrawingFolder.h"
 #include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
@@ -125,31 +125,38 @@ int DialogAnswer::s_button = IDOK;
 std::vector<std::string> DialogAnswer::s_seen;
 
 // The drawing list of a folder with these names selected.
-void ListWithSelection(const std::vector<std::string>& names, const std::vector<bool>& selected) {
-    BeginScan();
-    for (std::size_t i = 0; i < names.size(); ++i) {
-        DwgFindEntry entry;
-        entry.name = names[i];
-        AppendScanEntry(entry);
-        if (selected[i])
-            DwgList[static_cast<int>(i)].Select();
+// A folder shown with these drawings in it, some selected.
+struct ListedFolder : FolderReader {
+    std::vector<std::string> names;
+    DrawingFolder folder{*this, nullptr};
+    bool Read(const std::string&, std::vector<DwgData>& drawings, std::string&) override {
+        for (const std::string& name : names) {
+            DwgFindEntry entry;
+            entry.name = name;
+            drawings.emplace_back(entry);
+        }
+        return true;
     }
-    EndScan();
+    void MakeCurrentDirectory(const std::string&) override {}
+};
+
+ListedFolder& Listed() {
+    static ListedFolder listed;
+    return listed;
 }
 
-class CurrentDirectory {
-public:
-    explicit CurrentDirectory(const std::string& folder) {
-        char old[MAX_PATH] = "";
-        ::GetCurrentDirectoryA(MAX_PATH, old);
-        m_old = old;
-        ::SetCurrentDirectoryA(folder.c_str());
-    }
-    ~CurrentDirectory() { ::SetCurrentDirectoryA(m_old.c_str()); }
+const DrawingFolder& Shown() {
+    return Listed().folder;
+}
 
-private:
-    std::string m_old;
-};
+void ListWithSelection(const std::string& folder, const std::vector<std::string>& names,
+                       const std::vector<bool>& selected) {
+    Listed().names = names;
+    Listed().folder.Show(folder);
+    for (std::size_t i = 0; i < names.size(); ++i)
+        if (selected[i])
+            Listed().folder.Select(static_cast<int>(i));
+}
 
 } // namespace
 
@@ -286,8 +293,7 @@ TEST(Clipboard, ATextFileThenADrawingOffersPasteAndPastesBoth) {
     ASSERT_TRUE(PutFileListOnClipboard({a, b}, false));
     ForFileCommands commands;
     EXPECT_TRUE(commands.ClipboardHoldsDrawings());
-    CurrentDirectory here(target);
-    EXPECT_TRUE(commands.PasteIntoCurrentFolder(nullptr));
+    EXPECT_TRUE(commands.PasteInto(target, nullptr));
     EXPECT_EQ(ReadFile(target + "\\notes.txt"), "text");
     EXPECT_EQ(ReadFile(target + "\\PLAN.DWG"), "drawing");
     // A copy leaves the sources and the list.
@@ -303,8 +309,7 @@ TEST(Clipboard, AWideListFromAnotherProgramOffersNoPasteAndPastesNothing) {
     ASSERT_EQ(out, "put-wide 1 ok\n");
     ForFileCommands commands;
     EXPECT_FALSE(commands.ClipboardHoldsDrawings());
-    CurrentDirectory here(target);
-    EXPECT_FALSE(commands.PasteIntoCurrentFolder(nullptr));
+    EXPECT_FALSE(commands.PasteInto(target, nullptr));
     EXPECT_FALSE(std::ifstream(target + "\\a.dwg").good());
     PutWideList({Wide(a)});
     EXPECT_FALSE(commands.ClipboardHoldsDrawings());
@@ -313,7 +318,7 @@ TEST(Clipboard, AWideListFromAnotherProgramOffersNoPasteAndPastesNothing) {
 TEST(Clipboard, NoFileListOffersNoPaste) {
     EmptyTheClipboard();
     EXPECT_FALSE(ForFileCommands().ClipboardHoldsDrawings());
-    EXPECT_FALSE(ForFileCommands().PasteIntoCurrentFolder(nullptr));
+    EXPECT_FALSE(ForFileCommands().PasteInto("C:\\", nullptr));
     ASSERT_TRUE(PutFileListOnClipboard({"C:\\x\\notes.txt"}, false));
     EXPECT_FALSE(ForFileCommands().ClipboardHoldsDrawings());
 }
@@ -323,8 +328,7 @@ TEST(Clipboard, CutThenPasteMovesAndEmptiesTheClipboard) {
     const std::string a = folder.Write("a.dwg", "drawing");
     const std::string target = folder.MakeDir("target");
     ASSERT_TRUE(PutFileListOnClipboard({a}, true));
-    CurrentDirectory here(target);
-    EXPECT_TRUE(ForFileCommands().PasteIntoCurrentFolder(nullptr));
+    EXPECT_TRUE(ForFileCommands().PasteInto(target, nullptr));
     EXPECT_EQ(ReadFile(target + "\\a.dwg"), "drawing");
     EXPECT_FALSE(folder.Exists("a.dwg"));
     EXPECT_TRUE(ClipboardFileList().empty());
@@ -336,8 +340,7 @@ TEST(Clipboard, ACutReplacedOnTheClipboardIsNoLongerAMove) {
     const std::string target = folder.MakeDir("target");
     ASSERT_TRUE(PutFileListOnClipboard({a}, true));
     ASSERT_TRUE(PutFileListOnClipboard({a}, false)); // a copy after the cut
-    CurrentDirectory here(target);
-    EXPECT_TRUE(ForFileCommands().PasteIntoCurrentFolder(nullptr));
+    EXPECT_TRUE(ForFileCommands().PasteInto(target, nullptr));
     EXPECT_TRUE(folder.Exists("a.dwg"));
     EXPECT_TRUE(folder.Exists("target\\a.dwg"));
 }
@@ -348,10 +351,9 @@ TEST(Clipboard, PasteOntoAnExistingNameAsksTheShell) {
     const std::string target = folder.MakeDir("target");
     folder.Write("target\\a.dwg", "old");
     ASSERT_TRUE(PutFileListOnClipboard({a}, false));
-    CurrentDirectory here(target);
     {
         DialogAnswer no(IDNO);
-        ForFileCommands().PasteIntoCurrentFolder(nullptr);
+        ForFileCommands().PasteInto(target, nullptr);
         EXPECT_GE(DialogAnswer::Seen().size(), 1u) << "the shell asked before replacing";
     }
     EXPECT_EQ(ReadFile(target + "\\a.dwg"), "old");
@@ -360,17 +362,18 @@ TEST(Clipboard, PasteOntoAnExistingNameAsksTheShell) {
 // ---- the grid's commands on the selection ------------------------------------------------------------
 
 TEST(Selection, CopyWritesTheSelectedDrawingsAsFullPathsInListOrder) {
-    ListWithSelection({"a.dwg", "b.dwg", "c.dwg"}, {true, false, true});
-    ASSERT_TRUE(CopySelectionToClipboard("C:\\dwg", false));
+    ListWithSelection("C:\\dwg", {"a.dwg", "b.dwg", "c.dwg"}, {true, false, true});
+    ASSERT_TRUE(PutFileListOnClipboard(Shown().SelectedPaths(), false));
     EXPECT_EQ(ClipboardFileList(), (std::vector<std::string>{"C:\\dwg\\a.dwg", "C:\\dwg\\c.dwg"}));
     // A drive root keeps its one backslash.
-    ASSERT_TRUE(CopySelectionToClipboard("C:\\", false));
+    ListWithSelection("C:\\", {"a.dwg", "b.dwg", "c.dwg"}, {true, false, true});
+    ASSERT_TRUE(PutFileListOnClipboard(Shown().SelectedPaths(), false));
     EXPECT_EQ(ClipboardFileList(), (std::vector<std::string>{"C:\\a.dwg", "C:\\c.dwg"}));
 }
 
 TEST(Selection, CopyWithoutSelectionIsTheHeaderAlone) {
-    ListWithSelection({"a.dwg"}, {false});
-    ASSERT_TRUE(CopySelectionToClipboard("C:\\dwg", false));
+    ListWithSelection("C:\\dwg", {"a.dwg"}, {false});
+    ASSERT_TRUE(PutFileListOnClipboard(Shown().SelectedPaths(), false));
     EXPECT_TRUE(ClipboardFileList().empty());
     EXPECT_FALSE(ForFileCommands().ClipboardHoldsDrawings());
 }
@@ -379,11 +382,11 @@ TEST(Selection, DeleteSendsTheSelectedDrawingsToTheTrash) {
     TempFolder folder("orvex-delete");
     folder.Write("a.dwg", "A");
     folder.Write("b.dwg", "B");
-    ListWithSelection({"a.dwg", "b.dwg"}, {false, true});
+    ListWithSelection(folder.Dir(), {"a.dwg", "b.dwg"}, {false, true});
     int result = -1;
     {
         DialogAnswer yes(IDYES);
-        result = DeleteSelection(nullptr, folder.Dir());
+        result = DeleteFiles(nullptr, Shown().SelectedPaths());
     }
     EXPECT_EQ(result, 0);
     EXPECT_TRUE(folder.Exists("a.dwg"));
@@ -391,9 +394,9 @@ TEST(Selection, DeleteSendsTheSelectedDrawingsToTheTrash) {
 }
 
 TEST(Selection, DeleteWithoutSelectionAsksNothing) {
-    ListWithSelection({"a.dwg"}, {false});
+    ListWithSelection("C:\\dwg", {"a.dwg"}, {false});
     DialogAnswer yes(IDYES);
-    EXPECT_NE(DeleteSelection(nullptr, "C:\\dwg"), 0);
+    EXPECT_NE(DeleteFiles(nullptr, Shown().SelectedPaths()), 0);
     EXPECT_TRUE(DialogAnswer::Seen().empty());
 }
 

@@ -484,9 +484,14 @@ TEST_F(ExplorerFrame, AcceptNeedsAChosenDrawing) {
         // No drawing chosen: the accept command does nothing.
         frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0);
     });
-    dialog.steps.push_back([](CMainFrame& frame) {
-        ASSERT_NE(g_pTessel3Doc, nullptr);
-        g_pTessel3Doc->m_strName = "plan.dwg";
+    const std::string folder = TempFolder("accept");
+    testsupport::WriteBytes(folder + "\\plan.dwg", "AC1018");
+    dialog.steps.push_back([&folder](CMainFrame& frame) {
+        DrawingFolder* drawings = g_app.Folder();
+        ASSERT_NE(drawings, nullptr);
+        ASSERT_TRUE(drawings->Show(folder));
+        drawings->Choose(drawings->Find("plan.dwg"));
+        ASSERT_EQ(drawings->Chosen(), 0);
         frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0);
     });
     EXPECT_EQ(Run(dialog), 1);

@@ -7,6 +7,7 @@
 #include "devhost/ResultBuffers.h"
 #include "devhost/Text.h"
 #include "host/Orvex.h"
+#include "tests/support/PickedDrawing.h"
 #include "hostapi/TextConv.h"
 #include "settings/Tessel3Doc.h"
 #include "tests/host/FakeHost.h"
@@ -37,11 +38,12 @@ struct FuzzPlatform : PickerPlatform {
     }
     int RunDialog() override {
         steps.push_back("dialog");
-        doc.m_strPath = kPickFolder;
-        doc.m_strName = kPickName;
+        picked.Pick(kPickFolder, kPickName);
         return pick ? 1 : 2;
     }
     CTessel3Doc* Document() override { return &doc; }
+    const DrawingFolder* Folder() override { return &picked.Folder(); }
+    testsupport::PickedDrawing picked;
     void DestroyDocument() override { steps.push_back("destroy"); }
     void FocusHostView() override { steps.push_back("focus"); }
 };

@@ -2,6 +2,7 @@
 #include "host/EntryPoint.h"
 #include "host/Orvex.h"
 #include "settings/Tessel3Doc.h"
+#include "tests/support/PickedDrawing.h"
 #include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
@@ -40,11 +41,12 @@ struct FakePlatform : PickerPlatform {
     int RunDialog() override {
         steps.push_back("dialog");
         doc = std::make_unique<CTessel3Doc>(settingsFile.string());
-        doc->m_strPath = pickFolder;
-        doc->m_strName = pickName;
+        picked.Pick(pickFolder, pickName);
         return dialogResult;
     }
     CTessel3Doc* Document() override { return doc.get(); }
+    const DrawingFolder* Folder() override { return &picked.Folder(); }
+    testsupport::PickedDrawing picked;
     void DestroyDocument() override {
         steps.push_back("destroy");
         doc.reset();
@@ -262,15 +264,6 @@ TEST_F(OrvexTest, AnExceptionOutOfTheRunStillDestroysTheDocumentAndGivesTheFocus
     EXPECT_THROW(OrvexWith(throwing), std::runtime_error);
     EXPECT_EQ(throwing.steps, (std::vector<std::string>{"dialog", "destroy", "focus"}));
     EXPECT_EQ(host.liveNodes, 0);
-}
-
-TEST_F(OrvexTest, PickedPathAddsTheSeparatorToTheDocumentItself) {
-    CTessel3Doc doc((dir / "s.ini").string());
-    doc.m_strPath = "C:\\dwg";
-    doc.m_strName = "a.dwg";
-    EXPECT_EQ(PickedPath(doc), "C:\\dwg\\a.dwg");
-    EXPECT_EQ(doc.m_strPath, "C:\\dwg\\");
-    EXPECT_EQ(PickedPath(doc), "C:\\dwg\\a.dwg");
 }
 
 TEST_F(OrvexTest, OverlongArgumentsAreRefusedWithAMessage) {

@@ -1,4 +1,6 @@
-// The folder scan over real folders (Windows build, runs under Wine).
+// The folder scan over real folders (Windows build, runs under Wine): a folder shown through the folder
+// model with the runtime's file search.
+#include "thumbs/DrawingFolder.h"
 #include "thumbs/DwgList.h"
 
 #include "tests/support/TempFolder.h"
@@ -14,6 +16,16 @@
 namespace {
 
 using testsupport::TempFolder;
+
+// Shows path as the explorer does: 1 when it was read, 0 when not; problem gets what the user is told.
+int ScanFolderPath(const char* path, const char*, std::string* problem = nullptr) {
+    static FileSystemFolderReader reader;
+    static DrawingFolder folder(reader, nullptr);
+    const bool read = folder.Show(path);
+    if (problem)
+        *problem = folder.Problem();
+    return read ? 1 : 0;
+}
 
 std::vector<std::string> SortedNames() {
     std::vector<std::string> names;

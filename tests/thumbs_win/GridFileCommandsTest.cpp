@@ -12,28 +12,34 @@
 
 namespace {
 
-// What the handlers were asked.
-struct FileCalls {
+// What the grid asked of its file commands, and how often it read its folder again afterwards.
+struct FileCalls : GridFileCommands {
     std::vector<std::string> calls;
     bool holdsDrawings = false;
     bool pasteSucceeds = true;
     int refreshes = 0;
+
+    bool ClipboardHoldsDrawings() override { return holdsDrawings; }
+    void Copy(const std::vector<std::string>&, bool cut) override { calls.push_back(cut ? "cut" : "copy"); }
+    bool Paste(const std::string&) override {
+        calls.push_back("paste");
+        return pasteSucceeds;
+    }
+    void Delete(const std::vector<std::string>&) override { calls.push_back("delete"); }
+    int Rename(const std::string&, const std::string&) override {
+        calls.push_back("rename");
+        return 0;
+    }
+    void ShowProperties(const std::string& path) override { calls.push_back("properties " + path); }
 };
 
+// Once the bench shows its drawings: the grid's commands go to record, which counts the folder's reads.
 void Wire(CTessel3View& view, FileCalls& record) {
-    view.onClipboardHoldsDrawings = [&record] { return record.holdsDrawings; };
-    view.onCopySelection = [&record](bool cut) { record.calls.push_back(cut ? "cut" : "copy"); };
-    view.onPaste = [&record] {
-        record.calls.push_back("paste");
-        return record.pasteSucceeds;
-    };
-    view.onDeleteSelection = [&record] { record.calls.push_back("delete"); };
-    view.onShowProperties = [&record](const std::string& path) {
-        record.calls.push_back("properties " + path);
-    };
-    view.onRefreshFolder = [&record] {
+    view.SetFileCommands(&record);
+    Drawings().onShown = [&record, shown = Drawings().onShown] {
         ++record.refreshes;
-        return true;
+        if (shown)
+            shown();
     };
 }
 
@@ -85,10 +91,10 @@ int OpenGridMenu(CTessel3View& view, UINT chooseKey) {
 TEST(GridFileMenu, NothingSelectedAndNoDrawingsOnTheClipboardGreysAll) {
     GridBench bench;
     FileCalls record;
-    Wire(bench.view(), record);
     FillList(3);
     bench.view().Rebuild();
     Pump();
+    Wire(bench.view(), record);
     EXPECT_EQ(OpenGridMenu(bench.view(), 0), 0);
     EXPECT_EQ(MenuProbe::s_items, (std::vector<std::string>{"&Copy:1:grey", "&Delete:3:grey", "&Paste:2:grey",
                                                             "&Rename:4:grey"}));
@@ -98,12 +104,12 @@ TEST(GridFileMenu, NothingSelectedAndNoDrawingsOnTheClipboardGreysAll) {
 TEST(GridFileMenu, ASelectionAndDrawingsOnTheClipboardEnableAllButRename) {
     GridBench bench;
     FileCalls record;
-    Wire(bench.view(), record);
     FillList(3);
     DwgList[1].Select();
     record.holdsDrawings = true;
     bench.view().Rebuild();
     Pump();
+    Wire(bench.view(), record);
     EXPECT_EQ(OpenGridMenu(bench.view(), 0), 0);
     EXPECT_EQ(MenuProbe::s_items,
               (std::vector<std::string>{"&Copy:1:on", "&Delete:3:on", "&Paste:2:on", "&Rename:4:grey"}));
@@ -112,12 +118,12 @@ TEST(GridFileMenu, ASelectionAndDrawingsOnTheClipboardEnableAllButRename) {
 TEST(GridFileMenu, EachEntryRunsItsCommandAndChangesRefresh) {
     GridBench bench;
     FileCalls record;
-    Wire(bench.view(), record);
     FillList(3);
     DwgList[0].Select();
     record.holdsDrawings = true;
     bench.view().Rebuild();
     Pump();
+    Wire(bench.view(), record);
     EXPECT_EQ(OpenGridMenu(bench.view(), 'C'), 1);
     EXPECT_EQ(record.refreshes, 0) << "a copy changes no folder";
     DwgList[0].Select(); // the rescans of the bench keep no selection
@@ -136,10 +142,10 @@ TEST(GridFileMenu, EachEntryRunsItsCommandAndChangesRefresh) {
 TEST(GridFileMenu, TheFramesCopyCutAndPasteReachTheFileCommands) {
     GridBench bench;
     FileCalls record;
-    Wire(bench.view(), record);
     FillList(2);
     bench.view().Rebuild();
     Pump();
+    Wire(bench.view(), record);
     bench.view().SendMessage(WM_COMMAND, ID_EDIT_COPY);
     bench.view().SendMessage(WM_COMMAND, ID_EDIT_CUT);
     bench.view().SendMessage(WM_COMMAND, ID_EDIT_PASTE);

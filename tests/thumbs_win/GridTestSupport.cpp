@@ -18,20 +18,50 @@ FrameRecord& Frame() {
 
 namespace {
 
+void RecordPick(bool enable) {
+    Frame().pickEnabled = enable;
+    ++Frame().pickCalls;
+}
+
 void RecordFrameRequests(CTessel3View& view) {
-    view.onSortMode = [] { return Frame().sortMode; };
-    view.onEnablePick = [](bool enable) {
-        Frame().pickEnabled = enable;
-        ++Frame().pickCalls;
+    view.SetFolder(&Drawings());
+    Drawings().onShown = [&view] {
+        Frame().title = Drawings().Folder();
+        RecordPick(false);
+        ++Frame().statusUpdates;
+        if (view.m_hWnd)
+            view.Rebuild();
     };
-    view.onSetTitle = [](const std::string& text) { Frame().title = text; };
-    view.onFolderShown = [] { ++Frame().statusUpdates; };
+    Drawings().onChosen = [] {
+        const bool chosen = Drawings().Chosen() >= 0;
+        Frame().title = chosen ? Drawings().ChosenPath() : Drawings().Folder();
+        RecordPick(chosen);
+    };
+    view.SetFileCommands(&BenchFiles());
+    view.onSortMode = [] { return Frame().sortMode; };
+    view.onSort = [](int mode) { Frame().sortRequests.push_back(mode); };
+    view.onGrowFrame = [](int widthChange, int heightChange) {
+        CRect rc;
+        ::GetWindowRect(Frame().frame, &rc);
+        ::MoveWindow(Frame().frame, rc.left, rc.top, rc.Width() + widthChange, rc.Height() + heightChange,
+                     TRUE);
+    };
     view.onStatusText = [](const std::string& text) { Frame().status = text; };
     view.onTellUser = [](const std::string& text) { Frame().toldUser.push_back(text); };
     view.onFocusFolderTree = [] { ++Frame().treeFocusRequests; };
 }
 
 } // namespace
+
+int BenchFileCommands::Rename(const std::string& source, const std::string& destination) {
+    calls.push_back("rename");
+    return ::MoveFileA(source.c_str(), destination.c_str()) ? 0 : static_cast<int>(::GetLastError());
+}
+
+BenchFileCommands& BenchFiles() {
+    static BenchFileCommands files;
+    return files;
+}
 
 // ---- host ---------------------------------------------------------------------------------------------
 
@@ -173,18 +203,63 @@ void PressKey(WORD vk) {
 
 // ---- list and windows ---------------------------------------------------------------------------------
 
-void FillList(int count) {
-    BeginScan();
-    for (int i = 0; i < count; ++i) {
-        DwgFindEntry e;
-        char name[32];
-        std::snprintf(name, sizeof name, "d%05d.dwg", i);
-        e.name = name;
-        e.timeWrite = 1600000000 + i;
-        e.size = static_cast<std::uint32_t>(1000 + i);
-        AppendScanEntry(e);
+namespace {
+
+// Lists drawings held in memory, or a real folder.
+struct BenchReader : FolderReader {
+    int count = 0;
+    bool real = false;
+    FileSystemFolderReader files;
+
+    bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem) override {
+        if (real)
+            return files.Read(folder, drawings, problem);
+        for (int i = 0; i < count; ++i) {
+            DwgFindEntry e;
+            char name[32];
+            std::snprintf(name, sizeof name, "d%05d.dwg", i);
+            e.name = name;
+            e.timeWrite = 1600000000 + i;
+            e.size = static_cast<std::uint32_t>(1000 + i);
+            drawings.emplace_back(std::move(e));
+        }
+        return true;
     }
-    EndScan();
+    void MakeCurrentDirectory(const std::string&) override {}
+};
+
+BenchReader& Reader() {
+    static BenchReader reader;
+    return reader;
+}
+
+std::string CurrentDirectoryName() {
+    char buffer[MAX_PATH] = {};
+    const DWORD n = ::GetCurrentDirectoryA(MAX_PATH, buffer);
+    return std::string(buffer, n < MAX_PATH ? n : 0);
+}
+
+} // namespace
+
+namespace {
+DrawingFolder* g_drawings = nullptr; // the folder model of the bench standing
+} // namespace
+
+DrawingFolder& Drawings() {
+    if (!g_drawings)
+        throw std::runtime_error("no grid bench stands: no folder model");
+    return *g_drawings;
+}
+
+void FillList(int count, const std::string& folder) {
+    Reader().real = false;
+    Reader().count = count;
+    Drawings().Show(folder.empty() ? CurrentDirectoryName() : folder);
+}
+
+bool ShowFolder(const std::string& path) {
+    Reader().real = true;
+    return Drawings().Show(path);
 }
 
 namespace {
@@ -256,6 +331,10 @@ GridBench::GridBench(int clientWidth, int clientHeight, const std::string& setti
         }
     }
     m_doc = std::make_unique<CTessel3Doc>(m_settings);
+    Reader().count = 0;
+    Reader().real = false;
+    m_drawings = std::make_unique<DrawingFolder>(Reader(), m_doc.get());
+    g_drawings = m_drawings.get();
     m_frame.CreateFrame(clientWidth, clientHeight, m_doc.get());
     Frame().frame = m_frame.m_hWnd;
     Pump();
@@ -271,6 +350,8 @@ GridBench::~GridBench() {
     m_frame.DestroyWindow(); // the view goes with it and deletes itself
     Pump();
     Frame().frame = nullptr;
+    g_drawings = nullptr;
+    m_drawings.reset(); // it writes to the document: it goes first
     m_doc.reset();
     ::DeleteFileA(m_settings.c_str());
     DwgList.RemoveAll();

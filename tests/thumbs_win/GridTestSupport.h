@@ -4,6 +4,7 @@
 
 #include "framework/afxwin.h"
 #include "settings/Tessel3Doc.h"
+#include "thumbs/DrawingFolder.h"
 #include "thumbs/DwgList.h"
 #include "thumbs/Tessel3View.h"
 
@@ -11,7 +12,8 @@
 #include <string>
 #include <vector>
 
-// What the grid asked of the frame (through the view's handlers).
+// What the grid asked of the frame (through the view's handlers), and what the frame made of the folder
+// model's news (as the explorer's frame does: title, pick, a count of folders shown).
 struct FrameRecord {
     int sortMode = 0;
     bool pickEnabled = false;
@@ -21,9 +23,26 @@ struct FrameRecord {
     std::string status;                // the status bar's message
     std::vector<std::string> toldUser; // message boxes the user would have seen
     int treeFocusRequests = 0;
+    std::vector<int> sortRequests; // sorts chosen in a thumbnail's menu
     HWND frame = nullptr;
 };
 FrameRecord& Frame();
+
+// The bench's file commands: a rename moves the file (as the shell would, without its questions); the
+// others are recorded.
+struct BenchFileCommands : GridFileCommands {
+    std::vector<std::string> calls;
+    bool ClipboardHoldsDrawings() override { return false; }
+    void Copy(const std::vector<std::string>&, bool cut) override { calls.push_back(cut ? "cut" : "copy"); }
+    bool Paste(const std::string&) override {
+        calls.push_back("paste");
+        return false;
+    }
+    void Delete(const std::vector<std::string>&) override { calls.push_back("delete"); }
+    int Rename(const std::string& source, const std::string& destination) override;
+    void ShowProperties(const std::string& path) override { calls.push_back("properties " + path); }
+};
+BenchFileCommands& BenchFiles();
 
 // Preview paints the host was asked for.
 struct PaintRecord {
@@ -70,8 +89,13 @@ std::string KeyPressSummary();
 // Errors the framework caught and reported during a bench's life.
 std::vector<std::string>& Reports();
 
-// Fills the drawing list with count records named d00000.dwg...
-void FillList(int count);
+// The folder model the standing bench's grid shows (the explorer has one for a call).
+DrawingFolder& Drawings();
+// Shows folder holding count drawings named d00000.dwg... (listed in memory; the folder's name is the
+// process's current directory unless given).
+void FillList(int count, const std::string& folder = std::string());
+// Shows the real folder at path, read by the runtime's file search.
+bool ShowFolder(const std::string& path);
 
 // Live thumbnail windows (and labels) that are children of the view.
 int LiveThumbnails(HWND view);
@@ -94,5 +118,6 @@ public:
 private:
     std::string m_settings;
     std::unique_ptr<CTessel3Doc> m_doc;
+    std::unique_ptr<DrawingFolder> m_drawings;
     TestFrame m_frame;
 };

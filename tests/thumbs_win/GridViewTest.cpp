@@ -32,8 +32,7 @@ void ExpectFirstRowAtTop(CTessel3View& view) {
 
 TEST(GridLayout, TenDrawingsInThreeColumns) {
     GridBench bench(700, 600);
-    FillList(10);
-    g_pTessel3Doc->m_strPath = "C:\\drawings";
+    FillList(10, "C:\\drawings");
     bench.view().Rebuild();
     Pump();
     CTessel3View& view = bench.view();
@@ -67,7 +66,7 @@ TEST(GridLayout, TenDrawingsInThreeColumns) {
     EXPECT_EQ(label.bottom, RowPitch(view) + 143 + CTessel3View::LabelHeight() - cy);
     EXPECT_EQ(fifth->Label().GetWindowText(), "d00004.dwg");
     EXPECT_TRUE(fifth->Label().GetStyle() & ES_READONLY);
-    // The rebuild set the title to the folder and refreshed the status.
+    // Showing the folder set the title to the folder and refreshed the status.
     EXPECT_EQ(Frame().statusUpdates, 1);
 }
 

@@ -2,6 +2,7 @@
 // insertion or on demand, and what a selection does to the document, the drawing list and the highlight.
 #include "ShellTestSupport.h"
 #include "settings/Tessel3Doc.h"
+#include "thumbs/DrawingFolder.h"
 #include "thumbs/DwgList.h"
 #include "tree/ShellTreeCtrl.h"
 #include "tree/StartShellPath.h"
@@ -93,13 +94,25 @@ protected:
         tree.ExpandToLabelPath(StartShellPathOf(dir + "\\"));
         PumpPending();
     }
+    // The folder model the tree shows its selections in, as the explorer's, and what it was told in order:
+    // the folder shown, or "|label" for a node without a folder.
+    struct Shown {
+        Shown(CTessel3Doc& doc, CountingTree& tree) : folder(reader, &doc) {
+            tree.SetDrawingFolder(&folder);
+            folder.onShown = [this] { events.push_back(folder.Folder()); };
+            tree.onNoFolderShown = [this](const std::string& label) { events.back() = "|" + label; };
+        }
+        FileSystemFolderReader reader;
+        DrawingFolder folder;
+        std::vector<std::string> events;
+    };
     // What a walk told its owner: folders shown (scanned) and how the walk ended.
     struct WalkRecord {
         int shown = 0;
         std::vector<bool> ended;
     };
-    static void Watch(CountingTree& tree, WalkRecord& record) {
-        tree.onFolderShown = [&record](const std::string&, const std::string&) { ++record.shown; };
+    static void Watch(CountingTree& tree, Shown& drawings, WalkRecord& record) {
+        drawings.folder.onShown = [&record] { ++record.shown; };
         tree.onWalkEnded = [&record](bool reached) { record.ended.push_back(reached); };
     }
     // The tree as the explorer opens it: created (hidden until its walk), the Desktop in it, selections not
@@ -318,10 +331,8 @@ TEST_F(ShellTree, SelectingAFolderScansItAndTheHighlightFollowsTheSelection) {
     doc.m_strPath = "C:\\before";
     CountingTree tree;
     tree.SetDocument(&doc);
-    std::vector<std::string> shown;
-    tree.onFolderShown = [&](const std::string& path, const std::string& label) {
-        shown.push_back(path + "|" + label);
-    };
+    Shown drawings(doc, tree);
+    const std::vector<std::string>& shown = drawings.events;
     OpenAt(tree, b);
     HTREEITEM bNode = tree.m_hPathTarget;
     ASSERT_NE(bNode, nullptr);
@@ -335,7 +346,7 @@ TEST_F(ShellTree, SelectingAFolderScansItAndTheHighlightFollowsTheSelection) {
     ::GetCurrentDirectoryA(MAX_PATH, current);
     EXPECT_TRUE(SameText(current, b)) << current;
     ASSERT_EQ(shown.size(), 1u);
-    EXPECT_TRUE(SameText(shown.back(), b + "|b")) << shown.back();
+    EXPECT_TRUE(SameText(shown.back(), b)) << shown.back();
 
     // The highlight never stays on a folder that is no longer the selected one.
     HTREEITEM aNode = tree.GetParentItem(bNode);
@@ -362,21 +373,20 @@ TEST_F(ShellTree, ASelectionMadeWhileTheTreeDoesNotFollowScansNothing) {
     doc.m_strPath = "C:\\before";
     CountingTree tree;
     tree.SetDocument(&doc);
-    int shown = 0;
-    tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
+    Shown drawings(doc, tree);
     OpenAt(tree, b);
-    BeginScan();
+    BeginScan(); // what an earlier test left in the list
     tree.FollowSelection(false);
     ASSERT_TRUE(tree.SelectItem(tree.m_hPathTarget));
     PumpPending();
-    EXPECT_EQ(shown, 0);
+    EXPECT_EQ(drawings.events.size(), 0u);
     EXPECT_EQ(doc.m_strPath, "C:\\before");
     EXPECT_EQ(DwgList.GetSize(), 0);
 
     tree.FollowSelection(true);
     ASSERT_TRUE(tree.SelectItem(tree.GetParentItem(tree.m_hPathTarget)));
     PumpPending();
-    EXPECT_EQ(shown, 1);
+    EXPECT_EQ(drawings.events.size(), 1u);
     EXPECT_TRUE(SameText(doc.m_strPath, a)) << doc.m_strPath;
 }
 
@@ -384,8 +394,7 @@ TEST_F(ShellTree, RefreshingRescansTheSelectedFolder) {
     CTessel3Doc doc(folder.File("Orvex1.ini"));
     CountingTree tree;
     tree.SetDocument(&doc);
-    int shown = 0;
-    tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
+    Shown drawings(doc, tree);
     OpenAt(tree, b);
     ASSERT_TRUE(tree.SelectItem(tree.m_hPathTarget));
     PumpPending();
@@ -393,24 +402,25 @@ TEST_F(ShellTree, RefreshingRescansTheSelectedFolder) {
     testsupport::WriteBytes(b + "\\three.dwg", "AC1018");
     tree.RefreshCurrentFolder();
     EXPECT_EQ(DwgList.GetSize(), 3);
-    EXPECT_EQ(shown, 2);
+    EXPECT_EQ(drawings.events.size(), 2u);
 }
 
 // The explorer's opening: the grid has shown the start folder by its path; the tree, hidden until then,
 // walks there on a queued message and selects it without scanning it again.
 TEST_F(ShellTree, TheWalkToTheStartFolderSelectsItWithoutScanningWhatTheGridShowsAlready) {
     CTessel3Doc doc(folder.File("Orvex1.ini"));
-    ASSERT_EQ(ScanFolderPath(b.c_str(), ".dwg"), 1);
-    doc.m_strPath = b + "\\"; // as the caller wrote it: a trailing separator
-    CharUpperA(doc.m_strPath.data());
+    CountingTree tree;
+    Shown drawings(doc, tree);
+    std::string upper = b + "\\"; // as the caller wrote it: a trailing separator
+    CharUpperA(upper.data());
+    ASSERT_TRUE(drawings.folder.Show(upper));
     std::string shellPath = StartShellPathOf(b + "\\");
     CharLowerA(shellPath.data());
     doc.m_strShellPath = shellPath;
     testsupport::WriteBytes(b + "\\three.dwg", "AC1018"); // a rescan would list it
-    CountingTree tree;
     tree.SetDocument(&doc);
     WalkRecord seen;
-    Watch(tree, seen);
+    Watch(tree, drawings, seen);
     WalkAsTheExplorerDoes(tree, true);
     parent.SetFocus();
     EXPECT_EQ(tree.GetSelectedItem(), nullptr) << "nothing happens before the queued messages";
@@ -443,13 +453,13 @@ TEST_F(ShellTree, AWalkToAnotherFolderThanTheGridShowsScansTheFolderReached) {
     // Settings whose label path names another folder than their folder path: the tree's folder wins, as
     // it did when the tree was walked first.
     CTessel3Doc doc(folder.File("Orvex1.ini"));
-    ASSERT_EQ(ScanFolderPath(a.c_str(), ".dwg"), 1);
-    doc.m_strPath = a;
-    doc.m_strShellPath = StartShellPathOf(b + "\\");
     CountingTree tree;
+    Shown drawings(doc, tree);
+    ASSERT_TRUE(drawings.folder.Show(a));
+    drawings.events.clear();
+    const std::vector<std::string>& shown = drawings.events;
+    doc.m_strShellPath = StartShellPathOf(b + "\\");
     tree.SetDocument(&doc);
-    std::vector<std::string> shown;
-    tree.onFolderShown = [&](const std::string& path, const std::string&) { shown.push_back(path); };
     WalkAsTheExplorerDoes(tree, false);
     PumpPending();
     ASSERT_NE(tree.m_hPathTarget, nullptr);
@@ -468,8 +478,9 @@ TEST_F(ShellTree, AWalkThatDoesNotGetThereSelectsNothingAndSaysSo) {
     doc.m_strShellPath = shellPath;
     CountingTree tree;
     tree.SetDocument(&doc);
+    Shown drawings(doc, tree);
     WalkRecord seen;
-    Watch(tree, seen);
+    Watch(tree, drawings, seen);
     WalkAsTheExplorerDoes(tree, true);
     tree.SetFocus(); // as the explorer gives it: the control may select its first item on its own
     PumpPending();
