@@ -95,7 +95,7 @@ struct FrameFixture : ::testing::Test {
         if (::IsWindow(hwnd()))
             ::DestroyWindow(hwnd());
         g_commands.clear();
-        PumpPending();
+        testsupport::PumpMessages();
     }
     HWND hwnd() const { return frameHwnd ? frameHwnd : frame->m_hWnd; }
     HWND frameHwnd = nullptr;
@@ -181,7 +181,7 @@ TEST_F(FrameFixture, ToolbarButtonClicksReachTheFrame) {
     CPoint center = rc.CenterPoint();
     frame->bottomBar.SendMessage(WM_LBUTTONDOWN, MK_LBUTTON, MAKELPARAM(center.x, center.y));
     frame->bottomBar.SendMessage(WM_LBUTTONUP, 0, MAKELPARAM(center.x, center.y));
-    PumpPending();
+    testsupport::PumpMessages();
     ASSERT_EQ(g_commands.size(), 1u);
     EXPECT_EQ(g_commands[0], std::make_pair(std::string("frame"), static_cast<UINT>(ID_TEST_SECOND)));
 }
@@ -226,7 +226,7 @@ TEST_F(FrameFixture, StandardCommandsShowAndHideBarsAndCloseTheFrame) {
 
     frameHwnd = frame->m_hWnd;
     frame->SendMessage(WM_COMMAND, ID_APP_EXIT);
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_FALSE(::IsWindow(frameHwnd)); // closed, and the frame object deleted itself
 }
 

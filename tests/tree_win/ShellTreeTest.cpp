@@ -5,6 +5,7 @@
 #include "thumbs/DwgList.h"
 #include "tree/ShellTreeCtrl.h"
 #include "tree/StartShellPath.h"
+#include "tests/support/MessagePump.h"
 #include "tests/support/TempFolder.h"
 
 #include <windows.h>
@@ -22,14 +23,6 @@ using testsupport::TempFolder;
 using treetest::ShellTest;
 
 constexpr DWORD kTreeStyle = WS_CHILD | WS_VISIBLE | TVS_HASBUTTONS | TVS_HASLINES | TVS_LINESATROOT;
-
-void PumpPending() {
-    MSG msg;
-    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
-        ::TranslateMessage(&msg);
-        ::DispatchMessageA(&msg);
-    }
-}
 
 bool SameText(const std::string& a, const std::string& b) {
     return lstrcmpiA(a.c_str(), b.c_str()) == 0;
@@ -91,7 +84,7 @@ protected:
         ASSERT_TRUE(tree.Create(kTreeStyle, CRect(0, 0, 600, 700), &parent, id));
         tree.PopulateTree(nullptr, 0);
         tree.ExpandToLabelPath(StartShellPathOf(dir + "\\"));
-        PumpPending();
+        testsupport::PumpMessages();
     }
     // What a walk told its owner: folders shown (scanned) and how the walk ended.
     struct WalkRecord {
@@ -173,7 +166,7 @@ TEST_F(ShellTree, TheWalkCanLeaveItsTargetClosedForItToBeOpenedOnceQueuedMessage
 
     tree.OpenPathTargetLater();
     EXPECT_FALSE(tree.GetItemState(target, TVIS_EXPANDED) & TVIS_EXPANDED) << "opened only from the queue";
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_TRUE(tree.GetItemState(target, TVIS_EXPANDED) & TVIS_EXPANDED);
     EXPECT_NE(ChildNamed(tree, target, "b"), nullptr);
     EXPECT_NE(ChildNamed(tree, target, "side"), nullptr);
@@ -186,7 +179,7 @@ TEST_F(ShellTree, TheWalkCanLeaveItsTargetClosedForItToBeOpenedOnceQueuedMessage
     ASSERT_NE(other.m_hPathTarget, nullptr);
     other.OpenPathTargetLater();
     other.DeleteItem(other.GetParentItem(other.m_hPathTarget));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_TRUE(other.GetCount() > 0);
 }
 
@@ -304,11 +297,11 @@ TEST_F(ShellTree, IconsOnDemandAreAskedForOnceWhenFirstShown) {
     CountingTree tree;
     OpenAt(tree, b, CShellTreeCtrl::kCallbackImage | CShellTreeCtrl::kCallbackSelectedImage);
     tree.RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
-    PumpPending();
+    testsupport::PumpMessages();
     const int first = tree.imageRequests;
     EXPECT_GT(first, 0);
     tree.RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(tree.imageRequests, first) << "the control keeps the icons it was given";
     EXPECT_EQ(tree.textRequests, 0);
 }
@@ -327,7 +320,7 @@ TEST_F(ShellTree, SelectingAFolderScansItAndTheHighlightFollowsTheSelection) {
     ASSERT_NE(bNode, nullptr);
 
     ASSERT_TRUE(tree.SelectItem(bNode));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_TRUE(SameText(doc.m_strPath, b)) << doc.m_strPath;
     EXPECT_TRUE(SameText(doc.m_strShellPath, tree.GetLabelPath(bNode)));
     EXPECT_EQ(DwgList.GetSize(), 2);
@@ -340,14 +333,14 @@ TEST_F(ShellTree, SelectingAFolderScansItAndTheHighlightFollowsTheSelection) {
     // The highlight never stays on a folder that is no longer the selected one.
     HTREEITEM aNode = tree.GetParentItem(bNode);
     ASSERT_TRUE(tree.SelectItem(aNode));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_TRUE(tree.GetDropHilightItem() == aNode || tree.GetDropHilightItem() == nullptr);
     EXPECT_EQ(DwgList.GetSize(), 0);
     EXPECT_TRUE(SameText(doc.m_strPath, a));
 
     // The Desktop has no folder: the grid empties and the current folder stays.
     ASSERT_TRUE(tree.SelectItem(tree.GetRootItem()));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(DwgList.GetSize(), 0);
     EXPECT_TRUE(SameText(doc.m_strPath, a));
     EXPECT_EQ(doc.m_strShellPath, ShellDesktopLabel());
@@ -368,14 +361,14 @@ TEST_F(ShellTree, ASelectionMadeWhileTheTreeDoesNotFollowScansNothing) {
     BeginScan();
     tree.FollowSelection(false);
     ASSERT_TRUE(tree.SelectItem(tree.m_hPathTarget));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(shown, 0);
     EXPECT_EQ(doc.m_strPath, "C:\\before");
     EXPECT_EQ(DwgList.GetSize(), 0);
 
     tree.FollowSelection(true);
     ASSERT_TRUE(tree.SelectItem(tree.GetParentItem(tree.m_hPathTarget)));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(shown, 1);
     EXPECT_TRUE(SameText(doc.m_strPath, a)) << doc.m_strPath;
 }
@@ -388,7 +381,7 @@ TEST_F(ShellTree, RefreshingRescansTheSelectedFolder) {
     tree.onFolderShown = [&](const std::string&, const std::string&) { ++shown; };
     OpenAt(tree, b);
     ASSERT_TRUE(tree.SelectItem(tree.m_hPathTarget));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(DwgList.GetSize(), 2);
     testsupport::WriteBytes(b + "\\three.dwg", "AC1018");
     tree.RefreshCurrentFolder();
@@ -415,7 +408,7 @@ TEST_F(ShellTree, TheWalkToTheStartFolderSelectsItWithoutScanningWhatTheGridShow
     parent.SetFocus();
     EXPECT_EQ(tree.GetSelectedItem(), nullptr) << "nothing happens before the queued messages";
     EXPECT_EQ(tree.m_hPathTarget, nullptr);
-    PumpPending();
+    testsupport::PumpMessages();
 
     HTREEITEM target = tree.m_hPathTarget;
     ASSERT_NE(target, nullptr);
@@ -434,7 +427,7 @@ TEST_F(ShellTree, TheWalkToTheStartFolderSelectsItWithoutScanningWhatTheGridShow
 
     // From then on a selection is followed.
     ASSERT_TRUE(tree.SelectItem(tree.GetParentItem(target)));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(seen.shown, 1);
     EXPECT_TRUE(SameText(doc.m_strPath, a)) << doc.m_strPath;
 }
@@ -451,7 +444,7 @@ TEST_F(ShellTree, AWalkToAnotherFolderThanTheGridShowsScansTheFolderReached) {
     std::vector<std::string> shown;
     tree.onFolderShown = [&](const std::string& path, const std::string&) { shown.push_back(path); };
     WalkAsTheExplorerDoes(tree, false);
-    PumpPending();
+    testsupport::PumpMessages();
     ASSERT_NE(tree.m_hPathTarget, nullptr);
     EXPECT_EQ(tree.GetSelectedItem(), tree.m_hPathTarget);
     ASSERT_EQ(shown.size(), 1u);
@@ -472,7 +465,7 @@ TEST_F(ShellTree, AWalkThatDoesNotGetThereSelectsNothingAndSaysSo) {
     Watch(tree, seen);
     WalkAsTheExplorerDoes(tree, true);
     tree.SetFocus(); // as the explorer gives it: the control may select its first item on its own
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(tree.m_hPathTarget, nullptr);
     EXPECT_EQ(tree.GetSelectedItem(), nullptr);
     EXPECT_EQ(seen.ended, std::vector<bool>{false});
