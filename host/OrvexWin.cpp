@@ -1,7 +1,6 @@
-// The picker's platform on Windows: the shell's display names, the run dialog and the document.
-#include "host/ArxApp.h"
+#include "host/OrvexWin.h"
+
 #include "host/DialogRun.h"
-#include "host/Orvex.h"
 #include "tree/StartShellPath.h"
 #include "hostapi/HostApi.h"
 #include "settings/Tessel3Doc.h"
@@ -38,8 +37,21 @@ private:
     UINT m_doubleClickTime;
 };
 
+// Copies of what the LISP function took from its arguments, for the explorer of this call.
+ExplorerCall CallArguments() {
+    ExplorerCall call;
+    call.acceptCaption = g_szAcceptCaption;
+    call.cancelCaption = g_szCancelCaption;
+    call.startPath = g_szStartPath;
+    call.startShellPath = g_szStartShellPath;
+    call.hostFrame = acedGetAcadFrame();
+    return call;
+}
+
 class WindowsPickerPlatform : public PickerPlatform {
 public:
+    explicit WindowsPickerPlatform(CMdiMixin& app) : m_app(app) {}
+
     std::string StartShellPath(const std::string& path) override { return StartShellPathOf(path); }
 
     std::string WholeStartPath(const std::string& path) override {
@@ -59,7 +71,7 @@ public:
 
     int RunDialog() override {
         HostInputRestorer restorer;
-        CDialogRun dialog;
+        CDialogRun dialog(m_app, CallArguments());
         return static_cast<int>(dialog.DoModal());
     }
 
@@ -73,11 +85,13 @@ public:
         if (HWND view = acedGetAcadDwgView())
             ::SetFocus(view);
     }
+
+private:
+    CMdiMixin& m_app;
 };
 
 } // namespace
 
-PickerPlatform& DefaultPickerPlatform() {
-    static WindowsPickerPlatform platform;
-    return platform;
+std::unique_ptr<PickerPlatform> MakeWindowsPickerPlatform(CMdiMixin& app) {
+    return std::make_unique<WindowsPickerPlatform>(app);
 }

@@ -1,12 +1,13 @@
-// The explorer frame hosted by a modal dialog, as the LISP function runs it: the dialog's
+// The explorer frame hosted by the library's run dialog, as the LISP function runs it: the dialog's
 // initialisation creates and shows the explorer, the test script runs inside the modal loop, and the
 // loop ends with what the explorer posts (1 accept, 2 cancel).
 #include "frame/MainFrame.h"
 #include "frame/MdiMixin.h"
 #include "hostapi/HostApi.h"
-#include "host/Orvex.h"
+#include "host/DialogRun.h"
 #include "settings/SettingsPath.h"
 #include "settings/Tessel3Doc.h"
+#include "tests/support/MessagePump.h"
 #include "tests/support/TempFolder.h"
 #include "thumbs/AppMessages.h"
 #include "thumbs/Tessel3View.h"
@@ -35,15 +36,20 @@ constexpr UINT WM_TEST_STEP = WM_APP + 7;
 constexpr UINT_PTR kWatchdog = 77;
 constexpr INT_PTR kTimedOut = -77;
 
-// The run dialog of the tests: like the library's, plus a script of steps and a watchdog.
-class RunDialog : public CDialog {
+// The arguments of this run, as the LISP function hands them to the run dialog: the host's frame, and
+// the start folder's label path along which the tree opens.
+ExplorerCall CallOfTheRun() {
+    ExplorerCall call = g_call;
+    call.hostFrame = acedGetAcadFrame();
+    if (!call.startPath.empty() && call.startShellPath.empty())
+        call.startShellPath = StartShellPathOf(call.startPath);
+    return call;
+}
+
+// The library's run dialog, given a script of steps that run inside its modal loop and a watchdog.
+class RunDialog : public CDialogRun {
 public:
-    // Shown without activation, as the library's: the explorer's frame keeps the keyboard.
-    RunDialog() : CDialog(IDD_DIALOG_RUN, nullptr) { m_nShowCommand = SW_SHOWNA; }
-    ~RunDialog() override {
-        if (g_app.m_pMainWnd == this)
-            g_app.m_pMainWnd = nullptr;
-    }
+    RunDialog() : CDialogRun(g_app, CallOfTheRun()) {}
 
     std::function<void()> beforeCreate;
     std::vector<std::function<void(CMainFrame&)>> steps;
@@ -52,29 +58,21 @@ public:
     HWND hostFrame = nullptr;
 
     bool OnInitDialog() override {
-        CDialog::OnInitDialog();
         if (beforeCreate)
             beforeCreate();
-        ExplorerCall call = g_call;
-        call.hostFrame = acedGetAcadFrame();
-        // As the LISP function does: the tree opens along the start folder's label path.
-        if (!call.startPath.empty() && call.startShellPath.empty())
-            call.startShellPath = StartShellPathOf(call.startPath);
-        created = g_app.CreateAndShow(this, call);
-        ::MoveWindow(m_hWnd, 0, 0, 0, 0, TRUE);
+        const bool result = CDialogRun::OnInitDialog();
+        created = g_app.ExplorerFrame() != nullptr;
         SetTimer(kWatchdog, 15000);
         PostMessage(WM_TEST_STEP, 0);
-        return false; // as the library's run dialog: the explorer has placed the keyboard focus
+        return result;
     }
 
     bool PreTranslateMessage(MSG* pMsg) override {
-        if (pMsg->message == WM_ORVEX_RESULT && pMsg->hwnd == m_hWnd)
-            EndDialog(static_cast<INT_PTR>(pMsg->wParam));
         if (pMsg->message == WM_TEST_STEP && pMsg->hwnd == m_hWnd) {
             RunStep(static_cast<size_t>(pMsg->wParam));
             return true;
         }
-        return CDialog::PreTranslateMessage(pMsg);
+        return CDialogRun::PreTranslateMessage(pMsg);
     }
 
 protected:
@@ -85,7 +83,7 @@ protected:
             EndDialog(kTimedOut);
             return 0;
         }
-        return CDialog::WindowProc(message, wParam, lParam);
+        return CDialogRun::WindowProc(message, wParam, lParam);
     }
 
 private:
@@ -98,15 +96,6 @@ private:
         }
     }
 };
-
-// Dispatches what is queued for this thread, so posted commands and idle updates have run.
-void Pump() {
-    MSG msg;
-    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
-        ::TranslateMessage(&msg);
-        ::DispatchMessageA(&msg);
-    }
-}
 
 std::string MenuText(HMENU menu, UINT item, UINT flags) {
     char text[128] = "";
@@ -145,6 +134,9 @@ protected:
     void TearDown() override {
         DestroyDocument();
         std::remove(ExplorerSettingsPath().c_str());
+        // The run dialog sets the thumbnails' double-click time; the library's run puts the user's back.
+        if (::GetDoubleClickTime() != m_doubleClickTime)
+            ::SetDoubleClickTime(m_doubleClickTime);
     }
 
     // Writes the explorer's settings file that the next run's document reads.
@@ -156,9 +148,11 @@ protected:
         g_pTessel3Doc = nullptr;
     }
 
+    const UINT m_doubleClickTime = ::GetDoubleClickTime();
+
     INT_PTR Run(RunDialog& dialog) {
         const INT_PTR result = dialog.DoModal();
-        Pump();
+        testsupport::PumpMessages(); // posted commands and idle updates have run
         EXPECT_TRUE(dialog.created);
         EXPECT_EQ(g_app.ExplorerFrame(), nullptr) << "the frame goes with the dialog";
         return result;
@@ -379,7 +373,7 @@ CRect FrameRectForStoredSize(const std::string& width, const std::string& height
         frame.PostMessage(WM_CLOSE);
     });
     EXPECT_EQ(dialog.DoModal(), 2);
-    Pump();
+    testsupport::PumpMessages();
     delete g_pTessel3Doc;
     g_pTessel3Doc = nullptr;
     return rc;
@@ -479,6 +473,10 @@ TEST_F(ExplorerFrame, LayerLabelSaysCurrentWithoutDatainsIni) {
 }
 
 TEST_F(ExplorerFrame, AcceptNeedsAChosenDrawing) {
+    // The drawing is there: the run dialog hands back only a file that exists.
+    const std::string folder = TempFolder("orvex-frame-accept");
+    std::ofstream(folder + "\\plan.dwg", std::ios::binary) << "";
+    g_call.startPath = folder + "\\";
     RunDialog dialog;
     dialog.steps.push_back([](CMainFrame& frame) {
         // No drawing chosen: the accept command does nothing.
@@ -490,6 +488,8 @@ TEST_F(ExplorerFrame, AcceptNeedsAChosenDrawing) {
         frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0);
     });
     EXPECT_EQ(Run(dialog), 1);
+    std::remove((folder + "\\plan.dwg").c_str());
+    ::RemoveDirectoryA(folder.c_str());
 }
 
 TEST_F(ExplorerFrame, SavedDrawingNameStartsTheSearch) {
