@@ -77,6 +77,10 @@ public:
 
 protected:
     LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override {
+        if (message == WM_TEST_STEP) { // in a loop that does not pre-translate, such as a message box's
+            RunStep(static_cast<size_t>(wParam));
+            return 0;
+        }
         if (message == WM_TIMER && wParam == kWatchdog) {
             KillTimer(kWatchdog);
             ADD_FAILURE() << "the explorer did not end the run";
@@ -590,6 +594,46 @@ TEST_F(ExplorerFrame, TypingAPrefixChoosesTheDrawingAndAcceptTakesIt) {
     ASSERT_NE(g_pTessel3Doc, nullptr);
     EXPECT_EQ(g_pTessel3Doc->m_strPath, folder);
     EXPECT_EQ(g_pTessel3Doc->m_strName, "abc.dwg");
+    RemoveFolder(folder, files);
+}
+
+// The run dialog hands back only a drawing that is still there: accepting one deleted meanwhile says so,
+// and the explorer stays open for another choice.
+TEST_F(ExplorerFrame, AcceptOfADrawingDeletedMeanwhileIsRefusedAndTheExplorerStaysOpen) {
+    const auto files = {"abc.dwg", "xyz.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-deleted", files);
+    g_call.startPath = folder + "\\";
+    RunDialog dialog;
+    std::string said;
+    bool stillOpen = false;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        CEditSearch& edit = frame.GetSearchEdit();
+        edit.SetFocus();
+        edit.PostMessage(WM_CHAR, 'a', 1);
+    });
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        ASSERT_NE(g_pTessel3Doc, nullptr);
+        EXPECT_EQ(g_pTessel3Doc->m_strName, "abc.dwg");
+        std::remove((folder + "\\abc.dwg").c_str());
+        // Sent, so that the accept is queued before the next step, which runs in the message box's loop.
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0);
+    });
+    dialog.steps.push_back([&](CMainFrame&) {
+        // Runs inside the message box's own loop.
+        HWND box = ::FindWindowA("#32770", "Orvex1");
+        ASSERT_NE(box, nullptr) << "the refusal is said in a message box";
+        char text[1024] = "";
+        ::GetDlgItemTextA(box, 0xFFFF, text, sizeof text); // the message box's text
+        said = text;
+        ::PostMessageA(box, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED), 0);
+    });
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        stillOpen = frame.IsWindowVisible();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_TRUE(stillOpen);
+    EXPECT_EQ(said, "The drawing\n" + folder + "\\abc.dwg\nno longer exists. Choose another one.");
     RemoveFolder(folder, files);
 }
 
