@@ -11,6 +11,7 @@
 //
 // bench_tree_expand DIR [COUNT...]: makes DIR\COUNT\d00001... (kept between runs) and measures each COUNT.
 #include "resource.h"
+#include "tests/support/MessagePump.h"
 #include "tree/LeftView.h"
 #include "tree/ShellNamespace.h"
 #include "tree/ShellTreeCtrl.h"
@@ -47,8 +48,8 @@ bool MakeFolders(const std::string& dir, int count) {
         if (!::CreateDirectoryA(path.c_str(), nullptr) && ::GetLastError() != ERROR_ALREADY_EXISTS)
             return false;
     }
-    HANDLE file = ::CreateFileA(marker.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_HIDDEN,
-                                nullptr);
+    HANDLE file = ::CreateFileA(marker.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS,
+                                FILE_ATTRIBUTE_HIDDEN, nullptr);
     if (file == INVALID_HANDLE_VALUE)
         return false;
     ::CloseHandle(file);
@@ -78,14 +79,6 @@ protected:
         ++frames;
     }
 };
-
-void PumpPending() {
-    MSG msg;
-    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
-        ::TranslateMessage(&msg);
-        ::DispatchMessageA(&msg);
-    }
-}
 
 struct Row {
     int count = 0;
@@ -139,9 +132,9 @@ Row Measure(const std::string& dir, int count, UINT mask) {
     CountingTree tree;
     tree.SetHourglass(::LoadCursorW(AfxGetResourceHandle(), MAKEINTRESOURCEW(IDC_HOURGLASS)));
     tree.SetCallbackMask(mask);
-    tree.Create(WS_CHILD | WS_VISIBLE | TVS_HASBUTTONS | TVS_HASLINES | TVS_LINESATROOT, CRect(0, 0, 400, 700),
-                &window, 2);
-    PumpPending();
+    tree.Create(WS_CHILD | WS_VISIBLE | TVS_HASBUTTONS | TVS_HASLINES | TVS_LINESATROOT,
+                CRect(0, 0, 400, 700), &window, 2);
+    testsupport::PumpMessages();
     // The folder's parent as the only top node; the folder its child, expanded below.
     const std::string parentDir = dir.substr(0, dir.find_last_of('\\'));
     CShellPidl parentId = PidlOf(parentDir);
@@ -150,7 +143,7 @@ Row Measure(const std::string& dir, int count, UINT mask) {
     const std::string leaf = dir.substr(dir.find_last_of('\\') + 1);
     while (node && _stricmp(tree.GetItemText(node).c_str(), leaf.c_str()) != 0)
         node = tree.GetNextSiblingItem(node);
-    PumpPending();
+    testsupport::PumpMessages();
     if (!node)
         return row;
 
@@ -162,7 +155,8 @@ Row Measure(const std::string& dir, int count, UINT mask) {
             const auto ping = Clock::now();
             DWORD_PTR result = 0;
             ::SendMessageTimeoutA(hwnd, WM_NULL, 0, 0, SMTO_NORMAL, 60000, &result);
-            const long long us = std::chrono::duration_cast<std::chrono::microseconds>(Clock::now() - ping).count();
+            const long long us =
+                std::chrono::duration_cast<std::chrono::microseconds>(Clock::now() - ping).count();
             if (us > longestUs)
                 longestUs = us;
             ::Sleep(5);
@@ -172,13 +166,13 @@ Row Measure(const std::string& dir, int count, UINT mask) {
     start = Clock::now();
     tree.Expand(node, TVE_EXPAND);
     row.expand = MsSince(start);
-    PumpPending();
+    testsupport::PumpMessages();
     done = true;
     // The watcher's last ping waits for this thread's messages.
     while (watcher.joinable()) {
-        PumpPending();
+        testsupport::PumpMessages();
         if (::MsgWaitForMultipleObjects(0, nullptr, FALSE, 10, QS_ALLINPUT) == WAIT_TIMEOUT && done) {
-            PumpPending();
+            testsupport::PumpMessages();
             watcher.join();
         }
     }
@@ -207,7 +201,8 @@ int main(int argc, char** argv) {
     const std::string base = argv[1];
     ::CreateDirectoryA(base.c_str(), nullptr);
     std::printf("| Sub-folders | Attributes | Enumerate ms | Sort ms | Insert (bare tree) ms | Expand ms "
-                "| Longest UI stall ms | Animation wake-ups | Children |\n|---:|---|---:|---:|---:|---:|---:|---:|---:|\n");
+                "| Longest UI stall ms | Animation wake-ups | Children "
+                "|\n|---:|---|---:|---:|---:|---:|---:|---:|---:|\n");
     for (int count : counts) {
         const std::string dir = base + "\\folders-" + std::to_string(count);
         if (!MakeFolders(dir, count)) {

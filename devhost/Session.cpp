@@ -10,6 +10,7 @@
 #include "devhost/ScriptRunner.h"
 #include "devhost/Text.h"
 #include "devhost/Timing.h"
+#include "tests/support/MessagePump.h" // pumped wide: devhost's windows are Unicode
 #include "thumbs/AppMessages.h"
 
 #include <windows.h>
@@ -56,21 +57,13 @@ std::wstring ExeDirectory() {
     return slash == std::wstring::npos ? std::wstring() : path.substr(0, slash + 1);
 }
 
-void PumpMessages() {
-    MSG message;
-    while (PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE)) {
-        TranslateMessage(&message);
-        DispatchMessageW(&message);
-    }
-}
-
 // Waits for a thread while the user-interface thread keeps answering its windows.
 void WaitPumping(HANDLE thread) {
     for (;;) {
         const DWORD result = MsgWaitForMultipleObjects(1, &thread, FALSE, INFINITE, QS_ALLINPUT);
         if (result != WAIT_OBJECT_0 + 1)
             return;
-        PumpMessages();
+        testsupport::PumpMessages(testsupport::Chars::Wide);
     }
 }
 
@@ -214,7 +207,7 @@ bool Session::CreateWindows() {
         return false;
     }
     Host().frame = m_frame.Handle();
-    PumpMessages();
+    testsupport::PumpMessages(testsupport::Chars::Wide);
     if (!m_options.refuseWindow.empty()) {
         g_refusedClassPrefix = m_options.refuseWindow;
         SetWindowsHookExW(WH_CBT, &RefuseWindowHook, nullptr, GetCurrentThreadId());
@@ -288,7 +281,7 @@ void Session::OpenDocuments() {
         Send(AcRx::kLoadDwgMsg);
     }
     Activate(host.documents.front().get());
-    PumpMessages();
+    testsupport::PumpMessages(testsupport::Chars::Wide);
 }
 
 void Session::CloseDocuments() {
@@ -303,7 +296,7 @@ void Session::CloseDocuments() {
             DestroyWindow(document->View());
         host.documents.erase(host.documents.begin());
     }
-    PumpMessages();
+    testsupport::PumpMessages(testsupport::Chars::Wide);
 }
 
 void Session::StartScript() {
@@ -391,7 +384,7 @@ void Session::Evaluate(const std::wstring& expression) {
     host.resultList = nullptr;
     host.result = CallResult::Void;
     if (!nested)
-        PumpMessages();
+        testsupport::PumpMessages(testsupport::Chars::Wide);
 }
 
 // The state of the running call is put aside while the second one runs and comes back after it, as a

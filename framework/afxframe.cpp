@@ -54,18 +54,29 @@ bool CFrameWnd::LoadFrame(UINT resourceId, DWORD style, CWnd* parent, CCreateCon
     m_hIconSmall = static_cast<HICON>(
         ::LoadImageA(hInst, MAKEINTRESOURCEA(resourceId), IMAGE_ICON, ::GetSystemMetrics(SM_CXSMICON),
                      ::GetSystemMetrics(SM_CYSMICON), LR_DEFAULTCOLOR | LR_SHARED));
-    m_hMenuDefault = ::LoadMenuA(hInst, MAKEINTRESOURCEA(resourceId)); // owned by the window once created
+    // The menu is this call's until a window is made with it, then the window's.
+    const HMENU menu = ::LoadMenuA(hInst, MAKEINTRESOURCEA(resourceId));
+    m_hMenuDefault = menu;
     m_hAccelTable = ::LoadAcceleratorsA(hInst, MAKEINTRESOURCEA(resourceId));
     m_pContext = context;
 
+    // A creation that fails in WM_CREATE destroys the window, and with it a frame that deletes itself:
+    // after it, this object is touched only when the watch says it is still there.
+    const LifetimeWatch watch(*this);
     // An empty rectangle: the system's default placement (PreCreateWindow).
-    bool ok = CreateEx(0, nullptr, m_strTitle.c_str(), style, CRect(), parent, 0);
-    m_pContext = nullptr;
+    const bool ok = CreateEx(0, nullptr, m_strTitle.c_str(), style, CRect(), parent, 0);
     if (!ok) {
-        // Not created: the window never owned the menu. (An object that failed in WM_CREATE and
-        // deleted itself has already gone; nothing of it is touched here.)
+        // No window owns the menu: either none was made, or the one destroyed in its creation took it
+        // along (then the handle is no menu any more).
+        if (menu && ::IsMenu(menu))
+            ::DestroyMenu(menu);
+        if (!watch.Gone()) {
+            m_hMenuDefault = nullptr;
+            m_pContext = nullptr;
+        }
         return false;
     }
+    m_pContext = nullptr;
     if (m_hIcon)
         SendMessage(WM_SETICON, ICON_BIG, reinterpret_cast<LPARAM>(m_hIcon));
     if (m_hIconSmall)

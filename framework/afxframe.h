@@ -9,7 +9,8 @@
 //
 // Ownership. A frame created with new deletes itself when its window is destroyed (m_bAutoDelete);
 // its views and bars are child windows destroyed with it. The menu loaded by LoadFrame belongs to the
-// window and is destroyed with it.
+// window and is destroyed with it; when the creation fails, LoadFrame destroys it. A frame that deleted
+// itself in a failed creation is not touched by LoadFrame again.
 #pragma once
 
 #include "afxbars.h"

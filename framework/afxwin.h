@@ -291,6 +291,30 @@ private:
     // Handles one message; `objectGone` is set when the object was deleted while handling it.
     LRESULT DispatchGuarded(UINT message, WPARAM wParam, LPARAM lParam, bool& objectGone);
 
+protected:
+    // Watches this object through a call that may delete it (a creation that fails destroys its window,
+    // and a frame deletes itself with its window): Gone() says whether it did. Lives on the caller's stack,
+    // marked by the destructor like a message being handled.
+    class LifetimeWatch {
+    public:
+        explicit LifetimeWatch(CWnd& wnd) : m_wnd(wnd) {
+            m_entry.outer = wnd.m_pDispatch;
+            wnd.m_pDispatch = &m_entry;
+        }
+        ~LifetimeWatch() {
+            if (!m_entry.objectGone)
+                m_wnd.m_pDispatch = m_entry.outer;
+        }
+        LifetimeWatch(const LifetimeWatch&) = delete;
+        LifetimeWatch& operator=(const LifetimeWatch&) = delete;
+        bool Gone() const { return m_entry.objectGone; }
+
+    private:
+        CWnd& m_wnd;
+        Dispatch m_entry;
+    };
+
+private:
     WNDPROC m_pfnSuper = nullptr; // the procedure Default() calls: DefWindowProc or the original one
     bool m_bBound = false;
     CurrentMessage m_current;

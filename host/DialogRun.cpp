@@ -1,8 +1,7 @@
 #include "host/DialogRun.h"
 
-#include "host/ArxApp.h"
+#include "frame/MdiMixin.h"
 #include "hostapi/HostApi.h"
-#include "host/Orvex.h"
 #include "thumbs/AppMessages.h"
 #include "thumbs/DrawingFolder.h"
 
@@ -41,28 +40,17 @@ std::string PickRefusal(const DrawingFolder& folder) {
     return {};
 }
 
-// Copies of what the LISP function took from its arguments, for the explorer of this call.
-ExplorerCall CallArguments() {
-    ExplorerCall call;
-    call.acceptCaption = g_szAcceptCaption;
-    call.cancelCaption = g_szCancelCaption;
-    call.startPath = g_szStartPath;
-    call.startShellPath = g_szStartShellPath;
-    call.hostFrame = acedGetAcadFrame();
-    return call;
-}
-
 } // namespace
 
 CDialogRun::~CDialogRun() {
-    if (theApp.m_pMainWnd == this)
-        theApp.m_pMainWnd = nullptr;
+    if (m_app.m_pMainWnd == this)
+        m_app.m_pMainWnd = nullptr;
 }
 
 bool CDialogRun::OnInitDialog() {
     CDialog::OnInitDialog();
     // The explorer is placed from this dialog's rectangle, so it is created before the dialog shrinks.
-    if (!theApp.CreateAndShow(this, CallArguments())) {
+    if (!m_app.CreateAndShow(this, m_call)) {
         // Nothing to show and nothing to wait for: an invisible loop would hold the host for good.
         acutPrintf(L"\nOrvex: the explorer window could not be created\n");
         EndDialog(kAppCancel);
@@ -84,7 +72,7 @@ bool CDialogRun::PreTranslateMessage(MSG* pMsg) {
         if ((pMsg->wParam != kAppAccept && pMsg->wParam != kAppCancel) || pMsg->lParam != 0)
             return true;
         if (pMsg->wParam == kAppAccept) {
-            const DrawingFolder* folder = theApp.Folder();
+            const DrawingFolder* folder = m_app.Folder();
             if (!folder || folder->Chosen() < 0) {
                 EndDialog(kAppCancel); // accept with nothing chosen: the call returns nil
                 return true;

@@ -38,19 +38,19 @@ void UndefineFunctions() {
         acedUndef(g_lispFunctions[i].name, i);
 }
 
-void InvokeFunction() {
+void InvokeFunction(PickerPlatform& platform) {
     acedRetVoid();
     const int code = acedGetFunCode();
     // The bound is one past the last index of the one-entry table; the host only passes codes that were
     // defined, so index 1 is never asked for.
     if (code < 0 || code > 1 || code >= kLispFunctionCount)
         return;
-    g_lispFunctions[code].function();
+    g_lispFunctions[code].function(platform);
 }
 
 } // namespace
 
-AcRx::AppRetCode DispatchEntryMessage(int message, void* appId) {
+AcRx::AppRetCode DispatchEntryMessage(int message, void* appId, PickerPlatform& platform) {
     switch (message) {
     case AcRx::kInitAppMsg:
         OnInitApp(appId);
@@ -62,7 +62,7 @@ AcRx::AppRetCode DispatchEntryMessage(int message, void* appId) {
         UndefineFunctions();
         break;
     case AcRx::kInvkSubrMsg:
-        InvokeFunction();
+        InvokeFunction(platform);
         break;
     default: // kUnloadAppMsg and everything else: nothing to do
         break;

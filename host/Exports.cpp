@@ -1,4 +1,5 @@
 // The library's whole export table (see Orvex1.def). Nothing thrown inside may leave these functions.
+#include "host/ArxApp.h"
 #include "host/EntryPoint.h"
 #include "host/ModuleObject.h"
 #include "hostapi/Guard.h"
@@ -10,7 +11,7 @@ extern "C" AcRx::AppRetCode acrxEntryPoint(AcRx::AppMsgCode message, void* appId
         // A DLL has no WinMain: the application object starts with the first message that needs it.
         if (message == AcRx::kInitAppMsg || message == AcRx::kInvkSubrMsg)
             AfxWinInit();
-        DispatchEntryMessage(message, appId);
+        DispatchEntryMessage(message, appId, theApp.Picker());
         // The window classes go with the application, so the library can be loaded again later.
         if (message == AcRx::kUnloadAppMsg)
             AfxWinTerm();

@@ -59,22 +59,7 @@ void AppendParameters(ads_list_user& list, const std::string& folder) {
 
 } // namespace
 
-namespace {
-PickerPlatform* g_pPickerPlatform = nullptr;
-} // namespace
-
-PickerPlatform& CurrentPickerPlatform() {
-    return g_pPickerPlatform ? *g_pPickerPlatform : DefaultPickerPlatform();
-}
-void SetPickerPlatform(PickerPlatform* platform) {
-    g_pPickerPlatform = platform;
-}
-
-int Orvex() {
-    return OrvexWith(CurrentPickerPlatform());
-}
-
-int OrvexWith(PickerPlatform& platform) {
+int Orvex(PickerPlatform& platform) {
     // One explorer at a time: a second call made while one is open (a host that runs LISP from its own
     // timers or another document while the explorer's loop runs) would share the open one's document,
     // captions and main window, and destroy them under it. It is refused and returns nil.

@@ -17,7 +17,8 @@ extern char g_szStartShellPath[kPathChars];   // display-name path of the start 
 extern char g_szStartPath[kPathChars];        // the start path as given (file-system form), or empty
 
 // What the picker needs from the platform: the shell, the run dialog and the explorer document.
-// The Windows build supplies the real ones; unit tests supply fakes.
+// Its owner hands it to `Orvex`: in the library the application object owns the Windows one; unit tests
+// hand in fakes.
 class CTessel3Doc;
 class DrawingFolder;
 struct PickerPlatform {
@@ -38,12 +39,6 @@ struct PickerPlatform {
     virtual void FocusHostView() = 0;
 };
 
-// The platform `Orvex` uses: the built-in one unless a test installed another (nullptr restores it).
-PickerPlatform& CurrentPickerPlatform();
-void SetPickerPlatform(PickerPlatform* platform);
-PickerPlatform& DefaultPickerPlatform(); // per build: Windows shell and dialog, or a cancelling stand-in
-
-// `Orvex`: checks the five LISP arguments, runs the explorer and sets the LISP result.
+// `Orvex`: checks the five LISP arguments, runs the explorer on `platform` and sets the LISP result.
 // Returns 1 after a completed run (picked or cancelled), 0 after an argument error.
-int Orvex();
-int OrvexWith(PickerPlatform& platform);
+int Orvex(PickerPlatform& platform);

@@ -1,7 +1,7 @@
-// The picker's platform on Windows: the shell's display names, the run dialog and the document.
-#include "host/ArxApp.h"
+#include "host/OrvexWin.h"
+
+#include "frame/MdiMixin.h"
 #include "host/DialogRun.h"
-#include "host/Orvex.h"
 #include "tree/StartShellPath.h"
 #include "hostapi/HostApi.h"
 #include "settings/Tessel3Doc.h"
@@ -38,8 +38,21 @@ private:
     UINT m_doubleClickTime;
 };
 
+// Copies of what the LISP function took from its arguments, for the explorer of this call.
+ExplorerCall CallArguments() {
+    ExplorerCall call;
+    call.acceptCaption = g_szAcceptCaption;
+    call.cancelCaption = g_szCancelCaption;
+    call.startPath = g_szStartPath;
+    call.startShellPath = g_szStartShellPath;
+    call.hostFrame = acedGetAcadFrame();
+    return call;
+}
+
 class WindowsPickerPlatform : public PickerPlatform {
 public:
+    explicit WindowsPickerPlatform(CMdiMixin& app) : m_app(app) {}
+
     std::string StartShellPath(const std::string& path) override { return StartShellPathOf(path); }
 
     std::string WholeStartPath(const std::string& path) override {
@@ -59,16 +72,16 @@ public:
 
     int RunDialog() override {
         HostInputRestorer restorer;
-        CDialogRun dialog;
+        CDialogRun dialog(m_app, CallArguments());
         return static_cast<int>(dialog.DoModal());
     }
 
     CTessel3Doc* Document() override { return g_pTessel3Doc; }
 
-    const DrawingFolder* Folder() override { return theApp.Folder(); }
+    const DrawingFolder* Folder() override { return m_app.Folder(); }
 
     void DestroyDocument() override {
-        theApp.EndRun();      // the folder model writes to the document: it goes first
+        m_app.EndRun();       // the folder model writes to the document: it goes first
         delete g_pTessel3Doc; // saves the explorer's settings and clears the pointer
     }
 
@@ -76,11 +89,13 @@ public:
         if (HWND view = acedGetAcadDwgView())
             ::SetFocus(view);
     }
+
+private:
+    CMdiMixin& m_app;
 };
 
 } // namespace
 
-PickerPlatform& DefaultPickerPlatform() {
-    static WindowsPickerPlatform platform;
-    return platform;
+std::unique_ptr<PickerPlatform> MakeWindowsPickerPlatform(CMdiMixin& app) {
+    return std::make_unique<WindowsPickerPlatform>(app);
 }

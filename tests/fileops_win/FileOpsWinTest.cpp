@@ -7,6 +7,7 @@
 #include "fileops/ShellFileOp.h"
 #include "framework/afxwin.h"
 #include "thumbs/DrawingFolder.h"
+#include "tests/support/MessagePump.h"
 #include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
@@ -559,15 +560,7 @@ TEST(Properties, TheShellsSheetOfTheFullPathOpens) {
     {
         DialogAnswer cancel(IDCANCEL);
         EXPECT_TRUE(ShowFileProperties(a));
-        MSG msg;
-        const ULONGLONG until = ::GetTickCount64() + 1500;
-        while (::GetTickCount64() < until && DialogAnswer::Seen().empty()) {
-            while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
-                ::TranslateMessage(&msg);
-                ::DispatchMessageA(&msg);
-            }
-            ::Sleep(20);
-        }
+        testsupport::PumpUntil([] { return !DialogAnswer::Seen().empty(); }, 1500);
         ASSERT_FALSE(DialogAnswer::Seen().empty());
         EXPECT_NE(DialogAnswer::Seen()[0].find("a.dwg"), std::string::npos) << DialogAnswer::Seen()[0];
     }

@@ -1,14 +1,16 @@
-// The explorer frame hosted by a modal dialog, as the LISP function runs it: the dialog's
+// The explorer frame hosted by the library's run dialog, as the LISP function runs it: the dialog's
 // initialisation creates and shows the explorer, the test script runs inside the modal loop, and the
 // loop ends with what the explorer posts (1 accept, 2 cancel).
 #include "frame/MainFrame.h"
 #include "frame/MdiMixin.h"
 #include "hostapi/HostApi.h"
-#include "host/Orvex.h"
+#include "host/DialogRun.h"
 #include "settings/SettingsPath.h"
 #include "settings/Tessel3Doc.h"
+#include "tests/support/MessagePump.h"
 #include "tests/support/TempFolder.h"
 #include "thumbs/AppMessages.h"
+#include "thumbs/DrawingFolder.h"
 #include "thumbs/Tessel3View.h"
 #include "tree/LeftView.h"
 #include "tree/StartShellPath.h"
@@ -35,15 +37,20 @@ constexpr UINT WM_TEST_STEP = WM_APP + 7;
 constexpr UINT_PTR kWatchdog = 77;
 constexpr INT_PTR kTimedOut = -77;
 
-// The run dialog of the tests: like the library's, plus a script of steps and a watchdog.
-class RunDialog : public CDialog {
+// The arguments of this run, as the LISP function hands them to the run dialog: the host's frame, and
+// the start folder's label path along which the tree opens.
+ExplorerCall CallOfTheRun() {
+    ExplorerCall call = g_call;
+    call.hostFrame = acedGetAcadFrame();
+    if (!call.startPath.empty() && call.startShellPath.empty())
+        call.startShellPath = StartShellPathOf(call.startPath);
+    return call;
+}
+
+// The library's run dialog, given a script of steps that run inside its modal loop and a watchdog.
+class RunDialog : public CDialogRun {
 public:
-    // Shown without activation, as the library's: the explorer's frame keeps the keyboard.
-    RunDialog() : CDialog(IDD_DIALOG_RUN, nullptr) { m_nShowCommand = SW_SHOWNA; }
-    ~RunDialog() override {
-        if (g_app.m_pMainWnd == this)
-            g_app.m_pMainWnd = nullptr;
-    }
+    RunDialog() : CDialogRun(g_app, CallOfTheRun()) {}
 
     std::function<void()> beforeCreate;
     std::vector<std::function<void(CMainFrame&)>> steps;
@@ -52,40 +59,36 @@ public:
     HWND hostFrame = nullptr;
 
     bool OnInitDialog() override {
-        CDialog::OnInitDialog();
         if (beforeCreate)
             beforeCreate();
-        ExplorerCall call = g_call;
-        call.hostFrame = acedGetAcadFrame();
-        // As the LISP function does: the tree opens along the start folder's label path.
-        if (!call.startPath.empty() && call.startShellPath.empty())
-            call.startShellPath = StartShellPathOf(call.startPath);
-        created = g_app.CreateAndShow(this, call);
-        ::MoveWindow(m_hWnd, 0, 0, 0, 0, TRUE);
+        const bool result = CDialogRun::OnInitDialog();
+        created = g_app.ExplorerFrame() != nullptr;
         SetTimer(kWatchdog, 15000);
         PostMessage(WM_TEST_STEP, 0);
-        return false; // as the library's run dialog: the explorer has placed the keyboard focus
+        return result;
     }
 
     bool PreTranslateMessage(MSG* pMsg) override {
-        if (pMsg->message == WM_ORVEX_RESULT && pMsg->hwnd == m_hWnd)
-            EndDialog(static_cast<INT_PTR>(pMsg->wParam));
         if (pMsg->message == WM_TEST_STEP && pMsg->hwnd == m_hWnd) {
             RunStep(static_cast<size_t>(pMsg->wParam));
             return true;
         }
-        return CDialog::PreTranslateMessage(pMsg);
+        return CDialogRun::PreTranslateMessage(pMsg);
     }
 
 protected:
     LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override {
+        if (message == WM_TEST_STEP) { // in a loop that does not pre-translate, such as a message box's
+            RunStep(static_cast<size_t>(wParam));
+            return 0;
+        }
         if (message == WM_TIMER && wParam == kWatchdog) {
             KillTimer(kWatchdog);
             ADD_FAILURE() << "the explorer did not end the run";
             EndDialog(kTimedOut);
             return 0;
         }
-        return CDialog::WindowProc(message, wParam, lParam);
+        return CDialogRun::WindowProc(message, wParam, lParam);
     }
 
 private:
@@ -98,15 +101,6 @@ private:
         }
     }
 };
-
-// Dispatches what is queued for this thread, so posted commands and idle updates have run.
-void Pump() {
-    MSG msg;
-    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
-        ::TranslateMessage(&msg);
-        ::DispatchMessageA(&msg);
-    }
-}
 
 std::string MenuText(HMENU menu, UINT item, UINT flags) {
     char text[128] = "";
@@ -145,6 +139,9 @@ protected:
     void TearDown() override {
         DestroyDocument();
         std::remove(ExplorerSettingsPath().c_str());
+        // The run dialog sets the thumbnails' double-click time; the library's run puts the user's back.
+        if (::GetDoubleClickTime() != m_doubleClickTime)
+            ::SetDoubleClickTime(m_doubleClickTime);
     }
 
     // Writes the explorer's settings file that the next run's document reads.
@@ -156,9 +153,11 @@ protected:
         g_pTessel3Doc = nullptr;
     }
 
+    const UINT m_doubleClickTime = ::GetDoubleClickTime();
+
     INT_PTR Run(RunDialog& dialog) {
         const INT_PTR result = dialog.DoModal();
-        Pump();
+        testsupport::PumpMessages(); // posted commands and idle updates have run
         EXPECT_TRUE(dialog.created);
         EXPECT_EQ(g_app.ExplorerFrame(), nullptr) << "the frame goes with the dialog";
         return result;
@@ -379,7 +378,7 @@ CRect FrameRectForStoredSize(const std::string& width, const std::string& height
         frame.PostMessage(WM_CLOSE);
     });
     EXPECT_EQ(dialog.DoModal(), 2);
-    Pump();
+    testsupport::PumpMessages();
     delete g_pTessel3Doc;
     g_pTessel3Doc = nullptr;
     return rc;
@@ -479,22 +478,25 @@ TEST_F(ExplorerFrame, LayerLabelSaysCurrentWithoutDatainsIni) {
 }
 
 TEST_F(ExplorerFrame, AcceptNeedsAChosenDrawing) {
+    // The drawing is there: the run dialog hands back only a file that exists.
+    const std::string folder = TempFolder("orvex-frame-accept");
+    std::ofstream(folder + "\\plan.dwg", std::ios::binary) << "";
+    g_call.startPath = folder + "\\";
     RunDialog dialog;
     dialog.steps.push_back([](CMainFrame& frame) {
         // No drawing chosen: the accept command does nothing.
         frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0);
     });
-    const std::string folder = TempFolder("accept");
-    testsupport::WriteBytes(folder + "\\plan.dwg", "AC1018");
-    dialog.steps.push_back([&folder](CMainFrame& frame) {
+    dialog.steps.push_back([](CMainFrame& frame) {
         DrawingFolder* drawings = g_app.Folder();
         ASSERT_NE(drawings, nullptr);
-        ASSERT_TRUE(drawings->Show(folder));
         drawings->Choose(drawings->Find("plan.dwg"));
         ASSERT_EQ(drawings->Chosen(), 0);
         frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0);
     });
     EXPECT_EQ(Run(dialog), 1);
+    std::remove((folder + "\\plan.dwg").c_str());
+    ::RemoveDirectoryA(folder.c_str());
 }
 
 TEST_F(ExplorerFrame, SavedDrawingNameStartsTheSearch) {
@@ -595,6 +597,46 @@ TEST_F(ExplorerFrame, TypingAPrefixChoosesTheDrawingAndAcceptTakesIt) {
     ASSERT_NE(g_pTessel3Doc, nullptr);
     EXPECT_EQ(g_pTessel3Doc->m_strPath, folder);
     EXPECT_EQ(g_pTessel3Doc->m_strName, "abc.dwg");
+    RemoveFolder(folder, files);
+}
+
+// The run dialog hands back only a drawing that is still there: accepting one deleted meanwhile says so,
+// and the explorer stays open for another choice.
+TEST_F(ExplorerFrame, AcceptOfADrawingDeletedMeanwhileIsRefusedAndTheExplorerStaysOpen) {
+    const auto files = {"abc.dwg", "xyz.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-deleted", files);
+    g_call.startPath = folder + "\\";
+    RunDialog dialog;
+    std::string said;
+    bool stillOpen = false;
+    dialog.steps.push_back([](CMainFrame& frame) {
+        CEditSearch& edit = frame.GetSearchEdit();
+        edit.SetFocus();
+        edit.PostMessage(WM_CHAR, 'a', 1);
+    });
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        ASSERT_NE(g_pTessel3Doc, nullptr);
+        EXPECT_EQ(g_pTessel3Doc->m_strName, "abc.dwg");
+        std::remove((folder + "\\abc.dwg").c_str());
+        // Sent, so that the accept is queued before the next step, which runs in the message box's loop.
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_ACCEPT, 0), 0);
+    });
+    dialog.steps.push_back([&](CMainFrame&) {
+        // Runs inside the message box's own loop.
+        HWND box = ::FindWindowA("#32770", "Orvex1");
+        ASSERT_NE(box, nullptr) << "the refusal is said in a message box";
+        char text[1024] = "";
+        ::GetDlgItemTextA(box, 0xFFFF, text, sizeof text); // the message box's text
+        said = text;
+        ::PostMessageA(box, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED), 0);
+    });
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        stillOpen = frame.IsWindowVisible();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_TRUE(stillOpen);
+    EXPECT_EQ(said, "The drawing\n" + folder + "\\abc.dwg\nno longer exists. Choose another one.");
     RemoveFolder(folder, files);
 }
 

@@ -286,7 +286,7 @@ TEST(Dialog, ModelessDialogsAreCreatedAndBound) {
     dlg.DestroyWindow();
     EXPECT_EQ(dlg.m_hWnd, nullptr);
     EXPECT_EQ(dlg.edit.m_hWnd, nullptr);
-    PumpPending();
+    testsupport::PumpMessages();
 }
 
 TEST(Dialog, ANestedRunEndsAsCancelledWhenTheRunItInterruptedIsEnded) {

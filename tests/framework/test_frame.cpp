@@ -5,6 +5,11 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <cstring>
+#include <iterator>
+#include <new>
+
 namespace {
 
 std::vector<std::pair<std::string, UINT>> g_commands; // (who, id)
@@ -95,7 +100,7 @@ struct FrameFixture : ::testing::Test {
         if (::IsWindow(hwnd()))
             ::DestroyWindow(hwnd());
         g_commands.clear();
-        PumpPending();
+        testsupport::PumpMessages();
     }
     HWND hwnd() const { return frameHwnd ? frameHwnd : frame->m_hWnd; }
     HWND frameHwnd = nullptr;
@@ -181,7 +186,7 @@ TEST_F(FrameFixture, ToolbarButtonClicksReachTheFrame) {
     CPoint center = rc.CenterPoint();
     frame->bottomBar.SendMessage(WM_LBUTTONDOWN, MK_LBUTTON, MAKELPARAM(center.x, center.y));
     frame->bottomBar.SendMessage(WM_LBUTTONUP, 0, MAKELPARAM(center.x, center.y));
-    PumpPending();
+    testsupport::PumpMessages();
     ASSERT_EQ(g_commands.size(), 1u);
     EXPECT_EQ(g_commands[0], std::make_pair(std::string("frame"), static_cast<UINT>(ID_TEST_SECOND)));
 }
@@ -226,7 +231,7 @@ TEST_F(FrameFixture, StandardCommandsShowAndHideBarsAndCloseTheFrame) {
 
     frameHwnd = frame->m_hWnd;
     frame->SendMessage(WM_COMMAND, ID_APP_EXIT);
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_FALSE(::IsWindow(frameHwnd)); // closed, and the frame object deleted itself
 }
 
@@ -481,4 +486,85 @@ TEST(ToolTipCtrl, ToolsAreAddedWithTheirText) {
     ti.lpszText = text;
     tip.SendMessage(TTM_GETTEXTA, sizeof text, reinterpret_cast<LPARAM>(&ti));
     EXPECT_STREQ(text, "name size date");
+}
+
+namespace {
+
+// A frame whose creation fails: its PreCreateWindow keeps the menu the frame was to get and may refuse,
+// its OnCreate may fail. Made with new, it deletes itself with its window like every frame; its memory is
+// a buffer of its own, filled with a canary when the object goes, so that a write into the freed object
+// shows afterwards.
+class FailingFrame : public CFrameWnd {
+public:
+    static void* operator new(std::size_t size);
+    static void operator delete(void* object, std::size_t size);
+
+    static constexpr unsigned char kCanary = 0xA5;
+    static HMENU s_menu; // the menu of the last creation attempt
+    static bool s_gone;  // whether the last object was deleted
+    bool refuseInPreCreate = false;
+
+protected:
+    bool PreCreateWindow(CREATESTRUCTA& cs) override {
+        const bool ok = CFrameWnd::PreCreateWindow(cs);
+        s_menu = cs.hMenu;
+        return ok && !refuseInPreCreate;
+    }
+    int OnCreate(LPCREATESTRUCTA) override { return -1; }
+};
+
+HMENU FailingFrame::s_menu = nullptr;
+bool FailingFrame::s_gone = false;
+alignas(FailingFrame) unsigned char g_failingFrameMemory[sizeof(FailingFrame)];
+
+void* FailingFrame::operator new(std::size_t size) {
+    if (size > sizeof g_failingFrameMemory)
+        throw std::bad_alloc();
+    s_gone = false;
+    return g_failingFrameMemory;
+}
+
+void FailingFrame::operator delete(void* object, std::size_t size) {
+    std::memset(object, kCanary, size);
+    s_gone = true;
+}
+
+// Whether the freed frame's memory still holds nothing but the canary.
+bool CanaryIntact() {
+    return std::all_of(std::begin(g_failingFrameMemory), std::end(g_failingFrameMemory),
+                       [](unsigned char byte) { return byte == FailingFrame::kCanary; });
+}
+
+} // namespace
+
+// The frame's window failed in WM_CREATE and the frame deleted itself: LoadFrame writes nothing into it.
+TEST(FrameCreation, AFrameThatDeletedItselfInAFailedCreationIsNotWrittenAfterwards) {
+    CDocument doc;
+    CCreateContext context;
+    context.m_pCurrentDoc = &doc;
+    auto* frame = new FailingFrame;
+    EXPECT_FALSE(frame->LoadFrame(IDR_TEST_FRAME, WS_OVERLAPPEDWINDOW | FWS_ADDTOTITLE, nullptr, &context));
+    ASSERT_TRUE(FailingFrame::s_gone) << "the frame deletes itself with its window";
+    EXPECT_TRUE(CanaryIntact()) << "the freed frame was written after its creation failed";
+    testsupport::PumpMessages();
+}
+
+// The menu LoadFrame loaded goes with a creation that failed in WM_CREATE.
+TEST(FrameCreation, AFailedCreationLeavesNoMenuBehind) {
+    auto* frame = new FailingFrame;
+    EXPECT_FALSE(frame->LoadFrame(IDR_TEST_FRAME, WS_OVERLAPPEDWINDOW, nullptr, nullptr));
+    ASSERT_NE(FailingFrame::s_menu, nullptr) << "the test frame's resource has a menu";
+    EXPECT_FALSE(::IsMenu(FailingFrame::s_menu));
+    testsupport::PumpMessages();
+}
+
+// The menu also goes when no window was made at all (the frame refused in PreCreateWindow).
+TEST(FrameCreation, ARefusedCreationLeavesNoMenuBehind) {
+    auto* frame = new FailingFrame;
+    frame->refuseInPreCreate = true;
+    EXPECT_FALSE(frame->LoadFrame(IDR_TEST_FRAME, WS_OVERLAPPEDWINDOW, nullptr, nullptr));
+    ASSERT_FALSE(FailingFrame::s_gone) << "without a window the frame is not deleted";
+    ASSERT_NE(FailingFrame::s_menu, nullptr) << "the test frame's resource has a menu";
+    EXPECT_FALSE(::IsMenu(FailingFrame::s_menu));
+    delete frame;
 }

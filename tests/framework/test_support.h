@@ -3,18 +3,10 @@
 
 #include "afxwin.h"
 #include "resource.h"
+#include "tests/support/MessagePump.h"
 
 #include <string>
 #include <vector>
-
-// Dispatches everything queued for this thread, without waiting.
-inline void PumpPending() {
-    MSG msg;
-    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
-        ::TranslateMessage(&msg);
-        ::DispatchMessageA(&msg);
-    }
-}
 
 // Collects what the error reporter was given while it is alive, then puts the previous reporter back.
 class ReportCapture {

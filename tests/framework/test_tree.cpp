@@ -19,7 +19,7 @@ public:
     int subclassed = 0;
     bool boundWhenSubclassed = false;
     HIMAGELIST listToPost = nullptr;
-    std::vector<UINT> codes;       // AfxTreeNotifyCode of every reflected notification
+    std::vector<UINT> codes; // AfxTreeNotifyCode of every reflected notification
     std::vector<UINT> expandActions;
     bool vetoExpand = false;
 
@@ -63,7 +63,7 @@ TEST(TreeCtrl, PreSubclassWindowRunsOnceTheControlIsBound) {
     EXPECT_EQ(tree.subclassed, 1);
     EXPECT_TRUE(tree.boundWhenSubclassed);
     EXPECT_EQ(tree.GetImageList(TVSIL_NORMAL), nullptr); // posted, not yet there
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(tree.GetImageList(TVSIL_NORMAL), list);
     tree.DestroyWindow();
     ImageList_Destroy(list);

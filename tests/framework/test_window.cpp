@@ -292,7 +292,7 @@ TEST(Dispatch, MessagesReachTheirNamedHandlers) {
     w.SetTimer(7, 1);
     for (int i = 0; i < 200 && std::find(w.calls.begin(), w.calls.end(), "OnTimer") == w.calls.end(); ++i) {
         ::Sleep(5);
-        PumpPending();
+        testsupport::PumpMessages();
     }
     w.DestroyWindow();
     std::vector<std::string> expected{"OnSize", "OnKeyDown", "OnTimer", "OnDestroy"};
@@ -372,7 +372,7 @@ TEST(Exceptions, ThrownByAPostedMessageDoNotLeaveTheMessageLoop) {
     ASSERT_TRUE(w.CreateTopLevel());
     w.throwOnClick = true;
     w.PostMessage(WM_LBUTTONDOWN, MK_LBUTTON, MAKELPARAM(1, 0));
-    PumpPending();
+    testsupport::PumpMessages();
     ASSERT_EQ(ReportCapture::Reports().size(), 1u);
     EXPECT_EQ(ReportCapture::Reports()[0], "handler failed");
 }

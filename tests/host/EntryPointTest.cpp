@@ -10,14 +10,12 @@ namespace {
 struct EntryPointTest : ::testing::Test {
     FakeHost host;
     testsupport::CancellingPicker platform;
-    void SetUp() override { SetPickerPlatform(&platform); }
-    void TearDown() override { SetPickerPlatform(nullptr); }
     void* appId = reinterpret_cast<void*>(std::uintptr_t{42});
 };
 
 TEST_F(EntryPointTest, UnusedMessagesDoNothing) {
     for (int message : {0, 2, 6, 7, 100, -1}) {
-        EXPECT_EQ(DispatchEntryMessage(message, appId), AcRx::kRetOK);
+        EXPECT_EQ(DispatchEntryMessage(message, appId, platform), AcRx::kRetOK);
     }
     EXPECT_TRUE(host.calls.empty());
     EXPECT_TRUE(host.events.empty());
@@ -25,20 +23,20 @@ TEST_F(EntryPointTest, UnusedMessagesDoNothing) {
 }
 
 TEST_F(EntryPointTest, InitialisationUnlocksAndRegistersAsMdiAware) {
-    EXPECT_EQ(DispatchEntryMessage(AcRx::kInitAppMsg, appId), AcRx::kRetOK);
+    EXPECT_EQ(DispatchEntryMessage(AcRx::kInitAppMsg, appId, platform), AcRx::kRetOK);
     EXPECT_EQ(host.calls, (std::vector<std::string>{"lookup DynamicLinker", "unlock 42",
                                                     "lookup DynamicLinker", "mdi 42"}));
 }
 
 TEST_F(EntryPointTest, DrawingLoadDefinesAndUnloadUndefinesOrvexAsCodeZero) {
-    DispatchEntryMessage(AcRx::kLoadDwgMsg, appId);
-    DispatchEntryMessage(AcRx::kUnloadDwgMsg, appId);
+    DispatchEntryMessage(AcRx::kLoadDwgMsg, appId, platform);
+    DispatchEntryMessage(AcRx::kUnloadDwgMsg, appId, platform);
     EXPECT_EQ(host.calls, (std::vector<std::string>{"defun Orvex 0", "undef Orvex 0"}));
 }
 
 TEST_F(EntryPointTest, FailedDefinitionStillAnswersOk) {
     host.failDefunAt = 1;
-    EXPECT_EQ(DispatchEntryMessage(AcRx::kLoadDwgMsg, appId), AcRx::kRetOK);
+    EXPECT_EQ(DispatchEntryMessage(AcRx::kLoadDwgMsg, appId, platform), AcRx::kRetOK);
     EXPECT_EQ(host.calls.size(), 1u);
 }
 
@@ -49,7 +47,7 @@ TEST_F(EntryPointTest, InvokeWithCodeZeroRunsThePickerOnce) {
     host.AddString(L"");
     host.AddString(L"");
     host.AddString(L"");
-    DispatchEntryMessage(AcRx::kInvkSubrMsg, appId);
+    DispatchEntryMessage(AcRx::kInvkSubrMsg, appId, platform);
     EXPECT_EQ(platform.runs, 1);
     EXPECT_EQ(host.result, "nil");
 }
@@ -58,7 +56,7 @@ TEST_F(EntryPointTest, InvokeWithAnotherCodeRunsNothingAndLeavesNoValue) {
     for (int code : {-1, -5, 1, 2}) {
         host.funCode = code;
         host.result = "unset";
-        DispatchEntryMessage(AcRx::kInvkSubrMsg, appId);
+        DispatchEntryMessage(AcRx::kInvkSubrMsg, appId, platform);
         EXPECT_EQ(host.result, "void") << code;
     }
     EXPECT_EQ(platform.runs, 0);

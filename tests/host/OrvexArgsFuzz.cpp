@@ -98,7 +98,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     platform.pick = valid && accept.size() % 2 == 1;
     const std::string acceptBefore = g_szAcceptCaption;
     const std::string cancelBefore = g_szCancelCaption;
-    const int rc = OrvexWith(platform);
+    const int rc = Orvex(platform);
 
     if (host.liveNodes != 0) // the arguments and the result list are released
         std::abort();

@@ -75,7 +75,7 @@ struct OrvexTest : ::testing::Test {
 };
 
 TEST_F(OrvexTest, NoArgumentsPrintsThenAlertsMissingParameters) {
-    EXPECT_EQ(OrvexWith(platform), 0);
+    EXPECT_EQ(Orvex(platform), 0);
     EXPECT_EQ(host.events,
               (std::vector<std::string>{"print:\nMissing parametrs\n", "alert:\nMissing parametrs\n"}));
     EXPECT_EQ(host.result, "unset"); // the dispatcher's void default stays
@@ -84,7 +84,7 @@ TEST_F(OrvexTest, NoArgumentsPrintsThenAlertsMissingParameters) {
 
 TEST_F(OrvexTest, OnlyOneArgumentPrintsMissingButAlertsTheTypeMessage) {
     host.AddShort(1);
-    EXPECT_EQ(OrvexWith(platform), 0);
+    EXPECT_EQ(Orvex(platform), 0);
     EXPECT_EQ(host.events, (std::vector<std::string>{"print:\nMissing parametrs\n",
                                                      "alert:\nArgument should be an short"}));
     EXPECT_EQ(host.liveNodes, 0);
@@ -93,7 +93,7 @@ TEST_F(OrvexTest, OnlyOneArgumentPrintsMissingButAlertsTheTypeMessage) {
 TEST_F(OrvexTest, FirstArgumentNotShortPrintsThenAlerts) {
     host.AddString(L"a");
     host.AddShort(2);
-    EXPECT_EQ(OrvexWith(platform), 0);
+    EXPECT_EQ(Orvex(platform), 0);
     EXPECT_EQ(host.events, (std::vector<std::string>{"print:\nArgument should be an short",
                                                      "alert:\nArgument should be an short"}));
     EXPECT_EQ(host.liveNodes, 0);
@@ -108,7 +108,7 @@ TEST_F(OrvexTest, LaterWrongTypesAlertThenPrint) {
         host.AddString(L"");
         host.AddString(L"");
         host.AddString(L"");
-        EXPECT_EQ(OrvexWith(platform), 0);
+        EXPECT_EQ(Orvex(platform), 0);
         EXPECT_EQ(host.events, expected);
     }
     for (int wrong = 2; wrong < 5; ++wrong) {
@@ -121,7 +121,7 @@ TEST_F(OrvexTest, LaterWrongTypesAlertThenPrint) {
             else
                 host.AddString(L"x");
         }
-        EXPECT_EQ(OrvexWith(platform), 0) << wrong;
+        EXPECT_EQ(Orvex(platform), 0) << wrong;
         EXPECT_EQ(host.events, expected) << wrong;
     }
     EXPECT_TRUE(platform.steps.empty());
@@ -132,14 +132,14 @@ TEST_F(OrvexTest, MissingStringArgumentsAreTypeErrors) {
     host.AddShort(1);
     host.AddShort(2);
     host.AddString(L"C:\\x");
-    EXPECT_EQ(OrvexWith(platform), 0);
+    EXPECT_EQ(Orvex(platform), 0);
     EXPECT_EQ(host.events, (std::vector<std::string>{"alert:\nArgument should be an short",
                                                      "print:\nArgument should be an short"}));
 }
 
 TEST_F(OrvexTest, EmptyCaptionsBecomeOkAndCancelAndThereIsNoStartPath) {
     FiveArguments();
-    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(Orvex(platform), 1);
     EXPECT_STREQ(g_szAcceptCaption, "Ok");
     EXPECT_STREQ(g_szCancelCaption, "Cancel");
     EXPECT_STREQ(g_szStartShellPath, "");
@@ -148,7 +148,7 @@ TEST_F(OrvexTest, EmptyCaptionsBecomeOkAndCancelAndThereIsNoStartPath) {
 
 TEST_F(OrvexTest, CaptionsAndStartPathAreTakenFromTheArguments) {
     FiveArguments(L"C:\\Work\\a.dwg", L"Insert", L"Close");
-    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(Orvex(platform), 1);
     EXPECT_STREQ(g_szAcceptCaption, "Insert");
     EXPECT_STREQ(g_szCancelCaption, "Close");
     EXPECT_EQ(platform.shellPathAskedFor, "C:\\Work\\a.dwg");
@@ -158,7 +158,7 @@ TEST_F(OrvexTest, CaptionsAndStartPathAreTakenFromTheArguments) {
 TEST_F(OrvexTest, CancelReturnsNilDestroysTheDocumentAndGivesTheFocusBack) {
     FiveArguments();
     platform.dialogResult = 2;
-    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(Orvex(platform), 1);
     EXPECT_EQ(host.result, "nil");
     EXPECT_EQ(platform.steps, (std::vector<std::string>{"dialog", "destroy", "focus"}));
     EXPECT_TRUE(fs::exists(platform.settingsFile)) << "the document saves the settings when destroyed";
@@ -169,7 +169,7 @@ TEST_F(OrvexTest, PickInAFolderWithoutParametersGivesThreeEmptyStrings) {
     platform.dialogResult = 1;
     platform.pickFolder = dir.string();
     platform.pickName = "plan.dwg";
-    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(Orvex(platform), 1);
     EXPECT_EQ(host.result, "(\"" + Folder() + "plan.dwg\" (\"\" \"\" \"\"))");
     EXPECT_EQ(host.liveNodes, 0);
 }
@@ -189,7 +189,7 @@ TEST_F(OrvexTest, PickReturnsLayerColorAndCommandOfTheFolder) {
     platform.dialogResult = 1;
     platform.pickFolder = "folder\\"; // already ends in a separator: no second one
     platform.pickName = "a.dwg";
-    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(Orvex(platform), 1);
     fs::current_path(previous);
     EXPECT_EQ(host.result, "(\"folder\\a.dwg\" (\"Walls\" \"3\" \"(princ)\"))");
 }
@@ -199,7 +199,7 @@ TEST_F(OrvexTest, AcceptWithNoDrawingChosenReturnsNilNotTheFolder) {
     platform.dialogResult = 1;
     platform.pickFolder = dir.string();
     platform.pickName = "";
-    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(Orvex(platform), 1);
     EXPECT_EQ(host.result, "nil");
     EXPECT_EQ(platform.steps, (std::vector<std::string>{"dialog", "destroy", "focus"}));
 }
@@ -219,7 +219,7 @@ TEST_F(OrvexTest, ASecondCallWhileTheExplorerIsOpenIsRefusedAndTheOpenOneGoesOn)
             host->AddString(L"C:\\other\\");
             host->AddString(L"Take");
             host->AddString(L"Leave");
-            innerReturn = OrvexWith(*this);
+            innerReturn = Orvex(*this);
             innerEvents = host->events;
             innerResult = host->result;
             captionDuringRun = g_szAcceptCaption;
@@ -233,7 +233,7 @@ TEST_F(OrvexTest, ASecondCallWhileTheExplorerIsOpenIsRefusedAndTheOpenOneGoesOn)
     reentering.pickName = "door.dwg";
     FiveArguments(L"", L"Insert", L"Close");
 
-    EXPECT_EQ(OrvexWith(reentering), 1);
+    EXPECT_EQ(Orvex(reentering), 1);
     EXPECT_EQ(reentering.innerReturn, 1);
     EXPECT_EQ(
         reentering.innerEvents,
@@ -248,7 +248,7 @@ TEST_F(OrvexTest, ASecondCallWhileTheExplorerIsOpenIsRefusedAndTheOpenOneGoesOn)
 
     // Once the first call has returned, the next one runs as usual.
     FiveArguments();
-    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(Orvex(platform), 1);
     EXPECT_EQ(platform.steps, (std::vector<std::string>{"dialog", "destroy", "focus"}));
 }
 
@@ -261,27 +261,27 @@ TEST_F(OrvexTest, AnExceptionOutOfTheRunStillDestroysTheDocumentAndGivesTheFocus
     } throwing;
     throwing.settingsFile = platform.settingsFile;
     FiveArguments();
-    EXPECT_THROW(OrvexWith(throwing), std::runtime_error);
+    EXPECT_THROW(Orvex(throwing), std::runtime_error);
     EXPECT_EQ(throwing.steps, (std::vector<std::string>{"dialog", "destroy", "focus"}));
     EXPECT_EQ(host.liveNodes, 0);
 }
 
 TEST_F(OrvexTest, OverlongArgumentsAreRefusedWithAMessage) {
     FiveArguments(std::wstring(300, L'x'));
-    EXPECT_EQ(OrvexWith(platform), 0);
+    EXPECT_EQ(Orvex(platform), 0);
     EXPECT_TRUE(platform.steps.empty());
     EXPECT_NE(host.printed().find("start path is too long (300 characters; at most 259)"), std::string::npos);
     EXPECT_EQ(host.liveNodes, 0);
 
     host.events.clear();
     FiveArguments(L"", std::wstring(200, L'o'));
-    EXPECT_EQ(OrvexWith(platform), 0);
+    EXPECT_EQ(Orvex(platform), 0);
     EXPECT_NE(host.printed().find("accept caption is too long"), std::string::npos);
 }
 
 TEST_F(OrvexTest, ARelativeStartPathIsTakenAgainstTheHostsCurrentFolder) {
     FiveArguments(L"Doors\\", L"Insert", L"Close");
-    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(Orvex(platform), 1);
     EXPECT_STREQ(g_szStartPath, "C:\\Host\\Doors\\");
     EXPECT_EQ(platform.shellPathAskedFor, "C:\\Host\\Doors\\");
 }
@@ -289,13 +289,13 @@ TEST_F(OrvexTest, ARelativeStartPathIsTakenAgainstTheHostsCurrentFolder) {
 TEST_F(OrvexTest, StartPathsOf259CharactersAreTakenAnd260Or1000Refused) {
     const std::wstring whole259 = L"C:\\" + std::wstring(256, L'x');
     FiveArguments(whole259);
-    EXPECT_EQ(OrvexWith(platform), 1);
+    EXPECT_EQ(Orvex(platform), 1);
     EXPECT_EQ(std::string(g_szStartPath).size(), 259u);
     for (std::size_t n : {260u, 1000u}) {
         host.events.clear();
         platform.steps.clear();
         FiveArguments(L"C:\\" + std::wstring(n - 3, L'x'));
-        EXPECT_EQ(OrvexWith(platform), 0) << n;
+        EXPECT_EQ(Orvex(platform), 0) << n;
         EXPECT_TRUE(platform.steps.empty()) << n;
         EXPECT_NE(
             host.printed().find("start path is too long (" + std::to_string(n) + " characters; at most 259)"),
@@ -307,7 +307,7 @@ TEST_F(OrvexTest, StartPathsOf259CharactersAreTakenAnd260Or1000Refused) {
     platform.steps.clear();
     platform.currentFolder = "C:\\" + std::string(100, 'h') + "\\";
     FiveArguments(std::wstring(200, L'r') + L"\\");
-    EXPECT_EQ(OrvexWith(platform), 0);
+    EXPECT_EQ(Orvex(platform), 0);
     EXPECT_TRUE(platform.steps.empty());
     EXPECT_NE(host.printed().find("start path is too long (305 characters; at most 259)"), std::string::npos);
 }
@@ -367,7 +367,6 @@ TEST_P(HostLackingOneOperation, TheLibraryDegradesAndSaysItOnce) {
     platform.dialogResult = 1;
     platform.pickFolder = pickFolder;
     platform.pickName = "door.dwg";
-    SetPickerPlatform(&platform);
     void* appId = reinterpret_cast<void*>(std::uintptr_t{42});
 
 #if defined(__SANITIZE_ADDRESS__)
@@ -378,19 +377,18 @@ TEST_P(HostLackingOneOperation, TheLibraryDegradesAndSaysItOnce) {
         hostKeepsItsNodes = std::make_unique<__lsan::ScopedDisabler>();
 #endif
     EXPECT_NO_THROW({
-        EXPECT_EQ(DispatchEntryMessage(AcRx::kInitAppMsg, appId), AcRx::kRetOK);
-        EXPECT_EQ(DispatchEntryMessage(AcRx::kLoadDwgMsg, appId), AcRx::kRetOK);
+        EXPECT_EQ(DispatchEntryMessage(AcRx::kInitAppMsg, appId, platform), AcRx::kRetOK);
+        EXPECT_EQ(DispatchEntryMessage(AcRx::kLoadDwgMsg, appId, platform), AcRx::kRetOK);
         host.funCode = 0;
         host.AddShort(1);
         host.AddShort(2);
         host.AddString(L"");
         host.AddString(L"Insert");
         host.AddString(L"Close");
-        EXPECT_EQ(DispatchEntryMessage(AcRx::kInvkSubrMsg, appId), AcRx::kRetOK);
-        EXPECT_EQ(DispatchEntryMessage(AcRx::kUnloadDwgMsg, appId), AcRx::kRetOK);
-        EXPECT_EQ(DispatchEntryMessage(AcRx::kUnloadAppMsg, appId), AcRx::kRetOK);
+        EXPECT_EQ(DispatchEntryMessage(AcRx::kInvkSubrMsg, appId, platform), AcRx::kRetOK);
+        EXPECT_EQ(DispatchEntryMessage(AcRx::kUnloadDwgMsg, appId, platform), AcRx::kRetOK);
+        EXPECT_EQ(DispatchEntryMessage(AcRx::kUnloadAppMsg, appId, platform), AcRx::kRetOK);
     });
-    SetPickerPlatform(nullptr);
 
     const std::string said = std::string("the host does not provide ") + operation.name + ";";
     EXPECT_LE(CountContaining(host.events, said), 1) << "said once at most";

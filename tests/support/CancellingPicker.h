@@ -1,6 +1,5 @@
-// A picker platform that cancels at once and counts its runs, for tests that call the LISP function or
-// run the explorer's dialog themselves. Windows test programs also get it as the default platform: the
-// library's own one lives in Orvex1.arx beside the run dialog, which the tests do not link.
+// A picker platform that cancels at once and counts its runs, for tests that call the LISP function
+// through the entry point.
 #pragma once
 
 #include "host/Orvex.h"

@@ -1,6 +1,7 @@
 #include "GridTestSupport.h"
 
 #include "hostapi/HostApi.h"
+#include "tests/support/MessagePump.h"
 #include "tests/support/TempFolder.h"
 #include "thumbs/AppMessages.h"
 
@@ -143,13 +144,8 @@ bool TestFrame::OnCmdMsg(UINT id, int code) {
 }
 
 void Pump() {
-    MSG msg;
-    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
-        if (!AfxPreTranslateMessage(&msg)) {
-            ::TranslateMessage(&msg);
-            ::DispatchMessageA(&msg);
-        }
-    }
+    testsupport::PumpMessages(testsupport::Chars::Narrow,
+                              [](MSG* msg) { return AfxPreTranslateMessage(msg); });
 }
 
 namespace {

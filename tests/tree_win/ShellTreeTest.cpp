@@ -6,6 +6,7 @@
 #include "thumbs/DwgList.h"
 #include "tree/ShellTreeCtrl.h"
 #include "tree/StartShellPath.h"
+#include "tests/support/MessagePump.h"
 #include "tests/support/TempFolder.h"
 
 #include <windows.h>
@@ -23,14 +24,6 @@ using testsupport::TempFolder;
 using treetest::ShellTest;
 
 constexpr DWORD kTreeStyle = WS_CHILD | WS_VISIBLE | TVS_HASBUTTONS | TVS_HASLINES | TVS_LINESATROOT;
-
-void PumpPending() {
-    MSG msg;
-    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
-        ::TranslateMessage(&msg);
-        ::DispatchMessageA(&msg);
-    }
-}
 
 bool SameText(const std::string& a, const std::string& b) {
     return lstrcmpiA(a.c_str(), b.c_str()) == 0;
@@ -92,7 +85,7 @@ protected:
         ASSERT_TRUE(tree.Create(kTreeStyle, CRect(0, 0, 600, 700), &parent, id));
         tree.PopulateTree(nullptr, 0);
         tree.ExpandToLabelPath(StartShellPathOf(dir + "\\"));
-        PumpPending();
+        testsupport::PumpMessages();
     }
     // The folder model the tree shows its selections in, as the explorer's, and what it was told in order:
     // the folder shown, or "|label" for a node without a folder.
@@ -186,7 +179,7 @@ TEST_F(ShellTree, TheWalkCanLeaveItsTargetClosedForItToBeOpenedOnceQueuedMessage
 
     tree.OpenPathTargetLater();
     EXPECT_FALSE(tree.GetItemState(target, TVIS_EXPANDED) & TVIS_EXPANDED) << "opened only from the queue";
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_TRUE(tree.GetItemState(target, TVIS_EXPANDED) & TVIS_EXPANDED);
     EXPECT_NE(ChildNamed(tree, target, "b"), nullptr);
     EXPECT_NE(ChildNamed(tree, target, "side"), nullptr);
@@ -199,7 +192,7 @@ TEST_F(ShellTree, TheWalkCanLeaveItsTargetClosedForItToBeOpenedOnceQueuedMessage
     ASSERT_NE(other.m_hPathTarget, nullptr);
     other.OpenPathTargetLater();
     other.DeleteItem(other.GetParentItem(other.m_hPathTarget));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_TRUE(other.GetCount() > 0);
 }
 
@@ -317,11 +310,11 @@ TEST_F(ShellTree, IconsOnDemandAreAskedForOnceWhenFirstShown) {
     CountingTree tree;
     OpenAt(tree, b, CShellTreeCtrl::kCallbackImage | CShellTreeCtrl::kCallbackSelectedImage);
     tree.RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
-    PumpPending();
+    testsupport::PumpMessages();
     const int first = tree.imageRequests;
     EXPECT_GT(first, 0);
     tree.RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(tree.imageRequests, first) << "the control keeps the icons it was given";
     EXPECT_EQ(tree.textRequests, 0);
 }
@@ -338,7 +331,7 @@ TEST_F(ShellTree, SelectingAFolderScansItAndTheHighlightFollowsTheSelection) {
     ASSERT_NE(bNode, nullptr);
 
     ASSERT_TRUE(tree.SelectItem(bNode));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_TRUE(SameText(doc.m_strPath, b)) << doc.m_strPath;
     EXPECT_TRUE(SameText(doc.m_strShellPath, tree.GetLabelPath(bNode)));
     EXPECT_EQ(DwgList.GetSize(), 2);
@@ -351,14 +344,14 @@ TEST_F(ShellTree, SelectingAFolderScansItAndTheHighlightFollowsTheSelection) {
     // The highlight never stays on a folder that is no longer the selected one.
     HTREEITEM aNode = tree.GetParentItem(bNode);
     ASSERT_TRUE(tree.SelectItem(aNode));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_TRUE(tree.GetDropHilightItem() == aNode || tree.GetDropHilightItem() == nullptr);
     EXPECT_EQ(DwgList.GetSize(), 0);
     EXPECT_TRUE(SameText(doc.m_strPath, a));
 
     // The Desktop has no folder: the grid empties and the current folder stays.
     ASSERT_TRUE(tree.SelectItem(tree.GetRootItem()));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(DwgList.GetSize(), 0);
     EXPECT_TRUE(SameText(doc.m_strPath, a));
     EXPECT_EQ(doc.m_strShellPath, ShellDesktopLabel());
@@ -378,14 +371,14 @@ TEST_F(ShellTree, ASelectionMadeWhileTheTreeDoesNotFollowScansNothing) {
     BeginScan(); // what an earlier test left in the list
     tree.FollowSelection(false);
     ASSERT_TRUE(tree.SelectItem(tree.m_hPathTarget));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(drawings.events.size(), 0u);
     EXPECT_EQ(doc.m_strPath, "C:\\before");
     EXPECT_EQ(DwgList.GetSize(), 0);
 
     tree.FollowSelection(true);
     ASSERT_TRUE(tree.SelectItem(tree.GetParentItem(tree.m_hPathTarget)));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(drawings.events.size(), 1u);
     EXPECT_TRUE(SameText(doc.m_strPath, a)) << doc.m_strPath;
 }
@@ -397,7 +390,7 @@ TEST_F(ShellTree, RefreshingRescansTheSelectedFolder) {
     Shown drawings(doc, tree);
     OpenAt(tree, b);
     ASSERT_TRUE(tree.SelectItem(tree.m_hPathTarget));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(DwgList.GetSize(), 2);
     testsupport::WriteBytes(b + "\\three.dwg", "AC1018");
     tree.RefreshCurrentFolder();
@@ -425,7 +418,7 @@ TEST_F(ShellTree, TheWalkToTheStartFolderSelectsItWithoutScanningWhatTheGridShow
     parent.SetFocus();
     EXPECT_EQ(tree.GetSelectedItem(), nullptr) << "nothing happens before the queued messages";
     EXPECT_EQ(tree.m_hPathTarget, nullptr);
-    PumpPending();
+    testsupport::PumpMessages();
 
     HTREEITEM target = tree.m_hPathTarget;
     ASSERT_NE(target, nullptr);
@@ -444,7 +437,7 @@ TEST_F(ShellTree, TheWalkToTheStartFolderSelectsItWithoutScanningWhatTheGridShow
 
     // From then on a selection is followed.
     ASSERT_TRUE(tree.SelectItem(tree.GetParentItem(target)));
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(seen.shown, 1);
     EXPECT_TRUE(SameText(doc.m_strPath, a)) << doc.m_strPath;
 }
@@ -461,7 +454,7 @@ TEST_F(ShellTree, AWalkToAnotherFolderThanTheGridShowsScansTheFolderReached) {
     doc.m_strShellPath = StartShellPathOf(b + "\\");
     tree.SetDocument(&doc);
     WalkAsTheExplorerDoes(tree, false);
-    PumpPending();
+    testsupport::PumpMessages();
     ASSERT_NE(tree.m_hPathTarget, nullptr);
     EXPECT_EQ(tree.GetSelectedItem(), tree.m_hPathTarget);
     ASSERT_EQ(shown.size(), 1u);
@@ -483,7 +476,7 @@ TEST_F(ShellTree, AWalkThatDoesNotGetThereSelectsNothingAndSaysSo) {
     Watch(tree, drawings, seen);
     WalkAsTheExplorerDoes(tree, true);
     tree.SetFocus(); // as the explorer gives it: the control may select its first item on its own
-    PumpPending();
+    testsupport::PumpMessages();
     EXPECT_EQ(tree.m_hPathTarget, nullptr);
     EXPECT_EQ(tree.GetSelectedItem(), nullptr);
     EXPECT_EQ(seen.ended, std::vector<bool>{false});

@@ -1,4 +1,5 @@
 #include "tree/WaitingTreeCtrl.h"
+#include "tests/support/MessagePump.h"
 #include "resource.h"
 
 #include <winternl.h>
@@ -14,18 +15,11 @@ namespace {
 
 CWinApp theApp("WaitingTreeTests");
 
-void PumpPending() {
-    MSG msg;
-    while (::PeekMessageA(&msg, nullptr, 0, 0, PM_REMOVE)) {
-        ::TranslateMessage(&msg);
-        ::DispatchMessageA(&msg);
-    }
-}
-
 class ParentWnd : public CWnd {
 public:
     bool CreateShown() {
-        return CreateEx(0, nullptr, "waiting tree", WS_POPUP | WS_VISIBLE, CRect(20, 20, 420, 420), nullptr, 0);
+        return CreateEx(0, nullptr, "waiting tree", WS_POPUP | WS_VISIBLE, CRect(20, 20, 420, 420), nullptr,
+                        0);
     }
 };
 
@@ -168,7 +162,7 @@ struct Resources {
     static Resources SettledTo(const Resources& before) {
         Resources now = Now();
         for (int round = 0; round < 100 && !now.NoMoreThan(before); ++round) {
-            PumpPending();
+            testsupport::PumpMessages();
             ::Sleep(50);
             now = Now();
         }
@@ -186,7 +180,7 @@ protected:
         tree.SetImageList(images, TVSIL_NORMAL);
         tree.SetAnimationPeriod(125);
         node = tree.InsertItem("folder", 0, 0, TVI_ROOT, TVI_LAST, 0, 1);
-        PumpPending();
+        testsupport::PumpMessages();
     }
     void TearDown() override {
         tree.DestroyWindow();
@@ -303,7 +297,7 @@ std::vector<std::string>& Reports() {
 TEST_F(WaitingTree, AFillingThatThrowsIsReportedAndReleasesEverything) {
     tree.childrenToAdd = 4;
     tree.Expand(node, TVE_EXPAND); // the timer's own thread exists before counting
-    PumpPending();
+    testsupport::PumpMessages();
     tree.throwHalfWay = true;
     // The first exception the process throws costs the runtime a couple of handles once: not counted.
     EXPECT_THROW(tree.RefreshSubtree(node), std::runtime_error);
@@ -319,7 +313,7 @@ TEST_F(WaitingTree, AFillingThatThrowsIsReportedAndReleasesEverything) {
     AfxSetErrorReporter(previous);
     EXPECT_EQ(Reports().size(), 1u);
     tree.DeleteItem(other);
-    PumpPending();
+    testsupport::PumpMessages();
 
     const Resources after = Resources::SettledTo(before);
     EXPECT_EQ(after.gdi, before.gdi);
@@ -339,11 +333,11 @@ TEST_F(WaitingTree, AThousandFillingsLeaveNoHandleNorGdiObjectBehind) {
     tree.childrenToAdd = 5;
     tree.Expand(node, TVE_EXPAND);
     tree.RefreshSubtree(node);
-    PumpPending();
+    testsupport::PumpMessages();
     const Resources before = Resources::Now();
     for (int i = 0; i < 1000; ++i)
         tree.RefreshSubtree(node);
-    PumpPending();
+    testsupport::PumpMessages();
     const Resources after = Resources::SettledTo(before);
     EXPECT_EQ(tree.populations, 1002);
     EXPECT_EQ(Children().size(), 5u);
