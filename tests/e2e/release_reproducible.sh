@@ -20,7 +20,7 @@ rm -rf "$RELEASE_TEST_DIR"
 mkdir -p "$RELEASE_TEST_DIR"
 zip_name=Orvex1-$ORVEX_VERSION-win64.zip
 
-for clone in first "second clone"; do
+for clone in first second; do
   dir="$RELEASE_TEST_DIR/$clone"
   git clone -q --no-checkout "$ROOT" "$dir" && git -C "$dir" checkout -q --detach "$commit" || {
     echo "FAILED: cloning $ROOT"; exit 1; }
@@ -36,7 +36,7 @@ for clone in first "second clone"; do
 done
 
 a="$RELEASE_TEST_DIR/first/dist/$zip_name"
-b="$RELEASE_TEST_DIR/second clone/dist/$zip_name"
+b="$RELEASE_TEST_DIR/second/dist/$zip_name"
 if cmp -s "$a" "$b"; then pass "the two zips are the same bytes"; else
   fail "the two zips are the same bytes"
   for z in "$a" "$b"; do (cd "$(dirname "$z")" && unzip -o -q "$zip_name" -d x && sha256sum x/*); done
@@ -76,7 +76,7 @@ fi
 
 cp "$a" "$RELEASE_TEST_DIR/release.zip"
 # The clones' build trees are large; the zip is all the next test needs.
-rm -rf "$RELEASE_TEST_DIR/first" "$RELEASE_TEST_DIR/second clone" "$RELEASE_TEST_DIR/unpacked"
+rm -rf "$RELEASE_TEST_DIR/first" "$RELEASE_TEST_DIR/second" "$RELEASE_TEST_DIR/unpacked"
 
 echo "$((checks - failures)) passed, $failures failed"
 [ "$failures" -eq 0 ]
