@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # ./release.sh on the commit checked out here, in two fresh clones in two different folders: the two zips
 # must be the same bytes, with no time in the library's header or the zip's entries. The first clone's zip
-# is kept as $RELEASE_TEST_DIR/release.zip for release_zip.sh, which tests it as it ships.
+# is kept as $RELEASE_TEST_DIR/release.zip, its commit in release.commit, for release_zip.sh, which tests it as it ships.
 #
 # The clones take the commit, not uncommitted changes: what ships is what is committed.
 set -uo pipefail
@@ -75,6 +75,7 @@ else
 fi
 
 cp "$a" "$RELEASE_TEST_DIR/release.zip"
+echo "$commit" >"$RELEASE_TEST_DIR/release.commit"
 # The clones' build trees are large; the zip is all the next test needs.
 rm -rf "$RELEASE_TEST_DIR/first" "$RELEASE_TEST_DIR/second" "$RELEASE_TEST_DIR/unpacked"
 

@@ -8,7 +8,8 @@
 : "${RELEASE_ZIP:?the zip release_reproducible.sh kept}"
 : "${ORVEX_VERSION:?}" "${ORVEX_COPYRIGHT:?}" "${VERSION_PROBE:?}"
 
-nl=$'\n'
+# The commit the zip was made of (the checkout may have moved on since).
+commit=$(cat "$(dirname "$RELEASE_ZIP")/release.commit") || { echo "FAILED: no release.commit beside the zip"; exit 1; }
 
 # ---- unpacked where a CAD manager might put it --------------------------------------------------------
 dir="$WORK/CAD tools"
@@ -25,7 +26,7 @@ expect_true "no file of the build, the tests or devhost" \
 expect_true "README.txt names the version" grep -q "^Orvex1 $ORVEX_VERSION - " "$dir/README.txt"
 expect_true "the licence carries the copyright line" grep -qF "$ORVEX_COPYRIGHT" "$dir/LICENSE.txt"
 expect_true "CHANGELOG.md is the repository's" \
-  bash -c "tr -d '\r' <\"$dir/CHANGELOG.md\" | cmp -s - \"$ROOT/CHANGELOG.md\""
+  bash -c "tr -d '\r' <\"$dir/CHANGELOG.md\" | cmp -s - <(git -C \"$ROOT\" show $commit:CHANGELOG.md)"
 ARX="$dir/Orvex1.arx"
 
 # ---- the version resource, read as the system's file properties read it --------------------------------
@@ -73,9 +74,8 @@ devhost --verbose --script "$(winpath "$WORK/about.txt")" \
   --eval "(Orvex 1 2 \"$(lisppath "$drawings")\\\\\" \"Insert\" \"Close\")"
 expect_line "the library is loaded from the folder" "[host] loaded $win_dir\\Orvex1.arx"
 expect_line "the about box's first line" "[script] text Orvex1"
-commit=$(git -C "$ROOT" rev-parse --short=12 HEAD)
 expect_line "the about box's second line: the version and the commit" \
-  "[script] text Version $ORVEX_VERSION (commit $commit)"
+  "[script] text Version $ORVEX_VERSION (commit ${commit:0:12})"
 expect_line "a pick on the sample drawings" "=> (\"$(lisppath "$drawings")\\\\$lower_pick\" (\"\" \"\" \"\"))"
 expect_line "the library is unloaded" "[host] unloading $win_dir\\Orvex1.arx"
 expect_true "devhost ends well" test "$RC" -eq 0
