@@ -15,6 +15,7 @@ namespace devhost {
 namespace {
 
 constexpr int kMaxListDepth = 64;
+constexpr int kMaxProgramDepth = 256; // a program's own nesting: a defun with its conditions and calls
 
 bool IsSpace(wchar_t c) {
     return c == L' ' || c == L'\t' || c == L'\r' || c == L'\n' || c == L'\f' || c == L'\v';
@@ -115,9 +116,103 @@ public:
         return true;
     }
 
+    bool ReadProgram(std::vector<LispForm>& forms) {
+        forms.clear();
+        for (;;) {
+            SkipSpace();
+            if (AtEnd())
+                return true;
+            if (Peek() == L')')
+                return FailAtLine(L"unexpected )");
+            LispForm form;
+            if (!ReadForm(form, 0))
+                return false;
+            forms.push_back(std::move(form));
+        }
+    }
+
     const std::wstring& Error() const { return m_error; }
 
 private:
+    int LineAt(std::size_t pos) const {
+        int line = 1;
+        for (std::size_t i = 0; i < pos && i < m_text.size(); ++i)
+            if (m_text[i] == L'\n')
+                ++line;
+        return line;
+    }
+
+    bool FailAtLine(std::wstring message) { return FailAtLine(m_pos, std::move(message)); }
+
+    bool FailAtLine(std::size_t pos, std::wstring message) {
+        return Fail(L"line " + std::to_wstring(LineAt(pos)) + L": " + message);
+    }
+
+    // One form of a program; the position is on its first character.
+    bool ReadForm(LispForm& form, int depth) {
+        if (depth > kMaxProgramDepth)
+            return FailAtLine(L"lists nested too deeply");
+        const std::size_t start = m_pos;
+        form.line = LineAt(start);
+        const wchar_t c = Peek();
+        if (c == L'"') {
+            LispValue value;
+            if (!ReadString(value))
+                return FailAtLine(start, m_error);
+            form.kind = LispForm::Kind::String;
+            form.text = std::move(value.text);
+            return true;
+        }
+        if (c == L'\'') {
+            ++m_pos;
+            SkipSpace();
+            if (AtEnd() || Peek() == L')')
+                return FailAtLine(start, L"nothing quoted after '");
+            form.kind = LispForm::Kind::Quote;
+            form.items.resize(1);
+            return ReadForm(form.items[0], depth + 1);
+        }
+        if (c == L'(') {
+            ++m_pos;
+            form.kind = LispForm::Kind::List;
+            for (;;) {
+                SkipSpace();
+                if (AtEnd())
+                    return FailAtLine(start, L"missing ) for the list that begins here");
+                if (Peek() == L')') {
+                    ++m_pos;
+                    return true;
+                }
+                LispForm item;
+                if (!ReadForm(item, depth + 1))
+                    return false;
+                form.items.push_back(std::move(item));
+            }
+        }
+        const std::wstring_view token = ReadToken();
+        if (token.empty())
+            return FailAtLine(start, L"unexpected character: " + Excerpt(m_text.substr(m_pos, 1)));
+        if (IsIntegerToken(token)) {
+            std::string narrow(token.begin(), token.end());
+            errno = 0;
+            const long long number = std::strtoll(narrow.c_str(), nullptr, 10);
+            if (errno == ERANGE)
+                return FailAtLine(start, L"integer out of range: " + Excerpt(token));
+            form.kind = LispForm::Kind::Integer;
+            form.integer = number;
+            return true;
+        }
+        if (IsRealToken(token)) {
+            std::string narrow(token.begin(), token.end());
+            form.kind = LispForm::Kind::Real;
+            form.real = std::strtod(narrow.c_str(), nullptr);
+            return true;
+        }
+        form.kind = LispForm::Kind::Symbol;
+        form.text.assign(token.begin(), token.end());
+        return true;
+    }
+
     bool AtEnd() const { return m_pos >= m_text.size(); }
     wchar_t Peek() const { return m_text[m_pos]; }
 
@@ -130,6 +225,10 @@ private:
         while (!AtEnd()) {
             if (IsSpace(Peek())) {
                 ++m_pos;
+            } else if (Peek() == L';' && m_pos + 1 < m_text.size() && m_text[m_pos + 1] == L'|') {
+                // a block comment ;| ... |; (one left open runs to the end of the text)
+                const std::size_t end = m_text.find(L"|;", m_pos + 2);
+                m_pos = end == std::wstring_view::npos ? m_text.size() : end + 2;
             } else if (Peek() == L';') { // comment to the end of the line
                 while (!AtEnd() && Peek() != L'\n')
                     ++m_pos;
@@ -406,6 +505,59 @@ bool ReadLispCall(std::wstring_view text, LispCall& call, std::wstring& error) {
         error = reader.Error();
     } catch (const std::bad_alloc&) {
         error = L"out of memory";
+    }
+    return false;
+}
+
+bool ReadLispProgram(std::wstring_view text, std::vector<LispForm>& forms, std::wstring& error) {
+    Reader reader(text);
+    try {
+        if (reader.ReadProgram(forms))
+            return true;
+        error = reader.Error();
+    } catch (const std::bad_alloc&) {
+        error = L"out of memory";
+    }
+    forms.clear();
+    return false;
+}
+
+std::wstring PrintLispForm(const LispForm& form) {
+    switch (form.kind) {
+    case LispForm::Kind::Symbol:
+        return form.text;
+    case LispForm::Kind::Integer:
+        return std::to_wstring(form.integer);
+    case LispForm::Kind::Real:
+        return PrintLispReal(form.real);
+    case LispForm::Kind::String:
+        return PrintLispString(form.text);
+    case LispForm::Kind::Quote:
+        return L"'" + (form.items.empty() ? std::wstring(L"nil") : PrintLispForm(form.items[0]));
+    case LispForm::Kind::List: {
+        std::wstring out = L"(";
+        for (std::size_t i = 0; i < form.items.size(); ++i) {
+            if (i > 0)
+                out += L' ';
+            out += PrintLispForm(form.items[i]);
+        }
+        return out + L")";
+    }
+    }
+    return std::wstring();
+}
+
+bool IsLispConstant(const LispForm& form) {
+    switch (form.kind) {
+    case LispForm::Kind::Integer:
+    case LispForm::Kind::Real:
+    case LispForm::Kind::String:
+    case LispForm::Kind::Quote:
+        return true;
+    case LispForm::Kind::Symbol:
+        return EqualsIgnoreCase(form.text, L"nil") || EqualsIgnoreCase(form.text, L"T");
+    case LispForm::Kind::List:
+        return form.items.empty();
     }
     return false;
 }

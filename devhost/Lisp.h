@@ -35,6 +35,32 @@ struct LispCall {
 // Returns false with a one-line message in `error` for anything else; never throws for bad text.
 bool ReadLispCall(std::wstring_view text, LispCall& call, std::wstring& error);
 
+// One form of a LISP program file as read, nothing evaluated: what `load` would read before it runs it.
+struct LispForm {
+    enum class Kind { Symbol, Integer, Real, String, List, Quote };
+    Kind kind = Kind::Symbol;
+    std::wstring text;           // Symbol (as written), String
+    long long integer = 0;       // Integer
+    double real = 0.0;           // Real
+    std::vector<LispForm> items; // List; Quote: the one quoted form
+    int line = 0;                // where the form begins, from 1
+};
+
+// Reads a whole program file: every top-level form, with comments (; to the end of the line, and
+// ;| ... |; blocks), strings with the escapes of ReadLispCall, integers of any size, reals, quotes and
+// dotted pairs (the dot reads as a symbol). Returns false with "line N: message" in `error` for text that
+// is not a sequence of whole forms (an unclosed list or string, a stray parenthesis); never throws for bad
+// text.
+bool ReadLispProgram(std::wstring_view text, std::vector<LispForm>& forms, std::wstring& error);
+
+// A form printed back in a form ReadLispProgram reads as the same form: symbols as written, strings with
+// their escapes, 'X for a quote.
+std::wstring PrintLispForm(const LispForm& form);
+
+// True when the form is a constant: a number, a string, nil, T or a quoted form (what a call can pass
+// without evaluating anything).
+bool IsLispConstant(const LispForm& form);
+
 // The argument chain of a call, allocated with malloc like every host chain (free with FreeChain).
 resbuf* BuildArgumentChain(const std::vector<LispValue>& args);
 

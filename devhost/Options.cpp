@@ -7,7 +7,8 @@ namespace devhost {
 const wchar_t* const kUsage =
     L"usage: devhost.exe [--arx PATH] [--order entry-first|module-first] [--drawings N]\n"
     L"                   [--layer NAME=ACI]... [--alert-box] [--after-ms MS --post accept|cancel]\n"
-    L"                   [--eval EXPR]... [--script FILE] [--verbose] [--timing] [--timing-sent]\n"
+    L"                   [--load FILE]... [--eval EXPR]... [--script FILE] [--verbose] [--timing] "
+    L"[--timing-sent]\n"
     L"                   [--preview real|flat]\n"
     L"                   [--check-heaps] [--refuse-window CLASS-PREFIX]\n";
 
@@ -104,6 +105,10 @@ bool ParseOptions(const std::vector<std::wstring>& args, Options& options, std::
                 error = L"--post takes accept or cancel, not " + text;
                 return false;
             }
+        } else if (option == L"--load") {
+            if (!value(text))
+                return false;
+            options.loads.push_back(text);
         } else if (option == L"--eval") {
             if (!value(text))
                 return false;

@@ -23,6 +23,7 @@ struct Options {
     int afterMs = -1; // -1: nothing is posted
     Post post = Post::None;
     std::vector<std::wstring> evals;
+    std::vector<std::wstring> loads; // LISP program files read (not run) before the calls
     std::wstring script;
     bool verbose = false;
     bool timing = false;     // [timing] lines: when previews are drawn and keys are taken, in ms

@@ -16,6 +16,7 @@
 #include <windows.h>
 
 #include <cwchar>
+#include <map>
 #include <memory>
 #include <set>
 #include <vector>
@@ -121,6 +122,7 @@ private:
     void Evaluate(const std::wstring& expression);
     void EvaluateDuringACall(const std::wstring& expression);
     void StartScript();
+    void LoadPrograms();
     void Send(AcRx::AppMsgCode message);
 
     const Options& m_options;
@@ -134,23 +136,34 @@ private:
     int m_exitCode = kExitOk;
 };
 
-bool Session::LoadScript() {
-    if (m_options.script.empty())
-        return true;
-    HANDLE file = CreateFileW(m_options.script.c_str(), GENERIC_READ, FILE_SHARE_READ, nullptr, OPEN_EXISTING,
+// The bytes of a file of the user's (a script, a LISP program), up to 16 MiB; false with the system's
+// message.
+bool ReadFileBytes(const std::wstring& path, std::string& bytes, std::wstring& error) {
+    HANDLE file = CreateFileW(path.c_str(), GENERIC_READ, FILE_SHARE_READ, nullptr, OPEN_EXISTING,
                               FILE_ATTRIBUTE_NORMAL, nullptr);
     if (file == INVALID_HANDLE_VALUE) {
-        WriteError(L"cannot read the script " + m_options.script + L": " + SystemMessage(GetLastError()));
+        error = SystemMessage(GetLastError());
         return false;
     }
-    std::string bytes;
+    bytes.clear();
     char buffer[4096];
     DWORD read = 0;
     while (ReadFile(file, buffer, sizeof buffer, &read, nullptr) && read > 0 && bytes.size() < (1u << 24))
         bytes.append(buffer, read);
     CloseHandle(file);
-    std::vector<ScriptCommand> commands;
+    return true;
+}
+
+bool Session::LoadScript() {
+    if (m_options.script.empty())
+        return true;
+    std::string bytes;
     std::wstring error;
+    if (!ReadFileBytes(m_options.script, bytes, error)) {
+        WriteError(L"cannot read the script " + m_options.script + L": " + error);
+        return false;
+    }
+    std::vector<ScriptCommand> commands;
     if (!ReadScript(FromUtf8(bytes), commands, error)) {
         WriteError(L"script " + m_options.script + L", " + error);
         return false;
@@ -299,6 +312,47 @@ void Session::CloseDocuments() {
     testsupport::PumpMessages(testsupport::Chars::Wide);
 }
 
+// Every call in the forms of a function the library defined: with constant arguments it is printed as a
+// call --eval can make; with arguments computed when the program runs, it is said so.
+void ReportLibraryCalls(const std::vector<LispForm>& forms, const std::map<std::wstring, int>& functions) {
+    for (const LispForm& form : forms) {
+        if (form.kind != LispForm::Kind::List)
+            continue; // a quoted form is data, not a call
+        if (!form.items.empty() && form.items[0].kind == LispForm::Kind::Symbol &&
+            functions.count(LowerCase(form.items[0].text))) {
+            bool constant = true;
+            for (std::size_t i = 1; i < form.items.size(); ++i)
+                constant = constant && IsLispConstant(form.items[i]);
+            WriteLine(std::wstring(constant ? L"[load] call " : L"[load] call with computed arguments ") +
+                      PrintLispForm(form) + L" (line " + std::to_wstring(form.line) + L")");
+        }
+        ReportLibraryCalls(form.items, functions);
+    }
+}
+
+void Session::LoadPrograms() {
+    for (const std::wstring& path : m_options.loads) {
+        std::string bytes;
+        std::wstring error;
+        std::vector<LispForm> forms;
+        if (!ReadFileBytes(path, bytes, error)) {
+            WriteLine(L"; error: cannot read " + path + L": " + error);
+        } else if (!ReadLispProgram(FromUtf8(bytes), forms, error)) {
+            WriteLine(L"; error: " + path + L": " + error);
+        } else {
+            WriteLine(L"[load] " + path + L": " + std::to_wstring(forms.size()) + L" forms");
+            for (const LispForm& form : forms)
+                if (form.kind == LispForm::Kind::List && form.items.size() >= 3 &&
+                    form.items[0].kind == LispForm::Kind::Symbol &&
+                    LowerCase(form.items[0].text) == L"defun" && form.items[1].kind == LispForm::Kind::Symbol)
+                    WriteLine(L"[load] defun " + form.items[1].text);
+            ReportLibraryCalls(forms, Host().docManager.curDocument()->Functions());
+            continue;
+        }
+        m_exitCode = m_exitCode == kExitOk ? kExitLispError : m_exitCode;
+    }
+}
+
 void Session::StartScript() {
     if (m_script && !m_script->Started() && !m_script->Start()) {
         WriteLine(L"[script] error: cannot start the script thread");
@@ -437,6 +491,7 @@ int Session::Run() {
         CreateModule();
     }
     OpenDocuments();
+    LoadPrograms();
 
     SetCallsPending(static_cast<int>(m_options.evals.size()));
     for (const std::wstring& expression : m_options.evals)

@@ -12,6 +12,7 @@
 #define IDR_TOOLBAR2 204  // bottom toolbar: accept and cancel
 #define IDR_THUMB_MENU 208 // context menu of a thumbnail
 #define IDC_ABOUT_TEXT 1000
+#define IDC_ABOUT_VERSION 1002 // the about box's version and commit line
 // Folder settings dialog (IDD_SETLA)
 #define IDC_SETLA_COLOR 200        // the colour swatch
 #define IDC_SETLA_COMMAND 201      // the LISP command edit

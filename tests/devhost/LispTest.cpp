@@ -229,4 +229,85 @@ TEST(LispPrinter, StringsAreEscapedBack) {
     EXPECT_EQ(call.args[0].text, original);
 }
 
+// ---- whole program files ---------------------------------------------------------------------------
+
+std::vector<devhost::LispForm> ReadProgram(const std::wstring& text) {
+    std::vector<devhost::LispForm> forms;
+    std::wstring error;
+    EXPECT_TRUE(devhost::ReadLispProgram(text, forms, error)) << std::string(error.begin(), error.end());
+    return forms;
+}
+
+std::wstring ProgramError(const std::wstring& text) {
+    std::vector<devhost::LispForm> forms;
+    std::wstring error;
+    EXPECT_FALSE(devhost::ReadLispProgram(text, forms, error));
+    EXPECT_TRUE(forms.empty());
+    return error;
+}
+
+TEST(LispProgram, ReadsADefunWithItsCommentsLeftOut) {
+    const auto forms = ReadProgram(L";; a command\n"
+                                   L"(defun c:pick (/ pick) ; locals\n"
+                                   L"  ;| a block\n comment |;\n"
+                                   L"  (setq pick (Orvex 1 2 \"C:\\\\Drawings\\\\\" \"Insert\" \"Close\"))\n"
+                                   L"  (if (member pick '(\"a\" \"b\")) (princ 1.5) (princ -7))\n"
+                                   L"  (princ))\n"
+                                   L"(princ)\n");
+    ASSERT_EQ(forms.size(), 2u);
+    const devhost::LispForm& defun = forms[0];
+    ASSERT_EQ(defun.kind, devhost::LispForm::Kind::List);
+    EXPECT_EQ(defun.line, 2);
+    ASSERT_EQ(defun.items.size(), 6u);
+    EXPECT_EQ(defun.items[0].text, L"defun");
+    EXPECT_EQ(defun.items[1].text, L"c:pick");
+    const devhost::LispForm& setq = defun.items[3];
+    EXPECT_EQ(setq.line, 5);
+    const devhost::LispForm& call = setq.items[2];
+    EXPECT_EQ(devhost::PrintLispForm(call), L"(Orvex 1 2 \"C:\\\\Drawings\\\\\" \"Insert\" \"Close\")");
+    EXPECT_EQ(call.items[3].text, L"C:\\Drawings\\");
+    EXPECT_EQ(devhost::PrintLispForm(defun.items[4]),
+              L"(if (member pick '(\"a\" \"b\")) (princ 1.5) (princ -7))");
+    EXPECT_EQ(devhost::PrintLispForm(forms[1]), L"(princ)");
+}
+
+TEST(LispProgram, PrintedFormsReadBackAsTheSameText) {
+    const std::wstring text = L"(a 'b '(c . d) \"e\\n\\\"f\" 123456789012 -0.25 nil T ())";
+    const auto forms = ReadProgram(text);
+    ASSERT_EQ(forms.size(), 1u);
+    const std::wstring printed = devhost::PrintLispForm(forms[0]);
+    EXPECT_EQ(printed, text);
+    const auto again = ReadProgram(printed);
+    ASSERT_EQ(again.size(), 1u);
+    EXPECT_EQ(devhost::PrintLispForm(again[0]), printed);
+}
+
+TEST(LispProgram, ConstantsAreWhatACallPassesAsItIs) {
+    const auto forms = ReadProgram(L"(f 1 2.5 \"s\" nil T '(x) 'y () x (g))");
+    ASSERT_EQ(forms.size(), 1u);
+    const auto& items = forms[0].items;
+    for (std::size_t i = 1; i <= 8; ++i)
+        EXPECT_TRUE(devhost::IsLispConstant(items[i])) << i;
+    EXPECT_FALSE(devhost::IsLispConstant(items[9])) << "a symbol is a variable";
+    EXPECT_FALSE(devhost::IsLispConstant(items[10])) << "a call is evaluated";
+}
+
+TEST(LispProgram, BrokenProgramsSayWhereOnWhichLine) {
+    EXPECT_EQ(ProgramError(L"(defun c:x ()\n  (princ \"a\")\n"),
+              L"line 1: missing ) for the list that begins here");
+    EXPECT_EQ(ProgramError(L"(a)\n(b))\n"), L"line 2: unexpected )");
+    EXPECT_EQ(ProgramError(L"(a\n \"open)\n"), L"line 2: unterminated string: \"open)\\n");
+    EXPECT_EQ(ProgramError(L"(a \"\\q\")"),
+              L"line 1: unknown escape \\q in a string (write a backslash as \\\\)");
+    EXPECT_EQ(ProgramError(L"(a ')"), L"line 1: nothing quoted after '");
+    EXPECT_EQ(ProgramError(L"(a 99999999999999999999)"),
+              L"line 1: integer out of range: 99999999999999999999");
+    EXPECT_EQ(ProgramError(std::wstring(300, L'(')), L"line 1: lists nested too deeply");
+}
+
+TEST(LispProgram, AnEmptyFileHoldsNoForms) {
+    EXPECT_TRUE(ReadProgram(L"").empty());
+    EXPECT_TRUE(ReadProgram(L"  ; only a comment\n;| and a block |;").empty());
+}
+
 } // namespace

@@ -17,6 +17,8 @@
 
 #include "res/resource.h"
 
+#include "OrvexVersion.h"
+
 #include <gtest/gtest.h>
 
 #include <cstdio>
@@ -813,6 +815,7 @@ TEST_F(ExplorerFrame, GridCommandsAreForwardedToTheGrid) {
 TEST_F(ExplorerFrame, AboutBoxShowsItsTitleAndText) {
     RunDialog dialog;
     std::string text;
+    std::string versionLine;
     bool found = false;
     dialog.steps.push_back(
         [](CMainFrame& frame) { frame.PostMessage(WM_COMMAND, MAKEWPARAM(ID_APP_ABOUT, 0), 0); });
@@ -825,6 +828,9 @@ TEST_F(ExplorerFrame, AboutBoxShowsItsTitleAndText) {
         char buffer[64] = "";
         ::GetDlgItemTextA(about, IDC_ABOUT_TEXT, buffer, sizeof buffer);
         text = buffer;
+        char line[128] = "";
+        ::GetDlgItemTextA(about, IDC_ABOUT_VERSION, line, sizeof line);
+        versionLine = line;
         ::PostMessageA(about, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED), 0);
     });
     dialog.steps.push_back([](CMainFrame& frame) {
@@ -834,6 +840,16 @@ TEST_F(ExplorerFrame, AboutBoxShowsItsTitleAndText) {
     EXPECT_EQ(Run(dialog), 2) << "Exit closes the frame, which cancels";
     EXPECT_TRUE(found);
     EXPECT_EQ(text, "Orvex1");
+    // The second line names the build: the project's version and the commit (12 hex digits, or "unknown"
+    // for a build outside a repository).
+    const std::string prefix = "Version " ORVEX_VERSION_TEXT " (commit ";
+    ASSERT_EQ(versionLine.compare(0, prefix.size(), prefix), 0) << versionLine;
+    ASSERT_EQ(versionLine.back(), ')') << versionLine;
+    const std::string commit = versionLine.substr(prefix.size(), versionLine.size() - prefix.size() - 1);
+    if (commit != "unknown") {
+        EXPECT_EQ(commit.size(), 12u) << versionLine;
+        EXPECT_EQ(commit.find_first_not_of("0123456789abcdef"), std::string::npos) << versionLine;
+    }
 }
 
 TEST_F(ExplorerFrame, CancelButtonOfTheBottomToolbarCancelsByMouse) {

@@ -165,3 +165,8 @@ TEST(Resources, RunDialogAndAboutBox) {
     EXPECT_NE(::FindResourceA(AfxGetResourceHandle(), MAKEINTRESOURCEA(IDD_ABOUTBOX), MAKEINTRESOURCEA(5)),
               nullptr);
 }
+
+TEST(Resources, VersionResource) {
+    // Its fields are read from the shipped library by the release test; here: it is there at all.
+    EXPECT_NE(::FindResourceA(AfxGetResourceHandle(), MAKEINTRESOURCEA(1), MAKEINTRESOURCEA(16)), nullptr);
+}
