@@ -15,22 +15,24 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     auto* block = static_cast<unsigned char*>(std::malloc(size ? size : 1));
     if (size)
         std::memcpy(block, data, size);
-    const DropList list = ReadDropList(block, size, &AsciiOnly);
-    const auto& names = list.names;
+    const DropList read = ReadDropList(block, size, &AsciiOnly);
+    const auto& names = read.names;
     if (ReadDropBlock(block, size) != names)
         std::abort();
-    std::size_t total = 0;
+    std::size_t total = 0;    // the names as the explorer's double-NUL list holds them
+    std::size_t consumed = 0; // the bytes of the block they came from
     for (const auto& name : names) {
         if (name.empty() || name.find('\0') != std::string::npos)
             std::abort();
-        total += (name.size() + 1) * (list.wide ? 2 : 1);
+        total += name.size() + 1;
+        consumed += (name.size() + 1) * (read.wide ? 2 : 1);
     }
-    for (const auto& name : list.unheld) {
-        if (!list.wide || name.empty() || name.find(u'\0') != std::u16string::npos)
+    for (const auto& name : read.unheld) {
+        if (!read.wide || name.empty() || name.find(u'\0') != std::u16string::npos)
             std::abort();
-        total += (name.size() + 1) * 2;
+        consumed += (name.size() + 1) * 2;
     }
-    if (total > size)
+    if (consumed > size)
         std::abort();
     std::free(block);
     const auto rebuilt = BuildDropBlock(names);
