@@ -81,11 +81,19 @@ FramePlacement PlaceFrameOnDesktop(const RECT& dialog, int width, int height, co
     const FramePlacement firstRun = PlaceFrame(dialog, 0, 0);
     const FramePlacement place = PlaceFrame(dialog, width, height);
     // A frame closed maximised stored its maximised rectangle, the screen and its borders: it opens
-    // maximised again instead of at the created size.
+    // maximised again instead of at the created size. The run dialog's place decides that (x = y = 0);
+    // when the host's window is off the screen's centre, a size that covers the whole screen does.
     const RECT withBorders{virtualScreen.left - frameBorder.cx, virtualScreen.top - frameBorder.cy,
                            virtualScreen.right + frameBorder.cx, virtualScreen.bottom + frameBorder.cy};
-    if (place.maximised && StoredSizeUsable(width, height, withBorders))
-        return place;
+    const bool coversScreen = width >= virtualScreen.right - virtualScreen.left &&
+                              height >= virtualScreen.bottom - virtualScreen.top;
+    if ((place.maximised || coversScreen) && StoredSizeUsable(width, height, withBorders)) {
+        FramePlacement maximised;
+        maximised.maximised = true;
+        maximised.width = width;
+        maximised.height = height;
+        return maximised;
+    }
     if (!StoredSizeUsable(width, height, virtualScreen))
         return firstRun;
     if (!place.move)

@@ -71,6 +71,12 @@ TEST(FramePlacement, AFrameClosedMaximisedOpensMaximisedAgain) {
         EXPECT_EQ(other.maximised, firstRun.maximised);
         EXPECT_EQ(other.move, firstRun.move);
     }
+    // The host's window off the screen's centre: the run dialog's place gives x > 0, but a size that
+    // covers the screen is still a maximised frame's.
+    const RECT offCentre{1300, 700, 1300, 700};
+    EXPECT_FALSE(PlaceFrame(offCentre, 1608, 1008).maximised);
+    EXPECT_TRUE(PlaceFrameOnDesktop(offCentre, 1608, 1008, screen, everywhere, SIZE{4, 4}).maximised);
+    EXPECT_FALSE(PlaceFrameOnDesktop(offCentre, 1599, 1008, screen, everywhere, SIZE{4, 4}).maximised);
     // A normal frame keeps its place and size.
     const FramePlacement normal = PlaceFrameOnDesktop(dialog, 1200, 750, screen, everywhere, SIZE{4, 4});
     EXPECT_FALSE(normal.maximised);
