@@ -45,9 +45,44 @@ private:
     bool m_open = false;
 };
 
+// The explorer's code page holds the name exactly: no character replaced by a default or a look-alike
+// (a name pasted under another name would be another file).
+bool ToAnsiExactly(const std::u16string& wide, std::string& narrow) {
+    const auto* text = reinterpret_cast<const wchar_t*>(wide.c_str());
+    const int length = static_cast<int>(wide.size());
+    BOOL usedDefault = FALSE;
+    const int bytes =
+        ::WideCharToMultiByte(CP_ACP, WC_NO_BEST_FIT_CHARS, text, length, nullptr, 0, nullptr, &usedDefault);
+    if (bytes <= 0 || usedDefault)
+        return false;
+    narrow.assign(static_cast<std::size_t>(bytes), '\0');
+    if (::WideCharToMultiByte(CP_ACP, WC_NO_BEST_FIT_CHARS, text, length, &narrow[0], bytes, nullptr,
+                              &usedDefault) != bytes ||
+        usedDefault)
+        return false;
+    // And back: the narrow name names the same file.
+    std::wstring back(static_cast<std::size_t>(length) + 1, L'\0');
+    const int units = ::MultiByteToWideChar(CP_ACP, MB_ERR_INVALID_CHARS, narrow.data(), bytes, &back[0],
+                                            static_cast<int>(back.size()));
+    return units == length && back.compare(0, static_cast<std::size_t>(units), text, wide.size()) == 0;
+}
+
+std::wstring WideText(const std::u16string& text) {
+    return std::wstring(text.begin(), text.end());
+}
+
 } // namespace
 
-std::vector<std::string> ClipboardFileList() {
+std::string PasteRefusedMessage(std::size_t count) {
+    return count == 1
+               ? "This file was not pasted: its name holds characters the system's code page cannot hold, "
+                 "and it is not pasted under another name:"
+               : "These " + std::to_string(count) +
+                     " files were not pasted: their names hold characters the system's code page cannot "
+                     "hold, and they are not pasted under other names:";
+}
+
+DropList ClipboardDropList() {
     ClipboardOpen clipboard(nullptr);
     if (!clipboard || !::IsClipboardFormatAvailable(CF_HDROP))
         return {};
@@ -62,7 +97,11 @@ std::vector<std::string> ClipboardFileList() {
     std::vector<unsigned char> copy(static_cast<const unsigned char*>(data),
                                     static_cast<const unsigned char*>(data) + size);
     ::GlobalUnlock(handle);
-    return ReadDropBlock(copy.data(), copy.size());
+    return ReadDropList(copy.data(), copy.size(), &ToAnsiExactly);
+}
+
+std::vector<std::string> ClipboardFileList() {
+    return ClipboardDropList().names;
 }
 
 bool PutFileListOnClipboard(const std::vector<std::string>& paths, bool cut) {
@@ -102,13 +141,30 @@ bool PutFileListOnClipboard(const std::vector<std::string>& paths, bool cut) {
 }
 
 bool ForFileCommands::ClipboardHoldsDrawings() const {
-    return ListHoldsDrawings(ClipboardFileList());
+    return DropListHoldsDrawings(ClipboardDropList());
+}
+
+void ForFileCommands::TellRefused(HWND owner, const std::vector<std::u16string>& unheld) const {
+    const std::string first = PasteRefusedMessage(unheld.size()); // ASCII
+    std::wstring text(first.begin(), first.end());
+    for (const std::u16string& name : unheld)
+        text += L"\n" + WideText(name);
+    if (tellUser)
+        tellUser(text);
+    else
+        ::MessageBoxW(owner, text.c_str(), L"Paste", MB_OK | MB_ICONWARNING);
 }
 
 bool ForFileCommands::PasteInto(const std::string& folder, HWND owner) const {
-    const std::vector<std::string> names = ClipboardFileList();
-    // What Paste is offered for: a list that names a drawing. Then every file of it is pasted.
-    if (!ListHoldsDrawings(names))
+    const DropList list = ClipboardDropList();
+    // What Paste is offered for: a list that names a drawing. Then every file of it is pasted, but for
+    // those whose names the code page cannot hold: they are said, and left where they are.
+    if (!DropListHoldsDrawings(list))
+        return false;
+    if (!list.unheld.empty())
+        TellRefused(owner, list.unheld);
+    const std::vector<std::string>& names = list.names;
+    if (names.empty())
         return false;
     const bool move = g_cutSequence != 0 && g_cutSequence == ::GetClipboardSequenceNumber();
     if (folder.empty())

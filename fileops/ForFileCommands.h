@@ -12,6 +12,9 @@
 
 #include <windows.h>
 
+#include "fileops/DropBlock.h"
+
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -19,20 +22,32 @@ class CEdit;
 
 class ForFileCommands {
 public:
-    // True when the clipboard's file list names at least one drawing (".dwg", case ignored).
+    // True when the clipboard's file list names at least one drawing (".dwg", case ignored), names the
+    // code page cannot hold included.
     bool ClipboardHoldsDrawings() const;
-    // Pastes the clipboard's files into folder (copy, or move after a cut); true when the shell did it.
-    // A list without a drawing pastes nothing.
+    // Pastes the clipboard's files into folder (copy, or move after a cut); true when the shell did it. A list without a drawing pastes nothing. Names the code page cannot hold (a wide list)
+    // are not pasted: the user is told which (tellUser, else a message box over owner), and the rest is.
     bool PasteInto(const std::string& folder, HWND owner) const;
+
+    // How a paste tells the user what it refused; unset: a message box.
+    std::function<void(const std::wstring& text)> tellUser;
     // Renames source to destination (full paths) with the shell; a non-zero result (the shell's) puts the
     // old name back into the label editor, when there is one.
     int RenameFile(const std::string& source, const std::string& destination, CEdit* label) const;
     // Copies source to a file chosen in a save dialog; asks before overwriting. Returns 1.
     int CopyToFile(const std::string& source, HWND owner) const;
+
+private:
+    void TellRefused(HWND owner, const std::vector<std::u16string>& unheld) const;
 };
 
-// The clipboard's file list as the explorer reads it (empty when there is none).
+// The clipboard's file list as the explorer reads it (empty when there is none): ANSI lists as they are,
+// wide ones turned into the code page, and apart the wide names it cannot hold exactly.
+DropList ClipboardDropList();
+// Its names in the code page.
 std::vector<std::string> ClipboardFileList();
+// The first line of what a paste says about the names it did not take.
+std::string PasteRefusedMessage(std::size_t count);
 // Puts these full paths on the clipboard as the explorer's file list; cut marks them to be moved by the
 // next paste. False when the clipboard could not be opened.
 bool PutFileListOnClipboard(const std::vector<std::string>& paths, bool cut);

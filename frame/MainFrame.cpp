@@ -28,6 +28,9 @@ const UINT kIndicators[] = {ID_SEPARATOR, ID_INDICATOR_CAPS, ID_INDICATOR_NUM, I
 
 constexpr int kSearchEditWidth = 125;
 constexpr int kLayerLabelExtra = 1000;
+// The grid keeps at least this width (half the frame when it is narrower) however wide the stored tree
+// pane: a width saved in a maximised frame would otherwise leave no grid in a smaller one.
+constexpr int kMinGridWidth = 200;
 constexpr UINT kLabelStyle = WS_CHILD | WS_VISIBLE | SS_LEFT | SS_CENTERIMAGE | SS_NOPREFIX;
 
 // The commands the grid carries out; the frame passes them on.
@@ -353,6 +356,8 @@ bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {
         m_pGridView = nullptr;
         return false;
     }
+    m_wndSplitter.SetColumnInfo(1, 0, kMinGridWidth);
+    m_wndSplitter.RecalcLayout();
     WireFolderTree();
     return true;
 }

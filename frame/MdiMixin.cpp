@@ -31,6 +31,12 @@ RECT VirtualScreen() {
     return RECT{x, y, x + ::GetSystemMetrics(SM_CXVIRTUALSCREEN), y + ::GetSystemMetrics(SM_CYVIRTUALSCREEN)};
 }
 
+// How far a maximised frame reaches past its screen on each side: its sizing border.
+SIZE SizingBorder() {
+    const int padding = ::GetSystemMetrics(SM_CXPADDEDBORDER);
+    return SIZE{::GetSystemMetrics(SM_CXSIZEFRAME) + padding, ::GetSystemMetrics(SM_CYSIZEFRAME) + padding};
+}
+
 bool OnAMonitor(const RECT& rc) {
     return ::MonitorFromRect(&rc, MONITOR_DEFAULTTONULL) != nullptr;
 }
@@ -67,11 +73,25 @@ bool StoredSizeUsable(int width, int height, const RECT& virtualScreen) {
 }
 
 FramePlacement PlaceFrameOnDesktop(const RECT& dialog, int width, int height, const RECT& virtualScreen,
-                                   const std::function<bool(const RECT&)>& onMonitor) {
+                                   const std::function<bool(const RECT&)>& onMonitor, SIZE frameBorder) {
     const FramePlacement firstRun = PlaceFrame(dialog, 0, 0);
+    const FramePlacement place = PlaceFrame(dialog, width, height);
+    // A frame closed maximised stored its maximised rectangle, the screen and its borders: it opens
+    // maximised again instead of at the created size. The run dialog's place decides that (x = y = 0);
+    // when the host's window is off the screen's centre, a size that covers the whole screen does.
+    const RECT withBorders{virtualScreen.left - frameBorder.cx, virtualScreen.top - frameBorder.cy,
+                           virtualScreen.right + frameBorder.cx, virtualScreen.bottom + frameBorder.cy};
+    const bool coversScreen = width >= virtualScreen.right - virtualScreen.left &&
+                              height >= virtualScreen.bottom - virtualScreen.top;
+    if ((place.maximised || coversScreen) && StoredSizeUsable(width, height, withBorders)) {
+        FramePlacement maximised;
+        maximised.maximised = true;
+        maximised.width = width;
+        maximised.height = height;
+        return maximised;
+    }
     if (!StoredSizeUsable(width, height, virtualScreen))
         return firstRun;
-    const FramePlacement place = PlaceFrame(dialog, width, height);
     if (!place.move)
         return place;
     // The caption's left end (system menu and title) must be on a screen, or the frame cannot be moved.
@@ -155,7 +175,7 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // 6. Placement from the dialog's rectangle and the stored size, on a monitor of this desktop.
     const CRect rcDialog = dialog->GetWindowRect();
     const FramePlacement place = PlaceFrameOnDesktop(rcDialog, doc->m_nWindowWidth, doc->m_nWindowHeight,
-                                                     VirtualScreen(), &OnAMonitor);
+                                                     VirtualScreen(), &OnAMonitor, SizingBorder());
     if (place.maximised) {
         frame->ShowWindow(SW_SHOWMAXIMIZED);
     } else {

@@ -55,9 +55,12 @@ FramePlacement PlaceFrame(const RECT& dialog, int width, int height);
 bool StoredSizeUsable(int width, int height, const RECT& virtualScreen);
 // The placement on this desktop: a stored size it cannot show, or a frame whose caption would lie on no
 // monitor (onMonitor says whether a screen rectangle touches one), is placed as on a first run, as if no
-// size had been stored.
+// size had been stored. A maximised frame's rectangle reaches past the screen by its sizing border
+// (frameBorder on each side): such a stored size, placed at x = y = 0 or covering the whole screen,
+// opens maximised again.
 FramePlacement PlaceFrameOnDesktop(const RECT& dialog, int width, int height, const RECT& virtualScreen,
-                                   const std::function<bool(const RECT&)>& onMonitor);
+                                   const std::function<bool(const RECT&)>& onMonitor,
+                                   SIZE frameBorder = SIZE{0, 0});
 
 // The folder the grid shows first: the folder part of the start path, else the saved current folder.
 std::string StartFolder(const std::string& startPath, const std::string& savedPath);

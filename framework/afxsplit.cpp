@@ -56,9 +56,12 @@ void CSplitterWnd::RecalcLayout() {
     if (m_nCols == 1) {
         m_cols[0].cur = client.Width();
     } else {
-        // The first column gets its ideal width (none when that is below its minimum), the second the rest.
+        // The first column gets its ideal width (none when that is below its minimum), the second the rest,
+        // but never less than its own minimum (half the room when there is not enough): a width stored in a
+        // larger window leaves the second pane and the bar in reach.
         int avail = std::max(0, client.Width() - m_cxSplitter);
-        int first = std::clamp(m_cols[0].ideal, 0, avail);
+        const int keepSecond = std::min(std::max(0, m_cols[1].min), avail / 2);
+        int first = std::clamp(m_cols[0].ideal, 0, avail - keepSecond);
         if (first < m_cols[0].min)
             first = 0;
         m_cols[0].cur = first;

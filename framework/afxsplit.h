@@ -20,6 +20,8 @@ public:
     CWnd* GetPane(int row, int col) const;
     int IdFromRowCol(int row, int col) const { return static_cast<int>(AFX_IDW_PANE_FIRST) + row * 16 + col; }
     void GetColumnInfo(int col, int& cur, int& min) const;
+    // ideal: the column's wished width (the first column's); min: below it the first column is not shown,
+    // and the second column keeps at least that much (at most half the splitter).
     void SetColumnInfo(int col, int ideal, int min);
     int GetColumnCount() const { return m_nCols; }
     virtual void RecalcLayout();

@@ -44,6 +44,22 @@ bool RefuseTooLong(const wchar_t* what, std::size_t length, std::size_t limit) {
     return true;
 }
 
+// A start path with a line break or another control character is refused: no folder name of Windows
+// holds one, and written into the settings it would make lines of its own.
+bool RefuseControlCharacters(const std::wstring& startPath) {
+    for (std::size_t i = 0; i < startPath.size(); ++i) {
+        const wchar_t c = startPath[i];
+        if (c >= 0x20 && c != 0x7F)
+            continue;
+        acutPrintf(
+            L"\nOrvex: the start path holds a control character (code %d at character %d); it is refused\n",
+            static_cast<int>(c), static_cast<int>(i + 1));
+        acedAlert(L"\nOrvex: the start path holds a control character");
+        return true;
+    }
+    return false;
+}
+
 void AppendParameters(ads_list_user& list, const std::string& folder) {
     CIniFile ini;
     ini.SetPath(FolderSettingsFilePath(folder));
@@ -121,6 +137,8 @@ int Orvex(PickerPlatform& platform) {
     const std::wstring acceptText(accept->resval.rstring, acceptLength);
     const std::wstring cancelText(cancel->resval.rstring, cancelLength);
     acutRelRb(args);
+    if (RefuseControlCharacters(startPath))
+        return 0;
 
     const std::string acceptCaption = acceptText.empty() ? "Ok" : NarrowAnsi(acceptText);
     const std::string cancelCaption = cancelText.empty() ? "Cancel" : NarrowAnsi(cancelText);

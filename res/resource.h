@@ -16,6 +16,7 @@
 // Folder settings dialog (IDD_SETLA)
 #define IDC_SETLA_COLOR 200        // the colour swatch
 #define IDC_SETLA_COMMAND 201      // the LISP command edit
+#define IDC_SETLA_LIMIT_NOTE 202   // says when an edit reached the longest text the file reads back
 #define IDC_SETLA_LAYER 1017       // the layer name edit
 #define IDC_SETLA_USE_CURRENT 1081 // "&Use current layer"
 

@@ -46,6 +46,9 @@ bool CDialogSetLa::OnInitDialog() {
     m_LispCommand.SubclassDlgItem(IDC_SETLA_COMMAND, this);
     m_StaticColor.SubclassDlgItem(IDC_SETLA_COLOR, this);
     m_LayerName.SubclassDlgItem(IDC_SETLA_LAYER, this);
+    // No more than the file reads back: typing stops there and a paste is cut, with a note saying so.
+    m_LispCommand.LimitText(MaxFolderCommandChars());
+    m_LayerName.LimitText(MaxFolderLayerChars());
 
     // SetFolder made sure the file name fits behind the folder.
     const std::string file = FolderSettingsFilePath(m_szPath);
@@ -81,6 +84,12 @@ bool CDialogSetLa::OnCommand(WPARAM wParam, LPARAM lParam) {
         OnUseCurrentLayer();
         return true;
     }
+    if (HIWORD(wParam) == EN_MAXTEXT &&
+        (LOWORD(wParam) == IDC_SETLA_COMMAND || LOWORD(wParam) == IDC_SETLA_LAYER)) {
+        SetDlgItemText(IDC_SETLA_LIMIT_NOTE,
+                       LOWORD(wParam) == IDC_SETLA_COMMAND ? CommandLimitNote() : LayerLimitNote());
+        return true;
+    }
     return CDialog::OnCommand(wParam, lParam);
 }
 
@@ -105,6 +114,14 @@ void CDialogSetLa::OnOK() {
     case FolderSettingsAction::AskLayer:
         ::acedAlert(WidenAnsi(kLayerNameEmptyAlert).c_str());
         m_LayerName.SetFocus();
+        return;
+    case FolderSettingsAction::LayerTooLong:
+        ::acedAlert(WidenAnsi(LayerTooLongAlert(layer.size())).c_str());
+        m_LayerName.SetFocus();
+        return;
+    case FolderSettingsAction::CommandTooLong:
+        ::acedAlert(WidenAnsi(CommandTooLongAlert(command.size())).c_str());
+        m_LispCommand.SetFocus();
         return;
     case FolderSettingsAction::Write:
         break;

@@ -3,8 +3,10 @@
 //
 // Use. SetFolder first (it refuses a folder whose settings file would not fit the path buffer, before
 // copying anything), then DoModal. Accept deletes the file (box "Use current layer" checked, no command),
-// keeps the dialog open with an alert (box clear, no layer name), or writes Layer, Lisp command and Color
-// and keeps every other key the file had. After a write or a delete onChanged tells the owner, which
+// keeps the dialog open with an alert (box clear, no layer name; or a layer name or command longer than
+// the file reads back), or writes Layer, Lisp command and Color and keeps every other key the file had.
+// The edits take no more than the file reads back; when typing or a paste reaches that, a note under them
+// says so. After a write or a delete onChanged tells the owner, which
 // shows the folder's layer again. A write or a delete that fails (a read-only, locked or unreadable
 // file) leaves the file as it was, is said on the command line and in an alert, and keeps the dialog
 // open with what the user entered.

@@ -48,11 +48,49 @@ FolderSettingsView ReadFolderSettingsView(CIniFile& store, bool fileRead) {
     return view;
 }
 
+int MaxFolderLayerChars() {
+    return MaxIniValueChars(kFolderSettingsLayer);
+}
+
+int MaxFolderCommandChars() {
+    return MaxIniValueChars(kFolderSettingsCommand);
+}
+
+std::string CommandTooLongAlert(std::size_t length) {
+    return "The LISP command is " + std::to_string(length) +
+           " characters long; the folder's settings hold at most " + std::to_string(MaxFolderCommandChars()) +
+           ". Shorten it, then Accept again.";
+}
+
+std::string LayerTooLongAlert(std::size_t length) {
+    return "The layer name is " + std::to_string(length) +
+           " characters long; the folder's settings hold at most " + std::to_string(MaxFolderLayerChars()) +
+           ". Shorten it, then Accept again.";
+}
+
+std::string CommandLimitNote() {
+    return "The command holds at most " + std::to_string(MaxFolderCommandChars()) +
+           " characters; the rest was not taken.";
+}
+
+std::string LayerLimitNote() {
+    return "The layer name holds at most " + std::to_string(MaxFolderLayerChars()) +
+           " characters; the rest was not taken.";
+}
+
 FolderSettingsAction DecideFolderSettingsAccept(bool useCurrentLayer, const std::string& layer,
                                                 const std::string& command) {
-    if (useCurrentLayer)
-        return command.empty() ? FolderSettingsAction::DeleteFile : FolderSettingsAction::Write;
-    return layer.empty() ? FolderSettingsAction::AskLayer : FolderSettingsAction::Write;
+    if (useCurrentLayer && command.empty())
+        return FolderSettingsAction::DeleteFile;
+    if (!useCurrentLayer && layer.empty())
+        return FolderSettingsAction::AskLayer;
+    // A longer line would end the file's reading: the command and colour after it would be lost and the
+    // file, read only in part, never saved over again.
+    if (layer.size() > static_cast<std::size_t>(MaxFolderLayerChars()))
+        return FolderSettingsAction::LayerTooLong;
+    if (command.size() > static_cast<std::size_t>(MaxFolderCommandChars()))
+        return FolderSettingsAction::CommandTooLong;
+    return FolderSettingsAction::Write;
 }
 
 bool WriteFolderSettings(CIniFile& store, const std::string& filePath, const std::string& layer,

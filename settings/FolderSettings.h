@@ -3,6 +3,7 @@
 // opens, what Accept does). Portable: no <windows.h>.
 #pragma once
 
+#include <cstddef>
 #include <string>
 
 class CIniFile;
@@ -45,16 +46,31 @@ struct FolderSettingsView {
 //    (a missing colour gives 0).
 FolderSettingsView ReadFolderSettingsView(CIniFile& store, bool fileRead);
 
+// The longest layer name and LISP command the file reads back: each is one line of the store, and a
+// longer line would end its reading (the command and colour after it lost). The dialog's edits take no
+// more than these.
+int MaxFolderLayerChars();
+int MaxFolderCommandChars();
+
 // What Accept does with what the dialog holds.
 enum class FolderSettingsAction {
-    DeleteFile, // box checked, command empty: the folder keeps no parameters
-    AskLayer,   // box clear, layer empty: "Name of layer is empty", the dialog stays
-    Write,      // Layer, Lisp command and Color are written
+    DeleteFile,     // box checked, command empty: the folder keeps no parameters
+    AskLayer,       // box clear, layer empty: "Name of layer is empty", the dialog stays
+    LayerTooLong,   // longer than MaxFolderLayerChars: said, the dialog stays
+    CommandTooLong, // longer than MaxFolderCommandChars: said, the dialog stays
+    Write,          // Layer, Lisp command and Color are written
 };
 FolderSettingsAction DecideFolderSettingsAccept(bool useCurrentLayer, const std::string& layer,
                                                 const std::string& command);
 
 constexpr const char kLayerNameEmptyAlert[] = "Name of layer is empty";
+
+// What the user is told when a text is longer than the file reads back (Accept refused), and the note
+// under the edits when typing or pasting reached the limit (the rest was not taken).
+std::string CommandTooLongAlert(std::size_t length);
+std::string LayerTooLongAlert(std::size_t length);
+std::string CommandLimitNote();
+std::string LayerLimitNote();
 
 // What the person in front of the dialog is told when Accept could not write, or remove, the folder's
 // file (the command line has the reason): the dialog stays open with what they entered, and the file is

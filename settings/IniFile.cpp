@@ -46,7 +46,64 @@ void ReportTooLargeOnce(const std::string& fileName, unsigned long long size) {
     ReportSettingsProblem("\nOrvex: " + fileName + " is larger than 1 MiB; it was not read\n");
 }
 
+// A line break for this format: the reader ends a line at a line feed (with or without a carriage
+// return before it).
+bool HoldsLineBreak(const std::string& text) {
+    return text.find('\n') != std::string::npos;
+}
+
+// How a name or value is shown in a message: short, and with its control characters visible.
+std::string Shown(const std::string& text) {
+    std::string shown;
+    for (std::size_t i = 0; i < text.size() && i < 40; ++i) {
+        const unsigned char c = static_cast<unsigned char>(text[i]);
+        if (c == '\n')
+            shown += "\\n";
+        else if (c == '\r')
+            shown += "\\r";
+        else if (c < 0x20)
+            shown += "\\x" + std::string(1, "0123456789ABCDEF"[c >> 4]) + "0123456789ABCDEF"[c & 15];
+        else
+            shown += static_cast<char>(c);
+    }
+    if (text.size() > 40)
+        shown += "...";
+    return shown;
+}
+
 } // namespace
+
+int MaxIniValueChars(const std::string& valuename) {
+    return std::max(0, kMaxIniLineChars - static_cast<int>(valuename.size()) - 1);
+}
+
+std::string WhyIniSectionUnreadable(const std::string& keyname) {
+    if (HoldsLineBreak(keyname))
+        return "the section name \"" + Shown(keyname) + "\" holds a line break";
+    // The reader takes every leading "[" and trailing "]" off a heading.
+    if (!keyname.empty() && (keyname.front() == '[' || keyname.back() == ']'))
+        return "the section name \"" + Shown(keyname) + "\" begins with [ or ends with ]";
+    if (keyname.size() + 2 > static_cast<std::size_t>(kMaxIniLineChars))
+        return "the section name \"" + Shown(keyname) + "\" is longer than " +
+               std::to_string(kMaxIniLineChars - 2) + " characters";
+    return {};
+}
+
+std::string WhyIniValueUnreadable(const std::string& valuename, const std::string& value) {
+    if (HoldsLineBreak(valuename))
+        return "the name \"" + Shown(valuename) + "\" holds a line break";
+    if (valuename.find('=') != std::string::npos)
+        return "the name \"" + Shown(valuename) + "\" holds an =";
+    if (HoldsLineBreak(value))
+        return "the value of " + Shown(valuename) + " holds a line break";
+    if (!valuename.empty() && valuename.front() == '[' && !value.empty() && value.back() == ']')
+        return "the line of " + Shown(valuename) + " would read as a [section]";
+    if (value.size() > static_cast<std::size_t>(MaxIniValueChars(valuename)))
+        return "the value of " + Shown(valuename) + " is " + std::to_string(value.size()) +
+               " characters long, at most " + std::to_string(MaxIniValueChars(valuename)) +
+               " can be read back";
+    return {};
+}
 
 int LenientInt(const std::string& text) {
     std::size_t i = 0;
@@ -171,6 +228,19 @@ bool CIniFile::WriteFile() {
         const key& section = keys[k];
         if (section.names.GetSize() == 0)
             continue;
+        // A file the reader would take otherwise than it was meant is never written: the next run would
+        // read other settings, or refuse to save over a file it reads only in part.
+        std::string unreadable = WhyIniSectionUnreadable(names[k]);
+        for (int j = 0; j < section.names.GetSize() && unreadable.empty(); ++j) {
+            unreadable = WhyIniValueUnreadable(section.names[j], section.values[j]);
+            if (!unreadable.empty())
+                unreadable += " in [" + Shown(names[k]) + "]";
+        }
+        if (!unreadable.empty()) {
+            ReportSettingsProblem("\nOrvex: " + path + " was not saved: " + unreadable +
+                                  "; the file is left as it was\n");
+            return false;
+        }
         text += "[" + names[k] + "]" + kLineEnd;
         for (int j = 0; j < section.names.GetSize(); ++j) {
             text += section.names[j];

@@ -23,6 +23,16 @@ constexpr std::size_t kMaxIniFileBytes = 1024 * 1024;
 // The longest line the reader takes (its line buffer holds 2048 characters with the terminator).
 constexpr int kMaxIniLineChars = 2047;
 
+// The longest value that reads back whole under that value name: its line is the name, "=" and the value.
+// Callers limit what a user types with it (the folder settings dialog's command edit).
+int MaxIniValueChars(const std::string& valuename);
+
+// Why a line made of these would not read back as the same section, name and value, or empty when it
+// would: a line break in a name or value (a line feed ends a line; a carriage return alone is kept), an
+// "=" in a value name, a name that reads as a heading, or a line longer than kMaxIniLineChars.
+std::string WhyIniSectionUnreadable(const std::string& keyname);
+std::string WhyIniValueUnreadable(const std::string& valuename, const std::string& value);
+
 class CIniFile {
 public:
     // One section. After the first value is added, values holds one element more than names: the last
@@ -51,8 +61,9 @@ public:
     bool ReadFile();
     // Writes every section that has values: into a temporary file beside path, then moved over it, so
     // the file on disk is always a whole one. False when nothing was written, because the store holds
-    // only part of the file at path or because the file could not be replaced; the file is then as it
-    // was and the reporter has said why, once.
+    // only part of the file at path, holds a section or value that would not read back (see
+    // WhyIniValueUnreadable), or because the file could not be replaced; the file is then as it was and
+    // the reporter has said why, once.
     bool WriteFile();
     // Empties the store; a file read only in part may then be written over.
     void Reset();

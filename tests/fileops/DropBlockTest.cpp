@@ -104,24 +104,88 @@ TEST(DropBlock, AMissingFinalEmptyNameStopsAtTheBlocksEnd) {
     EXPECT_EQ(ReadDropBlock(block.data(), block.size()), std::vector<std::string>{"a.dwg"});
 }
 
-TEST(DropBlock, AWideListYieldsTheFirstCharacterOfEachName) {
-    auto block = Header(20);
-    block[16] = 1; // fWide, not consulted
-    for (const char* name : {"Z:\\a.dwg", "Z:\\b.dwg"}) {
-        for (const char* p = name; *p; ++p) {
-            block.push_back(static_cast<unsigned char>(*p));
-            block.push_back(0);
+namespace {
+
+// A wide list as the system's file manager puts it there: the header with fWide set, then UTF-16 names.
+std::vector<unsigned char> WideBlock(const std::vector<std::u16string>& names, unsigned char offset = 20) {
+    auto block = Header(offset);
+    block[16] = 1; // fWide
+    block.resize(offset, 'z');
+    for (const std::u16string& name : names) {
+        for (const char16_t c : name) {
+            block.push_back(static_cast<unsigned char>(c & 0xFF));
+            block.push_back(static_cast<unsigned char>(c >> 8));
         }
         block.push_back(0);
         block.push_back(0);
     }
     block.push_back(0);
     block.push_back(0);
-    // Read as ANSI, each wide character of the first name is a name of its own and the wide NUL that
-    // ends the first name ends the list.
-    const auto names = ReadDropBlock(block.data(), block.size());
-    EXPECT_EQ(names, (std::vector<std::string>{"Z", ":", "\\", "a", ".", "d", "w", "g"}));
-    EXPECT_FALSE(ListHoldsDrawings(names));
+    return block;
+}
+
+// A code page of the test's own: Latin-1, which holds U+0000..U+00FF and nothing else.
+bool Latin1(const std::u16string& wide, std::string& narrow) {
+    narrow.clear();
+    for (const char16_t c : wide) {
+        if (c > 0xFF)
+            return false;
+        narrow += static_cast<char>(c);
+    }
+    return true;
+}
+
+} // namespace
+
+TEST(DropBlock, AWideListIsReadAsWide) {
+    // Before, it was read as ANSI: each name's first character only, and no drawing, so no Paste.
+    const auto block = WideBlock({u"Z:\\a.dwg", u"Z:\\b.dwg"});
+    const DropList list = ReadDropList(block.data(), block.size(), &Latin1);
+    EXPECT_TRUE(list.wide);
+    EXPECT_EQ(list.names, (std::vector<std::string>{"Z:\\a.dwg", "Z:\\b.dwg"}));
+    EXPECT_TRUE(list.unheld.empty());
+    EXPECT_TRUE(DropListHoldsDrawings(list));
+    EXPECT_EQ(ReadDropBlock(block.data(), block.size()), list.names);
+}
+
+TEST(DropBlock, AWideNameTheCodePageCannotHoldIsKeptApartNeverRenamed) {
+    const std::u16string chinese = u"Z:\\\u4E2D\u6587.dwg";
+    const auto block = WideBlock({u"Z:\\caf\u00E9.dwg", chinese, u"Z:\\c.txt"});
+    const DropList list = ReadDropList(block.data(), block.size(), &Latin1);
+    EXPECT_EQ(list.names, (std::vector<std::string>{"Z:\\caf\xE9.dwg", "Z:\\c.txt"}));
+    EXPECT_EQ(list.unheld, std::vector<std::u16string>{chinese});
+    // Alone, it still offers Paste, which then says why it pastes nothing.
+    const auto alone = WideBlock({chinese});
+    const DropList aloneList = ReadDropList(alone.data(), alone.size(), &Latin1);
+    EXPECT_TRUE(aloneList.names.empty());
+    EXPECT_TRUE(DropListHoldsDrawings(aloneList));
+    const auto text = WideBlock({u"Z:\\\u4E2D.txt"});
+    EXPECT_FALSE(DropListHoldsDrawings(ReadDropList(text.data(), text.size(), &Latin1)));
+    // The portable converter holds ASCII only.
+    std::string narrow;
+    EXPECT_TRUE(AsciiOnly(u"Z:\\a.dwg", narrow));
+    EXPECT_EQ(narrow, "Z:\\a.dwg");
+    EXPECT_FALSE(AsciiOnly(u"Z:\\caf\u00E9.dwg", narrow));
+}
+
+TEST(DropBlock, AWideListIsBoundedByTheBlock) {
+    // An odd offset, a name cut off by the block's end, a lone last byte, no converter.
+    const auto odd = WideBlock({u"Z:\\a.dwg"}, 21);
+    EXPECT_EQ(ReadDropList(odd.data(), odd.size(), &Latin1).names, std::vector<std::string>{"Z:\\a.dwg"});
+    auto cut = WideBlock({u"Z:\\a.dwg"});
+    cut.resize(cut.size() - 4); // the name's NUL and the list's are gone
+    const DropList cutList = ReadDropList(cut.data(), cut.size(), &Latin1);
+    EXPECT_TRUE(cutList.names.empty());
+    EXPECT_TRUE(cutList.unheld.empty());
+    cut.push_back(0); // one byte of a NUL: still no name
+    EXPECT_TRUE(ReadDropList(cut.data(), cut.size(), &Latin1).names.empty());
+    const auto block = WideBlock({u"Z:\\a.dwg"});
+    const DropList none = ReadDropList(block.data(), block.size(), nullptr);
+    EXPECT_TRUE(none.names.empty());
+    EXPECT_EQ(none.unheld, std::vector<std::u16string>{u"Z:\\a.dwg"});
+    // fWide in a block shorter than its header is not read: the block is ANSI.
+    std::vector<unsigned char> shortBlock = {4, 0, 0, 0, 'a', 0, 0};
+    EXPECT_EQ(ReadDropBlock(shortBlock.data(), shortBlock.size()), std::vector<std::string>{"a"});
 }
 
 TEST(DropBlock, ATextFileThenADrawingHoldsDrawings) {

@@ -18,6 +18,7 @@
 #include <cstring>
 #include <fstream>
 #include <functional>
+#include <algorithm>
 #include <sstream>
 #include <string>
 #include <vector>
@@ -302,18 +303,78 @@ TEST(Clipboard, ATextFileThenADrawingOffersPasteAndPastesBoth) {
     EXPECT_EQ(ClipboardFileList().size(), 2u);
 }
 
-TEST(Clipboard, AWideListFromAnotherProgramOffersNoPasteAndPastesNothing) {
+TEST(Clipboard, AWideListFromAnotherProgramOffersPasteAndIsPasted) {
+    // The system's file manager puts wide lists there; before, they were read as ANSI and Paste was greyed.
     TempFolder folder("orvex-wide");
-    const std::string a = folder.Write("a.dwg", "drawing");
+    const std::string a = folder.Write("a.dwg", "drawing"), b = folder.Write("notes.txt", "text");
     const std::string target = folder.MakeDir("target");
-    const std::string out = RunProgram(Probe() + " put-wide \"" + a + "\"");
-    ASSERT_EQ(out, "put-wide 1 ok\n");
+    const std::string out = RunProgram(Probe() + " put-wide \"" + a + "\" \"" + b + "\"");
+    ASSERT_EQ(out, "put-wide 2 ok\n");
     ForFileCommands commands;
-    EXPECT_FALSE(commands.ClipboardHoldsDrawings());
-    EXPECT_FALSE(commands.PasteInto(target, nullptr));
-    EXPECT_FALSE(std::ifstream(target + "\\a.dwg").good());
-    PutWideList({Wide(a)});
-    EXPECT_FALSE(commands.ClipboardHoldsDrawings());
+    EXPECT_TRUE(commands.ClipboardHoldsDrawings());
+    EXPECT_EQ(ClipboardFileList(), (std::vector<std::string>{a, b}));
+    EXPECT_TRUE(ClipboardDropList().wide);
+    EXPECT_TRUE(commands.PasteInto(target, nullptr));
+    EXPECT_EQ(ReadFile(target + "\\a.dwg"), "drawing");
+    EXPECT_EQ(ReadFile(target + "\\notes.txt"), "text");
+}
+
+namespace {
+
+// The names of a folder, wide, sorted.
+std::vector<std::wstring> NamesIn(const std::wstring& folder) {
+    std::vector<std::wstring> names;
+    WIN32_FIND_DATAW found;
+    HANDLE search = ::FindFirstFileW((folder + L"\\*").c_str(), &found);
+    if (search == INVALID_HANDLE_VALUE)
+        return names;
+    do {
+        if (std::wstring(found.cFileName) != L"." && std::wstring(found.cFileName) != L"..")
+            names.push_back(found.cFileName);
+    } while (::FindNextFileW(search, &found));
+    ::FindClose(search);
+    std::sort(names.begin(), names.end());
+    return names;
+}
+
+} // namespace
+
+TEST(Clipboard, AWideNameTheCodePageCannotHoldIsSaidAndNeverPastedUnderAnotherName) {
+    const std::wstring chinese = L"\u4E2D\u6587.dwg";
+    BOOL usedDefault = FALSE;
+    char probe[32];
+    ::WideCharToMultiByte(CP_ACP, WC_NO_BEST_FIT_CHARS, chinese.c_str(), -1, probe, sizeof probe, nullptr,
+                          &usedDefault);
+    if (!usedDefault)
+        GTEST_SKIP() << "this system's code page holds the name";
+    TempFolder folder("orvex-unheld");
+    const std::string plan = folder.Write("plan.dwg", "drawing");
+    const std::wstring wideFolder = Wide(folder.Dir());
+    const std::wstring unheld = wideFolder + L"\\" + chinese;
+    HANDLE file = ::CreateFileW(unheld.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_NEW, 0, nullptr);
+    ASSERT_NE(file, INVALID_HANDLE_VALUE);
+    ::CloseHandle(file);
+    const std::string target = folder.MakeDir("target");
+
+    std::vector<std::wstring> told;
+    ForFileCommands commands;
+    commands.tellUser = [&told](const std::wstring& text) { told.push_back(text); };
+    PutWideList({Wide(plan), unheld});
+    EXPECT_TRUE(commands.ClipboardHoldsDrawings());
+    EXPECT_EQ(ClipboardFileList(), std::vector<std::string>{plan});
+    EXPECT_TRUE(commands.PasteInto(target, nullptr));
+    EXPECT_EQ(NamesIn(Wide(target)), std::vector<std::wstring>{L"plan.dwg"}) << "nothing under another name";
+    const std::string first = PasteRefusedMessage(1);
+    EXPECT_EQ(told, std::vector<std::wstring>{std::wstring(first.begin(), first.end()) + L"\n" + unheld});
+
+    // Alone, Paste is offered, says why, and pastes nothing.
+    told.clear();
+    const std::string empty = folder.MakeDir("empty");
+    PutWideList({unheld});
+    EXPECT_TRUE(commands.ClipboardHoldsDrawings());
+    EXPECT_FALSE(commands.PasteInto(empty, nullptr));
+    EXPECT_EQ(told.size(), 1u);
+    EXPECT_TRUE(NamesIn(Wide(empty)).empty());
 }
 
 TEST(Clipboard, NoFileListOffersNoPaste) {

@@ -50,6 +50,41 @@ TEST(FramePlacement, StoredSizeMustFitTheDesktop) {
     EXPECT_FALSE(StoredSizeUsable(-2147483647 - 1, 300, screen));
 }
 
+TEST(FramePlacement, AFrameClosedMaximisedOpensMaximisedAgain) {
+    // Its rectangle was the screen and 4 pixels of border on each side; the run dialog sits, shrunk to
+    // nothing, at the screen's centre. Before, the size was taken as too large for the desktop and the
+    // frame opened at its created size.
+    const RECT screen{0, 0, 1600, 1000};
+    const RECT dialog{800, 500, 800, 500};
+    auto everywhere = [](const RECT&) { return true; };
+    const FramePlacement place = PlaceFrameOnDesktop(dialog, 1608, 1008, screen, everywhere, SIZE{4, 4});
+    EXPECT_TRUE(place.maximised);
+    EXPECT_FALSE(place.move);
+    // Exactly the screen, too; the borders of a larger frame setting as well.
+    EXPECT_TRUE(PlaceFrameOnDesktop(dialog, 1600, 1000, screen, everywhere, SIZE{4, 4}).maximised);
+    EXPECT_TRUE(PlaceFrameOnDesktop(dialog, 1616, 1016, screen, everywhere, SIZE{8, 8}).maximised);
+    // More than the borders: a size no screen here shows, placed as on a first run.
+    const FramePlacement firstRun = PlaceFrame(dialog, 0, 0);
+    for (const FramePlacement& other :
+         {PlaceFrameOnDesktop(dialog, 1609, 1008, screen, everywhere, SIZE{4, 4}),
+          PlaceFrameOnDesktop(dialog, 2147483647, 2147483647, screen, everywhere, SIZE{4, 4})}) {
+        EXPECT_EQ(other.maximised, firstRun.maximised);
+        EXPECT_EQ(other.move, firstRun.move);
+    }
+    // The host's window off the screen's centre: the run dialog's place gives x > 0, but a size that
+    // covers the screen is still a maximised frame's.
+    const RECT offCentre{1300, 700, 1300, 700};
+    EXPECT_FALSE(PlaceFrame(offCentre, 1608, 1008).maximised);
+    EXPECT_TRUE(PlaceFrameOnDesktop(offCentre, 1608, 1008, screen, everywhere, SIZE{4, 4}).maximised);
+    EXPECT_FALSE(PlaceFrameOnDesktop(offCentre, 1599, 1008, screen, everywhere, SIZE{4, 4}).maximised);
+    // A normal frame keeps its place and size.
+    const FramePlacement normal = PlaceFrameOnDesktop(dialog, 1200, 750, screen, everywhere, SIZE{4, 4});
+    EXPECT_FALSE(normal.maximised);
+    EXPECT_TRUE(normal.move);
+    EXPECT_EQ(normal.x, 200);
+    EXPECT_EQ(normal.width, 1200);
+}
+
 TEST(FramePlacement, OnTheDesktopACaptionOnNoMonitorGivesTheFirstRunPlacement) {
     const RECT screen{0, 0, 1600, 1000};
     const RECT dialog{300, 200, 500, 300};

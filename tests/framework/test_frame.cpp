@@ -362,6 +362,44 @@ TEST_F(FrameFixture, SplitterColumnFollowsADragOfItsBar) {
     EXPECT_EQ(cur, 90);
 }
 
+TEST_F(FrameFixture, TheSecondColumnKeepsItsMinimumWhateverTheFirstAsks) {
+    frame->withSplitter = true;
+    ASSERT_TRUE(Load());
+    frame->InitialUpdateFrame(&doc, true);
+    CSplitterWnd& sp = frame->splitter;
+    const int avail = sp.GetClientRect().Width() - sp.m_cxSplitter;
+    ASSERT_GT(avail, 400);
+    int cur = 0, min = 0, second = 0;
+    // A first column wider than the splitter (stored in a larger window): without a minimum the second
+    // column has nothing left.
+    sp.SetColumnInfo(0, 1347, 0);
+    sp.RecalcLayout();
+    sp.GetColumnInfo(0, cur, min);
+    EXPECT_EQ(cur, avail);
+    sp.SetColumnInfo(1, 0, 200);
+    sp.RecalcLayout();
+    sp.GetColumnInfo(0, cur, min);
+    sp.GetColumnInfo(1, second, min);
+    EXPECT_EQ(cur, avail - 200);
+    EXPECT_EQ(second, 200);
+    auto* right = sp.GetPane(0, 1);
+    ASSERT_NE(right, nullptr);
+    EXPECT_EQ(right->GetClientRect().Width() > 0, true) << "the second pane shows";
+    // The bar lies inside the splitter, where the mouse reaches it; a drag past the end stops there too.
+    sp.SendMessage(WM_LBUTTONDOWN, MK_LBUTTON, MAKELPARAM(cur + 2, 40));
+    sp.SendMessage(WM_MOUSEMOVE, MK_LBUTTON, MAKELPARAM(avail + 50, 40));
+    sp.SendMessage(WM_LBUTTONUP, 0, MAKELPARAM(avail + 50, 40));
+    sp.GetColumnInfo(0, cur, min);
+    EXPECT_EQ(cur, avail - 200);
+    // Narrower than twice the minimum: the two share the room.
+    frame->MoveWindow(0, 0, 300, 300);
+    const int small = sp.GetClientRect().Width() - sp.m_cxSplitter;
+    sp.GetColumnInfo(0, cur, min);
+    sp.GetColumnInfo(1, second, min);
+    EXPECT_EQ(second, small / 2 + small % 2);
+    EXPECT_EQ(cur + second, small);
+}
+
 namespace {
 
 class TestScrollView : public CScrollView {

@@ -279,6 +279,32 @@ TEST_F(OrvexTest, OverlongArgumentsAreRefusedWithAMessage) {
     EXPECT_NE(host.printed().find("accept caption is too long"), std::string::npos);
 }
 
+TEST_F(OrvexTest, AStartPathWithALineBreakOrAnotherControlCharacterIsRefusedWithAMessage) {
+    // Before, "C:\a\r\n[View]\r\nb\" opened the explorer and was written into the settings as it was.
+    const std::wstring withLineBreak = L"C:\\a\r\n[View]\r\nb\\";
+    FiveArguments(withLineBreak, L"Insert", L"Close");
+    EXPECT_EQ(Orvex(platform), 0);
+    EXPECT_TRUE(platform.steps.empty()) << "no explorer, no document, nothing saved";
+    EXPECT_FALSE(std::filesystem::exists(platform.settingsFile));
+    EXPECT_EQ(host.events,
+              (std::vector<std::string>{"print:\nOrvex: the start path holds a control character (code 13 at "
+                                        "character 5); it is refused\n",
+                                        "alert:\nOrvex: the start path holds a control character"}));
+    EXPECT_EQ(host.result, "unset") << "returns as the other refusals do";
+    EXPECT_EQ(host.liveNodes, 0);
+    for (const wchar_t c : {L'\n', L'\t', L'\x01', L'\x1F', L'\x7F'}) {
+        host.events.clear();
+        FiveArguments(std::wstring(L"C:\\dwg") + c + L"\\");
+        EXPECT_EQ(Orvex(platform), 0) << static_cast<int>(c);
+        EXPECT_TRUE(platform.steps.empty()) << static_cast<int>(c);
+    }
+    // Everything else a folder name can hold is taken.
+    host.events.clear();
+    FiveArguments(L"C:\\Plans 2024 (old) ~#;=\\", L"Insert", L"Close");
+    EXPECT_EQ(Orvex(platform), 1);
+    EXPECT_EQ(platform.steps, (std::vector<std::string>{"dialog", "destroy", "focus"}));
+}
+
 TEST_F(OrvexTest, ARelativeStartPathIsTakenAgainstTheHostsCurrentFolder) {
     FiveArguments(L"Doors\\", L"Insert", L"Close");
     EXPECT_EQ(Orvex(platform), 1);

@@ -110,6 +110,41 @@ TEST(FolderSettingsAccept, TheRulesInTheirOrder) {
     EXPECT_EQ(std::string(kLayerNameEmptyAlert), "Name of layer is empty");
 }
 
+TEST(FolderSettingsAccept, TextsLongerThanTheFileReadsBackAreRefused) {
+    using A = FolderSettingsAction;
+    // "Lisp command=" and "Layer=" with their values fill at most the reader's line.
+    EXPECT_EQ(MaxFolderCommandChars(), kMaxIniLineChars - 13);
+    EXPECT_EQ(MaxFolderLayerChars(), kMaxIniLineChars - 6);
+    const std::string longest(static_cast<std::size_t>(MaxFolderCommandChars()), 'c');
+    EXPECT_EQ(DecideFolderSettingsAccept(true, "", longest), A::Write);
+    EXPECT_EQ(DecideFolderSettingsAccept(true, "", longest + "c"), A::CommandTooLong);
+    EXPECT_EQ(DecideFolderSettingsAccept(false, "WALLS", std::string(2158, 'c')), A::CommandTooLong);
+    const std::string layer(static_cast<std::size_t>(MaxFolderLayerChars()), 'L');
+    EXPECT_EQ(DecideFolderSettingsAccept(false, layer, "(c:go)"), A::Write);
+    EXPECT_EQ(DecideFolderSettingsAccept(false, layer + "L", "(c:go)"), A::LayerTooLong);
+    EXPECT_EQ(DecideFolderSettingsAccept(true, layer + "L", ""), A::DeleteFile)
+        << "the layer edit is not read";
+    EXPECT_EQ(
+        CommandTooLongAlert(2158),
+        "The LISP command is 2158 characters long; the folder's settings hold at most 2034. Shorten it, "
+        "then Accept again.");
+    EXPECT_EQ(CommandLimitNote(), "The command holds at most 2034 characters; the rest was not taken.");
+}
+
+TEST(FolderSettingsWrite, TheLongestCommandReadsBackWithItsColour) {
+    TempFolder folder("orvex-folderset");
+    CIniFile store;
+    const std::string path = folder.File("datains.ini");
+    const std::string command(static_cast<std::size_t>(MaxFolderCommandChars()), 'c');
+    ASSERT_TRUE(WriteFolderSettings(store, path, "LONG", command, 5));
+    CIniFile again(path);
+    ASSERT_TRUE(again.ReadFile());
+    const FolderSettingsView view = ReadFolderSettingsView(again, true);
+    EXPECT_EQ(view.layer, "LONG");
+    EXPECT_EQ(view.command, command);
+    EXPECT_EQ(view.colorIndex, 5);
+}
+
 TEST(FolderSettingsWrite, ThreeKeysInOrderAfterWhatTheFileHad) {
     ReadStore file("[Other]\r\nKeep=1\r\n[Default Parameters]\r\nColor=5\r\nExtra=x\r\n");
     ASSERT_TRUE(file.read);

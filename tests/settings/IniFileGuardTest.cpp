@@ -166,6 +166,71 @@ TEST_F(IniGuardTest, LongLastLineWithoutLineEndAlsoKeepsTheFile) {
     EXPECT_EQ(ReadBytes(fileName), text);
 }
 
+// --- values the reader would not take back ---
+
+TEST_F(IniGuardTest, AValueOfTheLongestReadableLineIsWrittenAndReadBackWithWhatFollows) {
+    std::string fileName = m_dir.File("datains.ini");
+    const std::string command(static_cast<std::size_t>(MaxIniValueChars("Lisp command")), 'c');
+    EXPECT_EQ(command.size(), 2034u); // "Lisp command=" and the value fill the reader's 2047 characters
+    CIniFile ini(fileName);
+    ini.SetValue("Default Parameters", "Layer", "LONG");
+    ini.SetValue("Default Parameters", "Lisp command", command);
+    ini.SetValue("Default Parameters", "Color", "5");
+    ASSERT_TRUE(ini.WriteFile());
+    CIniFile back(fileName);
+    ASSERT_TRUE(back.ReadFile());
+    EXPECT_EQ(back.GetValue("Default Parameters", "Lisp command"), command);
+    EXPECT_EQ(back.GetValue("Default Parameters", "Color"), "5");
+    back.SetValue("Default Parameters", "Color", "6");
+    EXPECT_TRUE(back.WriteFile()) << "a file the store wrote is one it can save again";
+    EXPECT_TRUE(m_reported.All().empty());
+}
+
+TEST_F(IniGuardTest, ValuesTheReaderWouldNotTakeBackAreNeverWritten) {
+    struct Case {
+        std::string section, name, value, why;
+    };
+    const std::vector<Case> cases = {
+        {"Default Parameters", "Lisp command", std::string(2158, 'c'),
+         "the value of Lisp command is 2158 characters long, at most 2034 can be read back in "
+         "[Default Parameters]"},
+        {"CurrentPath", "Path", "Z:\\a\nb\\", "the value of Path holds a line break in [CurrentPath]"},
+        {"CurrentPath", "Path", "Z:\\a\r\n[View]\r\nb\\",
+         "the value of Path holds a line break in [CurrentPath]"},
+        {"S", "a=b", "1", "the name \"a=b\" holds an = in [S]"},
+        {"S", "x\ny", "1", "the name \"x\\ny\" holds a line break in [S]"},
+        {"S", "[a", "b]", "the line of [a would read as a [section] in [S]"},
+        {"S\nT", "a", "1", "the section name \"S\\nT\" holds a line break"},
+        {"[S", "a", "1", "the section name \"[S\" begins with [ or ends with ]"},
+    };
+    std::string fileName = m_dir.File("Orvex1.ini");
+    const std::string before = "[CurrentPath]\r\nPath=Z:\\dwg\\\r\n\r\n";
+    for (const Case& c : cases) {
+        WriteBytes(fileName, before);
+        m_reported.Clear();
+        CIniFile ini(fileName);
+        ASSERT_TRUE(ini.ReadFile());
+        ini.SetValue(c.section, c.name, c.value);
+        EXPECT_FALSE(ini.WriteFile()) << c.why;
+        EXPECT_EQ(ReadBytes(fileName), before) << c.why;
+        EXPECT_EQ(m_reported.All(), (std::vector<ReportedMessage>{{NotSaved(fileName, c.why), false}}));
+        EXPECT_EQ(FilesIn(m_dir.Dir()), std::vector<std::string>{"Orvex1.ini"});
+    }
+}
+
+TEST_F(IniGuardTest, ACarriageReturnAloneReadsBackAndIsWritten) {
+    // The reader ends a line only at a line feed: a carriage return inside a value is an ordinary
+    // character, and a file holding one can be saved again.
+    std::string fileName = m_dir.File("Orvex1.ini");
+    CIniFile ini(fileName);
+    ini.SetValue("S", "a", "x\ry\r");
+    ASSERT_TRUE(ini.WriteFile());
+    CIniFile back(fileName);
+    ASSERT_TRUE(back.ReadFile());
+    EXPECT_EQ(back.GetValue("S", "a"), "x\ry\r");
+    EXPECT_TRUE(back.WriteFile());
+}
+
 TEST_F(IniGuardTest, AStoreThatDidNotReadAFileWholeStillSavesElsewhere) {
     std::string fileName = m_dir.File("in.ini");
     WriteBytes(fileName, "[S]\r\n" + std::string(3000, 'x') + "\r\n");

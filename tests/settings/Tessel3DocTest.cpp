@@ -382,3 +382,26 @@ TEST_F(Tessel3DocGuardTest, TooLongAFolderGivesDefaultsAnAlertAndNoFile) {
         << messages[0].text;
 }
 #endif
+
+TEST_F(Tessel3DocGuardTest, AFolderWithALineBreakIsNeverWrittenAndLaterClosesStillSave) {
+    std::string fileName = m_dir.File("Orvex1.ini");
+    const std::string text = "[CurrentPath]\r\nPath=Z:\\dwg\\\r\n\r\n[Size]\r\nWindowWidth=900\r\n\r\n";
+    WriteBytes(fileName, text);
+    {
+        CTessel3Doc doc(fileName);
+        doc.m_strPath = "Z:\\a\r\n[View]\r\nb\\";
+        doc.m_nWindowWidth = 800;
+    }
+    EXPECT_EQ(ReadBytes(fileName), text) << "no [View] section made of a folder name";
+    EXPECT_EQ(m_reported.Texts(),
+              std::vector<std::string>{"\nOrvex: " + fileName +
+                                       " was not saved: the value of Path holds a line break in "
+                                       "[CurrentPath]; the file is left as it was\n"});
+    {
+        CTessel3Doc doc(fileName);
+        EXPECT_EQ(doc.m_strPath, "Z:\\dwg\\");
+        doc.m_nWindowWidth = 700;
+    }
+    EXPECT_NE(ReadBytes(fileName).find("WindowWidth=700\r\n"), std::string::npos)
+        << "the next close saves: nothing is frozen";
+}

@@ -583,6 +583,86 @@ TEST_F(FolderSettingsDialog, WhatItWroteReopensTheSame) {
     EXPECT_EQ(index, 140);
 }
 
+// ---- the longest texts the file reads back ---------------------------------------------------------------
+
+TEST_F(FolderSettingsDialog, ACommandLongerThanTheFileReadsBackIsRefusedAndTheFileKept) {
+    // Before, 2,158 characters were written: the next read stopped at that line (command and colour
+    // lost) and the file, read only in part, was never saved over again.
+    WriteIni("[Default Parameters]\r\nLayer=LONG\r\nLisp command=(c:go)\r\nColor=5\r\n\r\n");
+    const std::string before = Ini();
+    bool stillOpen = false;
+    std::string focused;
+    std::size_t keptLength = 0;
+    TestDialog dialog;
+    const INT_PTR result = Run(dialog, [&](TestDialog& d) {
+        d.SetText(IDC_SETLA_COMMAND, std::string(2158, 'c')); // as a program sets it: past the edit's limit
+        d.Press(IDOK);
+        stillOpen = d.IsModalRunning() && d.IsWindowVisible();
+        focused = ::GetFocus() == d.Item(IDC_SETLA_COMMAND) ? "command" : "elsewhere";
+        keptLength = d.Text(IDC_SETLA_COMMAND).size();
+        d.Press(IDCANCEL);
+    });
+    EXPECT_EQ(result, IDCANCEL);
+    EXPECT_TRUE(stillOpen) << "the dialog stays open";
+    EXPECT_EQ(g_alerts, std::vector<std::wstring>{WidenAnsi(CommandTooLongAlert(2158))});
+    EXPECT_EQ(focused, "command");
+    EXPECT_EQ(keptLength, 2158u) << "what was entered stays to be shortened";
+    EXPECT_EQ(Ini(), before);
+    EXPECT_EQ(dialog.changes, 0);
+}
+
+TEST_F(FolderSettingsDialog, APasteIsCutAtTheLimitWithANoteAndReadsBackWhole) {
+    WriteIni("[Default Parameters]\r\nLayer=LONG\r\nLisp command=(c:go)\r\nColor=5\r\n\r\n");
+    const std::string pasted = "(progn " + std::string(2143, 'x') + " (c:go))"; // 2,158 characters
+    ASSERT_EQ(pasted.size(), 2158u);
+    std::string kept, noteBefore = "?", note;
+    TestDialog first;
+    Run(first, [&](TestDialog& d) {
+        noteBefore = d.Text(IDC_SETLA_LIMIT_NOTE);
+        ::SendMessageA(d.Item(IDC_SETLA_COMMAND), EM_SETSEL, 0, -1);
+        ::SendMessageA(d.Item(IDC_SETLA_COMMAND), EM_REPLACESEL, TRUE,
+                       reinterpret_cast<LPARAM>(pasted.c_str()));
+        kept = d.Text(IDC_SETLA_COMMAND);
+        note = d.Text(IDC_SETLA_LIMIT_NOTE);
+        d.Press(IDOK);
+    });
+    EXPECT_EQ(noteBefore, "");
+    EXPECT_EQ(kept, pasted.substr(0, static_cast<std::size_t>(MaxFolderCommandChars())));
+    EXPECT_EQ(note, CommandLimitNote());
+    EXPECT_TRUE(g_alerts.empty());
+
+    // The file holds it whole, and the colour after it.
+    CIniFile file(IniPath());
+    ASSERT_TRUE(file.ReadFile());
+    EXPECT_EQ(file.GetValue("Default Parameters", "Lisp command"), kept);
+    EXPECT_EQ(file.GetValue("Default Parameters", "Color"), "5");
+    // It reopens with the command, and a later Accept is saved.
+    std::string shown;
+    TestDialog second;
+    Run(second, [&](TestDialog& d) {
+        shown = d.Text(IDC_SETLA_COMMAND);
+        d.SetText(IDC_SETLA_LAYER, "OTHER");
+        d.Press(IDOK);
+    });
+    EXPECT_EQ(shown, kept);
+    EXPECT_NE(Ini().find("Layer=OTHER\r\n"), std::string::npos);
+    EXPECT_TRUE(g_alerts.empty());
+}
+
+TEST_F(FolderSettingsDialog, ALayerNameLongerThanTheFileReadsBackIsRefused) {
+    WriteIni("[Default Parameters]\r\nLayer=LONG\r\nLisp command=(c:go)\r\nColor=5\r\n\r\n");
+    const std::string before = Ini();
+    const std::string layer(static_cast<std::size_t>(MaxFolderLayerChars()) + 1, 'L');
+    TestDialog dialog;
+    Run(dialog, [&](TestDialog& d) {
+        d.SetText(IDC_SETLA_LAYER, layer);
+        d.Press(IDOK);
+        d.Press(IDCANCEL);
+    });
+    EXPECT_EQ(g_alerts, std::vector<std::wstring>{WidenAnsi(LayerTooLongAlert(layer.size()))});
+    EXPECT_EQ(Ini(), before);
+}
+
 TEST(FolderSettingsDialogPath, ATooLongFolderIsRefusedBeforeAnythingIsCopied) {
     CDialogSetLa dialog;
     EXPECT_FALSE(dialog.SetFolder("C:\\" + std::string(245, 'd'))); // 248 + 12 = 260: one too many
