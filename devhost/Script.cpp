@@ -156,6 +156,7 @@ const CommandName kCommands[] = {
     {L"tree-count", ScriptCommand::Kind::TreeCount, true, true},
     {L"clipboard-put", ScriptCommand::Kind::ClipboardPut, false, false},
     {L"clipboard-files", ScriptCommand::Kind::ClipboardFiles, false, false},
+    {L"remove", ScriptCommand::Kind::Remove, false, false},
     {L"post", ScriptCommand::Kind::Post, true, true},
     {L"call", ScriptCommand::Kind::Call, false, false},
 };
@@ -354,6 +355,13 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
             return false;
         }
         command.text = positional[0];
+        return true;
+    case ScriptCommand::Kind::Remove:
+        if (positional.size() != 1) {
+            error = L"remove takes one file name";
+            return false;
+        }
+        command.file = positional[0];
         return true;
     case ScriptCommand::Kind::Echo:
         for (std::size_t i = 0; i < positional.size(); ++i)

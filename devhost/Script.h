@@ -60,6 +60,7 @@ struct ScriptCommand {
         TreeCount,
         ClipboardPut,
         ClipboardFiles,
+        Remove,
         Post,
         Call
     };
@@ -73,7 +74,7 @@ struct ScriptCommand {
     unsigned modifiers = 0;          // with=ctrl+shift+alt
     std::vector<KeyChord> keys;      // key
     std::wstring text;               // type, echo
-    std::wstring file;               // screenshot
+    std::wstring file;               // screenshot, remove
     int ms = 0;                      // sleep
     std::wstring treePath;           // path=: a tree item's label path, labels joined by backslashes
     int atLeast = 0;                 // tree-count: at-least=N

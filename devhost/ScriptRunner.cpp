@@ -932,6 +932,10 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
     case Kind::ClipboardFiles:
         PrintClipboardFiles();
         break;
+    case Kind::Remove:
+        // As another program would, while the explorer shows the file.
+        Fact(std::wstring(L"removed ") + (DeleteFileW(command.file.c_str()) ? L"yes" : L"no"));
+        break;
     }
     return true;
 }

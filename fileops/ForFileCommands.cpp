@@ -100,6 +100,17 @@ DropList ClipboardDropList() {
     return ReadDropList(copy.data(), copy.size(), &ToAnsiExactly);
 }
 
+namespace {
+
+// The shell's result of an operation, or kFileOpNotDone when the user said no to it.
+int Outcome(const CShellFileOp& op, int result) {
+    if (result == ERROR_CANCELLED || (result == 0 && op.Aborted()))
+        return kFileOpNotDone;
+    return result;
+}
+
+} // namespace
+
 std::vector<std::string> ClipboardFileList() {
     return ClipboardDropList().names;
 }
@@ -155,20 +166,20 @@ void ForFileCommands::TellRefused(HWND owner, const std::vector<std::u16string>&
         ::MessageBoxW(owner, text.c_str(), L"Paste", MB_OK | MB_ICONWARNING);
 }
 
-bool ForFileCommands::PasteInto(const std::string& folder, HWND owner) const {
+int ForFileCommands::PasteInto(const std::string& folder, HWND owner) const {
     const DropList list = ClipboardDropList();
     // What Paste is offered for: a list that names a drawing. Then every file of it is pasted, but for
     // those whose names the code page cannot hold: they are said, and left where they are.
     if (!DropListHoldsDrawings(list))
-        return false;
+        return kFileOpNotDone;
     if (!list.unheld.empty())
         TellRefused(owner, list.unheld);
     const std::vector<std::string>& names = list.names;
     if (names.empty())
-        return false;
+        return kFileOpNotDone;
     const bool move = g_cutSequence != 0 && g_cutSequence == ::GetClipboardSequenceNumber();
     if (folder.empty())
-        return false;
+        return kFileOpNotDone;
     CShellFileOp op;
     op.SetOwner(owner);
     for (const std::string& name : names)
@@ -183,16 +194,42 @@ bool ForFileCommands::PasteInto(const std::string& folder, HWND owner) const {
             ::EmptyClipboard();
         g_cutSequence = 0;
     }
-    return result == 0;
+    return Outcome(op, result);
 }
+
+namespace {
+
+// A rename that changes only the letters' case. The file itself answers to the new name: the shell takes
+// it for another file in the way, and a plain move may find nothing to do (Wine's does). The file goes
+// through a name of its own and back; it keeps its old name when the second step fails.
+int RenameLetterCase(const std::string& source, const std::string& destination) {
+    const std::string step = destination + ".orvex-rename";
+    if (::GetFileAttributesA(step.c_str()) != INVALID_FILE_ATTRIBUTES)
+        return ERROR_ALREADY_EXISTS;
+    if (!::MoveFileA(source.c_str(), step.c_str()))
+        return static_cast<int>(::GetLastError());
+    if (!::MoveFileA(step.c_str(), destination.c_str())) {
+        const int error = static_cast<int>(::GetLastError());
+        ::MoveFileA(step.c_str(), source.c_str());
+        return error;
+    }
+    return 0;
+}
+
+} // namespace
 
 int ForFileCommands::RenameFile(const std::string& source, const std::string& destination,
                                 CEdit* label) const {
-    CShellFileOp op;
-    op.AddName(CShellFileOp::kSource, source);
-    op.AddName(CShellFileOp::kDestination, destination);
-    // No flags: a name that is taken fails (the shell says why) instead of replacing the other file.
-    const int result = op.Rename();
+    int result = 0;
+    if (::lstrcmpiA(source.c_str(), destination.c_str()) == 0) {
+        result = RenameLetterCase(source, destination);
+    } else {
+        CShellFileOp op;
+        op.AddName(CShellFileOp::kSource, source);
+        op.AddName(CShellFileOp::kDestination, destination);
+        // No flags: a name that is taken fails (the shell says why) instead of replacing the other file.
+        result = op.Rename();
+    }
     if (result != 0 && label && label->m_hWnd) {
         const auto separator = source.find_last_of('\\');
         label->SetWindowText(separator == std::string::npos ? source : source.substr(separator + 1));
@@ -225,12 +262,12 @@ int ForFileCommands::CopyToFile(const std::string& source, HWND owner) const {
 
 int DeleteFiles(HWND owner, const std::vector<std::string>& paths) {
     if (paths.empty())
-        return 1;
+        return kFileOpNotDone;
     CShellFileOp op;
     op.SetOwner(owner);
     for (const std::string& path : paths)
         op.AddName(CShellFileOp::kSource, path);
-    return op.Delete();
+    return Outcome(op, op.Delete());
 }
 
 namespace {

@@ -20,14 +20,19 @@
 
 class CEdit;
 
+// What a file operation returns when nothing was done on purpose (the user said no, nothing to do).
+constexpr int kFileOpNotDone = -1;
+
 class ForFileCommands {
 public:
     // True when the clipboard's file list names at least one drawing (".dwg", case ignored), names the
     // code page cannot hold included.
     bool ClipboardHoldsDrawings() const;
-    // Pastes the clipboard's files into folder (copy, or move after a cut); true when the shell did it. A list without a drawing pastes nothing. Names the code page cannot hold (a wide list)
-    // are not pasted: the user is told which (tellUser, else a message box over owner), and the rest is.
-    bool PasteInto(const std::string& folder, HWND owner) const;
+    // Pastes the clipboard's files into folder (copy, or move after a cut): 0 when the shell did it,
+    // kFileOpNotDone when there was nothing to paste or the user said no, else the shell's error. A list
+    // without a drawing pastes nothing. Names the code page cannot hold (a wide list) are not pasted: the
+    // user is told which (tellUser, else a message box over owner), and the rest is.
+    int PasteInto(const std::string& folder, HWND owner) const;
 
     // How a paste tells the user what it refused; unset: a message box.
     std::function<void(const std::wstring& text)> tellUser;
@@ -52,8 +57,8 @@ std::string PasteRefusedMessage(std::size_t count);
 // next paste. False when the clipboard could not be opened.
 bool PutFileListOnClipboard(const std::vector<std::string>& paths, bool cut);
 
-// Deletes the files (full paths) to the Recycle Bin (the shell confirms); the shell's result, or a
-// non-zero value for an empty list.
+// Deletes the files (full paths) to the Recycle Bin (the shell confirms): 0 when done, kFileOpNotDone for
+// an empty list or when the user said no, else the shell's error.
 int DeleteFiles(HWND owner, const std::vector<std::string>& paths);
 // Opens the shell's property sheet of the file at path.
 bool ShowFileProperties(const std::string& path);

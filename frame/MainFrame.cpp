@@ -57,6 +57,40 @@ int SortModeOf(UINT id) {
 
 } // namespace
 
+bool IsEditingKey(UINT vk, bool ctrl, bool shift, bool alt) {
+    if (ctrl && !alt && !shift)
+        return vk == 'A' || vk == 'C' || vk == 'X' || vk == 'V' || vk == 'Z' || vk == VK_INSERT;
+    if (shift && !ctrl && !alt)
+        return vk == VK_INSERT || vk == VK_DELETE;
+    if (alt && !ctrl && !shift)
+        return vk == VK_BACK;
+    return !ctrl && !shift && !alt && vk == VK_DELETE;
+}
+
+namespace {
+
+bool IsHeld(int vk) {
+    return (::GetKeyState(vk) & 0x8000) != 0;
+}
+
+// An edit box that takes typing: the search edit, a label being renamed.
+bool IsWritableEdit(HWND window) {
+    char name[16] = "";
+    return window && ::GetClassNameA(window, name, sizeof name) && ::lstrcmpiA(name, "Edit") == 0 &&
+           !(::GetWindowLongPtrA(window, GWL_STYLE) & ES_READONLY);
+}
+
+} // namespace
+
+bool CMainFrame::PreTranslateMessage(MSG* pMsg) {
+    // In an edit box Ctrl+A selects its text, Ctrl+V pastes text into it, and so on, as in every edit box:
+    // those keys must not reach the drawings (select all, copy, paste files into the folder).
+    if ((pMsg->message == WM_KEYDOWN || pMsg->message == WM_SYSKEYDOWN) && IsWritableEdit(::GetFocus()) &&
+        IsEditingKey(static_cast<UINT>(pMsg->wParam), IsHeld(VK_CONTROL), IsHeld(VK_SHIFT), IsHeld(VK_MENU)))
+        return false;
+    return CFrameWnd::PreTranslateMessage(pMsg);
+}
+
 std::string ExplorerTitle(const std::string& windowText) {
     static const std::string untitled = "Untitled";
     std::string text = windowText;
@@ -310,6 +344,8 @@ CView* CMainFrame::MakeGridView() {
     return grid;
 }
 
+static_assert(kFileOpNotDone == kFileCommandNotDone, "the grid and the file operations agree on 'not done'");
+
 bool ExplorerFileCommands::ClipboardHoldsDrawings() {
     return ForFileCommands().ClipboardHoldsDrawings();
 }
@@ -318,12 +354,12 @@ void ExplorerFileCommands::Copy(const std::vector<std::string>& paths, bool cut)
     PutFileListOnClipboard(paths, cut);
 }
 
-bool ExplorerFileCommands::Paste(const std::string& folder) {
+int ExplorerFileCommands::Paste(const std::string& folder) {
     return ForFileCommands().PasteInto(folder, m_owner);
 }
 
-void ExplorerFileCommands::Delete(const std::vector<std::string>& paths) {
-    DeleteFiles(m_owner, paths);
+int ExplorerFileCommands::Delete(const std::vector<std::string>& paths) {
+    return DeleteFiles(m_owner, paths);
 }
 
 int ExplorerFileCommands::Rename(const std::string& source, const std::string& destination) {

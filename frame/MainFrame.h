@@ -35,8 +35,8 @@ public:
 
     bool ClipboardHoldsDrawings() override;
     void Copy(const std::vector<std::string>& paths, bool cut) override;
-    bool Paste(const std::string& folder) override;
-    void Delete(const std::vector<std::string>& paths) override;
+    int Paste(const std::string& folder) override;
+    int Delete(const std::vector<std::string>& paths) override;
     int Rename(const std::string& source, const std::string& destination) override;
     void ShowProperties(const std::string& path) override;
 
@@ -98,6 +98,9 @@ public:
     static HFONT LabelFont();
     CSize MeasureLabelText(const std::string& text);
 
+    // The frame's accelerators, but for the keys an edit box uses on its text while one has the focus.
+    bool PreTranslateMessage(MSG* pMsg) override;
+
 protected:
     int OnCreate(LPCREATESTRUCTA cs) override;
     void OnDestroy() override;
@@ -156,6 +159,10 @@ constexpr UINT kPickToolBarId = AFX_IDW_TOOLBAR + 4;
 extern const char* const kExplorerTitle;
 // The caption of the explorer's message boxes.
 extern const char* const kExplorerMessageCaption;
+
+// Whether the key is one an edit box acts on its text with (select all, copy, cut, paste, undo, delete),
+// given which of Ctrl, Shift and Alt are held.
+bool IsEditingKey(UINT vk, bool ctrl, bool shift, bool alt);
 
 // The window title with "Untitled" replaced by the product name.
 std::string ExplorerTitle(const std::string& windowText);

@@ -139,8 +139,9 @@ CMainFrame* CMdiMixin::ExplorerFrame() const {
 bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // 1. The document reads the explorer's settings; it lives until the LISP function ends the run.
     auto* doc = new CTessel3Doc();
-    // The drawing chosen in the last run, before the first folder shown drops it.
+    // The drawing chosen in the last run and its folder, before the first folder shown drops them.
     const std::string saved = doc->m_strName;
+    const std::string savedFolder = doc->m_strPath;
     m_pFolder = std::make_unique<DrawingFolder>(m_folderReader, doc);
     // 2. The frame deletes itself when its window is destroyed; its views are given the document, and it
     // speaks for the folder model while it stands.
@@ -196,8 +197,9 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // 8. The drawing of the last run is chosen again: its name starts the search, and the drawing itself is
     // selected (the search may have found another name first). It stays the current drawing, so accept
     // takes it; when the folder no longer holds it, nothing is chosen.
+    // Only in the folder it was chosen in: another folder's drawing of the same name is another drawing.
     CEditSearch& search = frame->GetSearchEdit();
-    if (search.m_hWnd && !saved.empty()) {
+    if (search.m_hWnd && !saved.empty() && DrawingFolder::SameFolder(savedFolder, m_pFolder->Folder())) {
         search.SetWindowText(SearchTextOf(saved));
         if (CTessel3View* grid = frame->GetGridView())
             grid->ChooseDrawing(saved);

@@ -84,6 +84,11 @@ std::string DrawingFolder::Join(const std::string& folder, const std::string& na
     return path + name;
 }
 
+bool DrawingFolder::SameFolder(const std::string& a, const std::string& b) {
+    const std::string one = Spelling(a);
+    return !one.empty() && CompareNamesNoCase(one, Spelling(b)) == 0;
+}
+
 // ---- the folder shown ----------------------------------------------------------------------------------
 
 bool DrawingFolder::Show(const std::string& folder) {

@@ -107,6 +107,8 @@ public:
     static std::string Spelling(const std::string& folder);
     // A name inside folder, folder being in its one spelling.
     static std::string Join(const std::string& folder, const std::string& name);
+    // Whether two paths name the same folder as written: case and a separator at the end aside.
+    static bool SameFolder(const std::string& a, const std::string& b);
 
 private:
     void Fill(std::vector<DwgData>&& drawings);

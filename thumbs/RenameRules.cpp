@@ -45,8 +45,10 @@ RenameVerdict CheckRename(const std::string& folder, const std::string& oldName,
                           const std::function<bool(const std::string&)>& exists) {
     if (newName.empty())
         return RenameVerdict::Empty;
-    if (newName == oldName || CompareNamesNoCase(newName, oldName) == 0)
+    if (newName == oldName)
         return RenameVerdict::Unchanged;
+    // The same name in other letters' case: the file itself answers to it, it is no other file.
+    const bool caseOnly = CompareNamesNoCase(newName, oldName) == 0;
     if (HasBadCharacter(newName))
         return RenameVerdict::BadCharacter;
     if (!IsDrawingName(newName))
@@ -56,7 +58,7 @@ RenameVerdict CheckRename(const std::string& folder, const std::string& oldName,
     // A file system keeps at most 255 characters in one name.
     if (newName.size() > 255 || !FullPathFits(folder, newName))
         return RenameVerdict::TooLong;
-    if (exists && exists(newName))
+    if (!caseOnly && exists && exists(newName))
         return RenameVerdict::Exists;
     return RenameVerdict::Rename;
 }

@@ -8,7 +8,7 @@
 
 enum class RenameVerdict {
     Rename,       // go ahead
-    Unchanged,    // the same name (case ignored): nothing to do, nothing to say
+    Unchanged,    // the very same name: nothing to do, nothing to say (a change of case alone is a rename)
     Empty,        // no name at all
     BadCharacter, // \ / : * ? " < > | or a control character
     DeviceName,   // CON, PRN, AUX, NUL, COM1-9, LPT1-9, with or without extension

@@ -189,7 +189,8 @@ void CTessel3View::ShowIndex(int index) {
     }
     RedrawHold hold(m_hWnd);
     ScrollToBegin(false);
-    m_nFirstRow = index / std::max(1, m_nColumns);
+    // Into view, but never past the grid's end: the rows before stay in reach when all would fit.
+    m_nFirstRow = std::min(index / std::max(1, m_nColumns), grid::EndFirstRow(m_nRows, m_nVisibleRows));
     Relayout();
 }
 
@@ -205,6 +206,11 @@ void CTessel3View::DeselectAll() {
 void CTessel3View::SelectAll() {
     if (m_pFolder)
         m_pFolder->SelectAll();
+    // Every label on screen shows it; rows made later show it from the records.
+    for (const auto& control : m_pool) {
+        if (control->m_hWnd)
+            control->ShowSelection();
+    }
 }
 
 void CTessel3View::Increase() {
@@ -246,18 +252,52 @@ void CTessel3View::CopySelection(bool cut) {
 }
 
 void CTessel3View::PasteFiles() {
-    if (m_pFileCommands && m_pFolder && m_pFileCommands->Paste(m_pFolder->Folder()))
-        PostRefresh();
+    if (!m_pFileCommands || !m_pFolder)
+        return;
+    const std::string folder = m_pFolder->Folder();
+    AfterFileCommand(m_pFileCommands->Paste(folder), FileCommand::Paste, folder, {});
 }
 
 void CTessel3View::DeleteSelection() {
     if (!m_pFileCommands || !m_pFolder)
         return;
-    const std::vector<std::string> paths = m_pFolder->SelectedPaths();
-    if (paths.empty())
+    std::vector<std::string> names;
+    for (int i = 0; i < m_pFolder->Count(); ++i)
+        if (m_pFolder->IsSelected(i))
+            names.push_back(m_pFolder->Drawing(i).m_strName);
+    if (names.empty())
         return;
-    m_pFileCommands->Delete(paths);
+    const std::string subject =
+        names.size() == 1 ? "\"" + names[0] + "\"" : std::to_string(names.size()) + " drawings";
+    AfterFileCommand(m_pFileCommands->Delete(m_pFolder->SelectedPaths()), FileCommand::Delete, subject,
+                     names);
+}
+
+void CTessel3View::AfterFileCommand(int result, FileCommand command, const std::string& subject,
+                                    const std::vector<std::string>& names) {
+    if (result == kFileCommandNotDone || result == ERROR_CANCELLED)
+        return;
+    // Done or not, the grid shows what is on disk (the message below runs its own loop: the folder is read
+    // again while the user reads it).
     PostRefresh();
+    if (result == 0 || !m_pFolder)
+        return;
+    FileCommandFailure why;
+    why.error = result;
+    const std::string& folder = m_pFolder->Folder();
+    if (::GetFileAttributesA(folder.c_str()) == INVALID_FILE_ATTRIBUTES) {
+        why.missing = folder;
+    } else {
+        for (const std::string& name : names) {
+            if (::GetFileAttributesA(DrawingFolder::Join(folder, name).c_str()) == INVALID_FILE_ATTRIBUTES) {
+                why.missing = name;
+                break;
+            }
+        }
+    }
+    // Access denied, write protected, or the shell's own code for a source it may not touch.
+    why.readOnly = result == ERROR_ACCESS_DENIED || result == ERROR_WRITE_PROTECT || result == 0x78;
+    TellUser(FileCommandFailureText(command, subject, why));
 }
 
 ThumbnailOwner::RenameOutcome CTessel3View::RenameDrawing(const std::string& oldName,
@@ -273,13 +313,14 @@ ThumbnailOwner::RenameOutcome CTessel3View::RenameDrawing(const std::string& old
             TellUser(RenameRefusalText(verdict, newName));
         return RenameOutcome::Refused;
     }
-    // The shell's loop runs inside: the grid may re-create its controls meanwhile.
-    if (!m_pFileCommands || m_pFileCommands->Rename(DrawingFolder::Join(folder, oldName),
-                                                    DrawingFolder::Join(folder, newName)) != 0)
+    if (!m_pFileCommands)
         return RenameOutcome::Refused;
-    // The rescan rebuilds the grid, which destroys the label: it runs once this message is done.
-    PostRefresh();
-    return RenameOutcome::Renamed;
+    // The shell's loop runs inside: the grid may re-create its controls meanwhile. The rescan that follows
+    // rebuilds the grid, which destroys the label: it runs once this message is done.
+    const int result =
+        m_pFileCommands->Rename(DrawingFolder::Join(folder, oldName), DrawingFolder::Join(folder, newName));
+    AfterFileCommand(result, FileCommand::Rename, oldName, {oldName});
+    return result == 0 ? RenameOutcome::Renamed : RenameOutcome::Refused;
 }
 
 void CTessel3View::ShowProperties(int index) {
@@ -309,11 +350,20 @@ void CTessel3View::SelectAndChoose(int index, bool clearOthers) {
     SetStatusText(std::string()); // a search's "no drawing starts with" is over
 }
 
-void CTessel3View::OnThumbnailMouseDown() {
-    // A click in the grid takes the keyboard there (from the folder tree, the search edit).
-    HWND focus = ::GetFocus();
-    if (m_hWnd && focus != m_hWnd && !::IsChild(m_hWnd, focus))
+void CTessel3View::TakeFocusFromElsewhere() {
+    // From the folder tree, the search edit, or a label being renamed: a click outside the label ends the
+    // rename and gives the old name back (the label does so when it loses the focus).
+    if (m_hWnd && ::GetFocus() != m_hWnd)
         ::SetFocus(m_hWnd);
+}
+
+void CTessel3View::OnThumbnailMouseDown() {
+    TakeFocusFromElsewhere();
+}
+
+void CTessel3View::OnLButtonDown(UINT, CPoint) {
+    TakeFocusFromElsewhere();
+    Default();
 }
 
 void CTessel3View::OnThumbnailClick(int index, bool toggle) {

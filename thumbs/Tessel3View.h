@@ -16,6 +16,7 @@
 
 #include "framework/afxview.h"
 #include "thumbs/DwgThumbnail.h"
+#include "thumbs/FileCommandText.h"
 #include "thumbs/GridMath.h"
 
 #include <functional>
@@ -27,6 +28,10 @@ class CTessel3Doc;
 class CTessel3View;
 class DrawingFolder;
 
+// What a file command returns when nothing was done on purpose (the user said no, nothing to do); 0 is
+// done, anything else the system's error.
+constexpr int kFileCommandNotDone = -1;
+
 // The file commands the grid offers in its menus and keys, carried out by its owner's file operations.
 // Paths are full; the folder is the one shown.
 class GridFileCommands {
@@ -35,11 +40,11 @@ public:
     virtual bool ClipboardHoldsDrawings() = 0;
     // Puts the drawings on the clipboard (cut: the next paste moves them).
     virtual void Copy(const std::vector<std::string>& paths, bool cut) = 0;
-    // Pastes the clipboard's files into folder; true when files were pasted.
-    virtual bool Paste(const std::string& folder) = 0;
+    // Pastes the clipboard's files into folder.
+    virtual int Paste(const std::string& folder) = 0;
     // Sends the drawings to the Recycle Bin, the shell confirming.
-    virtual void Delete(const std::vector<std::string>& paths) = 0;
-    // Renames a file; the shell's result, 0 when it was renamed.
+    virtual int Delete(const std::vector<std::string>& paths) = 0;
+    // Renames a file.
     virtual int Rename(const std::string& source, const std::string& destination) = 0;
     // The shell's property sheet of a file.
     virtual void ShowProperties(const std::string& path) = 0;
@@ -105,7 +110,7 @@ public:
     void ShowIndex(int index);
     // Clears every selection, records and live controls.
     void DeselectAll();
-    // Marks every record selected (labels already shown keep their look).
+    // Marks every drawing selected, and every label shows it.
     void SelectAll();
     void Increase();
     void Decrease();
@@ -174,6 +179,7 @@ protected:
     void OnSize(UINT type, int cx, int cy) override;
     void OnKeyDown(UINT nChar, UINT repeat, UINT flags) override;
     void OnRButtonDown(UINT flags, CPoint pt) override;
+    void OnLButtonDown(UINT flags, CPoint pt) override;
     bool OnEraseBkgnd(CDC* pDC) override;
     void OnDestroy() override;
     bool OnCmdMsg(UINT id, int code) override;
@@ -188,6 +194,10 @@ private:
     void OnThumbnailMouseDown() override;
     RenameOutcome OnThumbnailRename(const std::string& oldName, const std::string& newName) override;
     void RunThumbnailCommand(int index, int command);
+    void TakeFocusFromElsewhere();
+    // After a file command: the folder is read again; a failure is said (names: the drawings it was for).
+    void AfterFileCommand(int result, FileCommand command, const std::string& subject,
+                          const std::vector<std::string>& names);
     // Makes the drawing selected and chosen; clearOthers first drops every other selection.
     void SelectAndChoose(int index, bool clearOthers);
     int DrawingCount() const;

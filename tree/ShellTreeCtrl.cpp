@@ -71,12 +71,6 @@ void CopyLabel(TVITEMA& item, const std::string& label, bool wideText) {
     wide[item.cchTextMax - 1] = L'\0';
 }
 
-// Whether two paths name the same folder as written: case, the kind of separator and a trailing one aside.
-bool SameFolderPath(const std::string& a, const std::string& b) {
-    const std::string one = DrawingFolder::Spelling(a);
-    return !one.empty() && ::lstrcmpiA(one.c_str(), DrawingFolder::Spelling(b).c_str()) == 0;
-}
-
 } // namespace
 
 CShellTreeCtrl::CShellTreeCtrl() = default;
@@ -343,7 +337,7 @@ void CShellTreeCtrl::WalkToStart() {
         ExpandToLabelPath(m_pDoc->m_strShellPath, false);
     HTREEITEM target = m_hPathTarget;
     if (target) {
-        const bool shown = SameFolderPath(FolderPathOf(target), shownFolder);
+        const bool shown = DrawingFolder::SameFolder(FolderPathOf(target), shownFolder);
         SelectItem(nullptr); // the target may be the item the control chose on its own: selected anew
         SelectSetFirstVisible(target);
         SelectDropTarget(target);

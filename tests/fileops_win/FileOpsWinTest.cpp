@@ -295,7 +295,7 @@ TEST(Clipboard, ATextFileThenADrawingOffersPasteAndPastesBoth) {
     ASSERT_TRUE(PutFileListOnClipboard({a, b}, false));
     ForFileCommands commands;
     EXPECT_TRUE(commands.ClipboardHoldsDrawings());
-    EXPECT_TRUE(commands.PasteInto(target, nullptr));
+    EXPECT_EQ(commands.PasteInto(target, nullptr), 0);
     EXPECT_EQ(ReadFile(target + "\\notes.txt"), "text");
     EXPECT_EQ(ReadFile(target + "\\PLAN.DWG"), "drawing");
     // A copy leaves the sources and the list.
@@ -314,7 +314,7 @@ TEST(Clipboard, AWideListFromAnotherProgramOffersPasteAndIsPasted) {
     EXPECT_TRUE(commands.ClipboardHoldsDrawings());
     EXPECT_EQ(ClipboardFileList(), (std::vector<std::string>{a, b}));
     EXPECT_TRUE(ClipboardDropList().wide);
-    EXPECT_TRUE(commands.PasteInto(target, nullptr));
+    EXPECT_EQ(commands.PasteInto(target, nullptr), 0);
     EXPECT_EQ(ReadFile(target + "\\a.dwg"), "drawing");
     EXPECT_EQ(ReadFile(target + "\\notes.txt"), "text");
 }
@@ -362,7 +362,7 @@ TEST(Clipboard, AWideNameTheCodePageCannotHoldIsSaidAndNeverPastedUnderAnotherNa
     PutWideList({Wide(plan), unheld});
     EXPECT_TRUE(commands.ClipboardHoldsDrawings());
     EXPECT_EQ(ClipboardFileList(), std::vector<std::string>{plan});
-    EXPECT_TRUE(commands.PasteInto(target, nullptr));
+    EXPECT_EQ(commands.PasteInto(target, nullptr), 0);
     EXPECT_EQ(NamesIn(Wide(target)), std::vector<std::wstring>{L"plan.dwg"}) << "nothing under another name";
     const std::string first = PasteRefusedMessage(1);
     EXPECT_EQ(told, std::vector<std::wstring>{std::wstring(first.begin(), first.end()) + L"\n" + unheld});
@@ -372,7 +372,7 @@ TEST(Clipboard, AWideNameTheCodePageCannotHoldIsSaidAndNeverPastedUnderAnotherNa
     const std::string empty = folder.MakeDir("empty");
     PutWideList({unheld});
     EXPECT_TRUE(commands.ClipboardHoldsDrawings());
-    EXPECT_FALSE(commands.PasteInto(empty, nullptr));
+    EXPECT_EQ(commands.PasteInto(empty, nullptr), kFileOpNotDone);
     EXPECT_EQ(told.size(), 1u);
     EXPECT_TRUE(NamesIn(Wide(empty)).empty());
 }
@@ -380,7 +380,7 @@ TEST(Clipboard, AWideNameTheCodePageCannotHoldIsSaidAndNeverPastedUnderAnotherNa
 TEST(Clipboard, NoFileListOffersNoPaste) {
     EmptyTheClipboard();
     EXPECT_FALSE(ForFileCommands().ClipboardHoldsDrawings());
-    EXPECT_FALSE(ForFileCommands().PasteInto("C:\\", nullptr));
+    EXPECT_EQ(ForFileCommands().PasteInto("C:\\", nullptr), kFileOpNotDone);
     ASSERT_TRUE(PutFileListOnClipboard({"C:\\x\\notes.txt"}, false));
     EXPECT_FALSE(ForFileCommands().ClipboardHoldsDrawings());
 }
@@ -390,7 +390,7 @@ TEST(Clipboard, CutThenPasteMovesAndEmptiesTheClipboard) {
     const std::string a = folder.Write("a.dwg", "drawing");
     const std::string target = folder.MakeDir("target");
     ASSERT_TRUE(PutFileListOnClipboard({a}, true));
-    EXPECT_TRUE(ForFileCommands().PasteInto(target, nullptr));
+    EXPECT_EQ(ForFileCommands().PasteInto(target, nullptr), 0);
     EXPECT_EQ(ReadFile(target + "\\a.dwg"), "drawing");
     EXPECT_FALSE(folder.Exists("a.dwg"));
     EXPECT_TRUE(ClipboardFileList().empty());
@@ -402,7 +402,7 @@ TEST(Clipboard, ACutReplacedOnTheClipboardIsNoLongerAMove) {
     const std::string target = folder.MakeDir("target");
     ASSERT_TRUE(PutFileListOnClipboard({a}, true));
     ASSERT_TRUE(PutFileListOnClipboard({a}, false)); // a copy after the cut
-    EXPECT_TRUE(ForFileCommands().PasteInto(target, nullptr));
+    EXPECT_EQ(ForFileCommands().PasteInto(target, nullptr), 0);
     EXPECT_TRUE(folder.Exists("a.dwg"));
     EXPECT_TRUE(folder.Exists("target\\a.dwg"));
 }
@@ -458,7 +458,7 @@ TEST(Selection, DeleteSendsTheSelectedDrawingsToTheTrash) {
 TEST(Selection, DeleteWithoutSelectionAsksNothing) {
     ListWithSelection("C:\\dwg", {"a.dwg"}, {false});
     DialogAnswer yes(IDYES);
-    EXPECT_NE(DeleteFiles(nullptr, Shown().SelectedPaths()), 0);
+    EXPECT_EQ(DeleteFiles(nullptr, Shown().SelectedPaths()), kFileOpNotDone);
     EXPECT_TRUE(DialogAnswer::Seen().empty());
 }
 

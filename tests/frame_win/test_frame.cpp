@@ -502,7 +502,8 @@ TEST_F(ExplorerFrame, AcceptNeedsAChosenDrawing) {
 }
 
 TEST_F(ExplorerFrame, SavedDrawingNameStartsTheSearch) {
-    WriteSettings("[CurrentPath]\r\nName=plan-b.dwg\r\n");
+    // In the folder it was chosen in, which the explorer opens on.
+    WriteSettings("[CurrentPath]\r\nPath=" + TempFolder("orvex-frame-saved") + "\r\nName=plan-b.dwg\r\n");
     RunDialog dialog;
     std::string text;
     dialog.steps.push_back([&](CMainFrame& frame) {
@@ -515,7 +516,8 @@ TEST_F(ExplorerFrame, SavedDrawingNameStartsTheSearch) {
 
 TEST_F(ExplorerFrame, SavedDrawingNameOfAnyLengthStartsTheSearch) {
     const std::string stem(1500, 'p'); // far beyond a file-name buffer, within an ini line
-    WriteSettings("[CurrentPath]\r\nName=C:\\x\\" + stem + ".dwg\r\n");
+    WriteSettings("[CurrentPath]\r\nPath=" + TempFolder("orvex-frame-saved-long") + "\r\nName=C:\\x\\" +
+                  stem + ".dwg\r\n");
     RunDialog dialog;
     std::string text;
     dialog.steps.push_back([&](CMainFrame& frame) {
@@ -524,6 +526,28 @@ TEST_F(ExplorerFrame, SavedDrawingNameOfAnyLengthStartsTheSearch) {
     });
     EXPECT_EQ(Run(dialog), 2);
     EXPECT_EQ(text, stem);
+}
+
+TEST_F(ExplorerFrame, TheDrawingOfTheLastRunIsChosenOnlyInItsOwnFolder) {
+    const std::string saved = TempFolder("orvex-frame-saved-here");
+    const std::string other = TempFolder("orvex-frame-saved-other");
+    for (const std::string& folder : {saved, other})
+        std::ofstream(folder + "\\plan.dwg", std::ios::binary) << "";
+    WriteSettings("[CurrentPath]\r\nPath=" + saved + "\r\nName=plan.dwg\r\n");
+    g_call.startPath = other + "\\";
+    RunDialog dialog;
+    std::string text;
+    int chosen = 0;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        text = frame.GetSearchEdit().GetWindowText();
+        chosen = g_app.Folder() ? g_app.Folder()->Chosen() : 0;
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(text, "") << "another folder's plan.dwg is another drawing";
+    EXPECT_EQ(chosen, -1);
+    std::remove((saved + "\\plan.dwg").c_str());
+    std::remove((other + "\\plan.dwg").c_str());
 }
 
 TEST_F(ExplorerFrame, HostFrameIsDisabledWhileTheExplorerIsOpen) {

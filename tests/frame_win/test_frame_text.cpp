@@ -4,6 +4,20 @@
 
 #include <gtest/gtest.h>
 
+TEST(EditingKeys, TheKeysAnEditBoxUsesOnItsText) {
+    for (UINT vk : {UINT('A'), UINT('C'), UINT('X'), UINT('V'), UINT('Z'), UINT(VK_INSERT)})
+        EXPECT_TRUE(IsEditingKey(vk, true, false, false)) << vk;
+    EXPECT_TRUE(IsEditingKey(VK_INSERT, false, true, false));
+    EXPECT_TRUE(IsEditingKey(VK_DELETE, false, true, false));
+    EXPECT_TRUE(IsEditingKey(VK_DELETE, false, false, false));
+    EXPECT_TRUE(IsEditingKey(VK_BACK, false, false, true));
+    // The explorer's own keys stay the frame's.
+    EXPECT_FALSE(IsEditingKey(VK_F6, false, false, false));
+    EXPECT_FALSE(IsEditingKey('N', true, false, false));
+    EXPECT_FALSE(IsEditingKey('A', true, true, false));
+    EXPECT_FALSE(IsEditingKey('A', false, false, false));
+}
+
 TEST(FramePlacement, CentredDialogAtTheTopLeftWithNoStoredSizeMaximises) {
     const FramePlacement place = PlaceFrame(RECT{0, 0, 0, 0}, 0, 0);
     EXPECT_TRUE(place.maximised);

@@ -225,3 +225,10 @@ TEST_F(DrawingFolderTest, WithoutADocumentNothingIsKeptButTheFolderWorks) {
     alone.Choose(2);
     EXPECT_EQ(alone.ChosenPath(), "C:\\dwg\\b.dwg");
 }
+
+TEST(DrawingFolderSameFolder, CaseAndASeparatorAtTheEndAside) {
+    EXPECT_TRUE(DrawingFolder::SameFolder("C:\\Dwg\\", "c:\\dwg"));
+    EXPECT_TRUE(DrawingFolder::SameFolder("C:\\", "c:"));
+    EXPECT_FALSE(DrawingFolder::SameFolder("C:\\dwg", "C:\\dwg2"));
+    EXPECT_FALSE(DrawingFolder::SameFolder("", ""));
+}

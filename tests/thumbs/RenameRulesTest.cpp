@@ -23,8 +23,14 @@ TEST(RenameRules, APlainDrawingNameIsRenamed) {
 
 TEST(RenameRules, TheSameNameIsNoRename) {
     EXPECT_EQ(Check("plan.dwg"), RenameVerdict::Unchanged);
-    EXPECT_EQ(Check("PLAN.DWG"), RenameVerdict::Unchanged);
     EXPECT_EQ(RenameRefusalText(RenameVerdict::Unchanged, "plan.dwg"), "");
+}
+
+TEST(RenameRules, AChangeOfLetterCaseAloneIsARenameEvenThoughTheFileAnswersToTheName) {
+    // A case-insensitive file system finds the file itself under the new name.
+    EXPECT_EQ(Check("PLAN.DWG", {"PLAN.DWG", "plan.dwg"}), RenameVerdict::Rename);
+    EXPECT_EQ(Check("Plan.dwg", {"Plan.dwg"}), RenameVerdict::Rename);
+    EXPECT_EQ(Check("PLAN.DWG.DWG", {"PLAN.DWG.DWG"}), RenameVerdict::Exists);
 }
 
 TEST(RenameRules, ForbiddenCharactersAreRefused) {

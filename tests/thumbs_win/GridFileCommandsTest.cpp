@@ -21,11 +21,14 @@ struct FileCalls : GridFileCommands {
 
     bool ClipboardHoldsDrawings() override { return holdsDrawings; }
     void Copy(const std::vector<std::string>&, bool cut) override { calls.push_back(cut ? "cut" : "copy"); }
-    bool Paste(const std::string&) override {
+    int Paste(const std::string&) override {
         calls.push_back("paste");
-        return pasteSucceeds;
+        return pasteSucceeds ? 0 : kFileCommandNotDone;
     }
-    void Delete(const std::vector<std::string>&) override { calls.push_back("delete"); }
+    int Delete(const std::vector<std::string>&) override {
+        calls.push_back("delete");
+        return 0;
+    }
     int Rename(const std::string&, const std::string&) override {
         calls.push_back("rename");
         return 0;
@@ -152,6 +155,51 @@ TEST(GridFileMenu, TheFramesCopyCutAndPasteReachTheFileCommands) {
     Pump();
     EXPECT_EQ(record.calls, (std::vector<std::string>{"copy", "cut", "paste"}));
     EXPECT_EQ(record.refreshes, 1);
+}
+
+TEST(GridFileMenu, AFailedCommandSaysWhyAndShowsTheFolderAsItIs) {
+    GridBench bench;
+    FillList(3, "C:\\");
+    bench.view().Rebuild();
+    Pump();
+    struct Refusing : FileCalls {
+        int Delete(const std::vector<std::string>&) override { return ERROR_ACCESS_DENIED; }
+        int Paste(const std::string&) override { return 1234; }
+    } record;
+    Wire(bench.view(), record);
+    DwgList[1].Select();
+    Frame().toldUser.clear();
+    bench.view().DeleteSelection();
+    Pump();
+    EXPECT_EQ(record.refreshes, 1) << "the folder is read again";
+    ASSERT_EQ(Frame().toldUser.size(), 1u);
+    // C:\ holds no d00001.dwg: that is the reason found first.
+    EXPECT_EQ(Frame().toldUser[0],
+              "Cannot delete \"d00001.dwg\": d00001.dwg no longer exists. The folder is shown as it is now.");
+    bench.view().PasteFiles();
+    Pump();
+    EXPECT_EQ(record.refreshes, 2);
+    ASSERT_EQ(Frame().toldUser.size(), 2u);
+    EXPECT_EQ(Frame().toldUser[1],
+              "Cannot paste into \"C:\\\": the system refused it (error 1234). The folder "
+              "is shown as it is now.");
+}
+
+TEST(GridFileMenu, ACommandTheUserSaidNoToIsNotAFailure) {
+    GridBench bench;
+    FillList(3);
+    bench.view().Rebuild();
+    Pump();
+    struct SaysNo : FileCalls {
+        int Delete(const std::vector<std::string>&) override { return kFileCommandNotDone; }
+    } record;
+    Wire(bench.view(), record);
+    DwgList[0].Select();
+    Frame().toldUser.clear();
+    bench.view().DeleteSelection();
+    Pump();
+    EXPECT_EQ(record.refreshes, 0);
+    EXPECT_TRUE(Frame().toldUser.empty());
 }
 
 TEST(GridFileMenu, ThumbnailMenuGreysPasteUnlessTheClipboardHoldsDrawings) {

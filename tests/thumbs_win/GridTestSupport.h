@@ -34,11 +34,14 @@ struct BenchFileCommands : GridFileCommands {
     std::vector<std::string> calls;
     bool ClipboardHoldsDrawings() override { return false; }
     void Copy(const std::vector<std::string>&, bool cut) override { calls.push_back(cut ? "cut" : "copy"); }
-    bool Paste(const std::string&) override {
+    int Paste(const std::string&) override {
         calls.push_back("paste");
-        return false;
+        return kFileCommandNotDone;
     }
-    void Delete(const std::vector<std::string>&) override { calls.push_back("delete"); }
+    int Delete(const std::vector<std::string>&) override {
+        calls.push_back("delete");
+        return 0;
+    }
     int Rename(const std::string& source, const std::string& destination) override;
     void ShowProperties(const std::string& path) override { calls.push_back("properties " + path); }
 };

@@ -540,15 +540,62 @@ TEST(GridKeys, KeysOnAThumbnailReachTheGrid) {
     EXPECT_EQ(::GetFocus(), bench.view().m_hWnd);
 }
 
-TEST(GridSelection, SelectAllMarksEveryRecord) {
+// The label of a control shows its whole text selected.
+bool ShowsSelected(exCDwgThumbnail& control) {
+    int start = 0, end = 0;
+    control.Label().GetSel(start, end);
+    return start == 0 && end == control.Label().GetWindowTextLength() && end > 0;
+}
+
+TEST(GridSelection, SelectAllMarksEveryRecordAndEveryLabelOnScreenShowsIt) {
     GridBench bench(700, 600);
     FillList(40);
     bench.view().Rebuild();
+    Pump();
     bench.view().SendMessage(WM_COMMAND, ID_SELECT_ALL);
     for (int i = 0; i < DwgList.GetSize(); ++i)
         EXPECT_TRUE(DwgList[i].IsSelected());
+    int shown = 0;
+    for (int i = 0; i < DwgList.GetSize(); ++i) {
+        if (exCDwgThumbnail* control = bench.view().ControlOf(i)) {
+            ++shown;
+            EXPECT_TRUE(ShowsSelected(*control)) << i;
+        }
+    }
+    EXPECT_GT(shown, 6);
     bench.view().DeselectAll();
     EXPECT_FALSE(AnySelected());
+    for (int i = 0; i < DwgList.GetSize(); ++i) {
+        if (exCDwgThumbnail* control = bench.view().ControlOf(i)) {
+            EXPECT_FALSE(ShowsSelected(*control)) << i;
+        }
+    }
+}
+
+TEST(GridSearch, AHitWhoseRowsAllFitTheWindowHidesNothingBeforeIt) {
+    GridBench bench(700, 600); // three columns, three whole rows
+    FillList(8);
+    bench.view().Rebuild();
+    Pump();
+    bench.view().ShowIndex(7);
+    Pump();
+    EXPECT_EQ(bench.view().GetFirstRow(), 0);
+    EXPECT_NE(bench.view().ControlOf(0), nullptr) << "the first drawing stays on screen";
+}
+
+TEST(GridSearch, AHitNearTheEndIsShownWithTheLastRowsFillingTheWindow) {
+    GridBench bench(700, 600);
+    FillList(60); // 20 rows
+    bench.view().Rebuild();
+    Pump();
+    const int visible = bench.view().GetVisibleRows();
+    bench.view().ShowIndex(58);
+    Pump();
+    EXPECT_EQ(bench.view().GetFirstRow(), bench.view().GetRows() - visible) << "no blank space after the end";
+    EXPECT_NE(bench.view().ControlOf(58), nullptr);
+    bench.view().ShowIndex(30); // row 10: at the top
+    Pump();
+    EXPECT_EQ(bench.view().GetFirstRow(), 10);
 }
 
 TEST(GridSort, RebuildSortsByTheFrameModeKeepingTheLastRecord) {

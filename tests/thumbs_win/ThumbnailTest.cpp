@@ -299,13 +299,26 @@ TEST_F(RenameTest, BadNamesAreRefusedWithAMessageAndTheOldNameBack) {
 }
 
 TEST_F(RenameTest, TheSameNameRenamesNothingAndSaysNothing) {
+    BenchFiles().calls.clear();
     CThumbLabel& label = LabelOf("a.dwg");
     label.BeginRename();
-    label.SetWindowText("A.DWG");
+    label.SetWindowText("a.dwg");
     Key(label, VK_RETURN);
     EXPECT_EQ(label.GetWindowText(), "a.dwg");
     EXPECT_TRUE(Frame().toldUser.empty());
     EXPECT_TRUE(m_folder.Exists("a.dwg"));
+    EXPECT_TRUE(BenchFiles().calls.empty());
+}
+
+TEST_F(RenameTest, AChangeOfLetterCaseAloneIsARename) {
+    BenchFiles().calls.clear();
+    CThumbLabel& label = LabelOf("a.dwg");
+    label.BeginRename();
+    label.SetWindowText("A.DWG");
+    Key(label, VK_RETURN);
+    Pump();
+    EXPECT_TRUE(Frame().toldUser.empty());
+    EXPECT_EQ(BenchFiles().calls, std::vector<std::string>{"rename"}) << "not taken for the same name";
 }
 
 // ---- search -------------------------------------------------------------------------------------------
