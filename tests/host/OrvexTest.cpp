@@ -57,6 +57,12 @@ struct FakePlatform : PickerPlatform {
     void FocusHostView() override { steps.push_back("focus"); }
 };
 
+// What a run was handed, field by field: accept, cancel, start path, shell path.
+std::vector<std::string> Fields(const PickerArguments& handed) {
+    return {handed.acceptCaption, handed.cancelCaption, handed.startPath, handed.startShellPath};
+}
+using Handed = std::vector<std::string>;
+
 struct OrvexTest : ::testing::Test {
     FakeHost host;
     FakePlatform platform;
@@ -144,10 +150,7 @@ TEST_F(OrvexTest, EmptyCaptionsBecomeOkAndCancelAndThereIsNoStartPath) {
     FiveArguments();
     EXPECT_EQ(Orvex(platform), 1);
     ASSERT_EQ(platform.handed.size(), 1u);
-    EXPECT_EQ(platform.handed[0].acceptCaption, "Ok");
-    EXPECT_EQ(platform.handed[0].cancelCaption, "Cancel");
-    EXPECT_EQ(platform.handed[0].startPath, "");
-    EXPECT_EQ(platform.handed[0].startShellPath, "");
+    EXPECT_EQ(Fields(platform.handed[0]), (Handed{"Ok", "Cancel", "", ""}));
     EXPECT_EQ(platform.shellPathAskedFor, "");
 }
 
@@ -155,11 +158,9 @@ TEST_F(OrvexTest, CaptionsAndStartPathAreTakenFromTheArguments) {
     FiveArguments(L"C:\\Work\\a.dwg", L"Insert", L"Close");
     EXPECT_EQ(Orvex(platform), 1);
     ASSERT_EQ(platform.handed.size(), 1u);
-    EXPECT_EQ(platform.handed[0].acceptCaption, "Insert");
-    EXPECT_EQ(platform.handed[0].cancelCaption, "Close");
-    EXPECT_EQ(platform.handed[0].startPath, "C:\\Work\\a.dwg");
+    EXPECT_EQ(Fields(platform.handed[0]),
+              (Handed{"Insert", "Close", "C:\\Work\\a.dwg", "Desktop\\Computer\\C:\\Work\\a.dwg"}));
     EXPECT_EQ(platform.shellPathAskedFor, "C:\\Work\\a.dwg");
-    EXPECT_EQ(platform.handed[0].startShellPath, "Desktop\\Computer\\C:\\Work\\a.dwg");
 }
 
 TEST_F(OrvexTest, EachCallIsHandedItsOwnArgumentsAndNothingOfTheCallBefore) {
@@ -168,12 +169,10 @@ TEST_F(OrvexTest, EachCallIsHandedItsOwnArgumentsAndNothingOfTheCallBefore) {
     FiveArguments();
     EXPECT_EQ(Orvex(platform), 1);
     ASSERT_EQ(platform.handed.size(), 2u);
-    EXPECT_EQ(platform.handed[0].acceptCaption, "Insert");
-    EXPECT_EQ(platform.handed[0].startShellPath, "Desktop\\Computer\\C:\\Work\\");
-    EXPECT_EQ(platform.handed[1].acceptCaption, "Ok");
-    EXPECT_EQ(platform.handed[1].cancelCaption, "Cancel");
-    EXPECT_EQ(platform.handed[1].startPath, "");
-    EXPECT_EQ(platform.handed[1].startShellPath, "") << "no start path: the tree opens where it was left";
+    EXPECT_EQ(Fields(platform.handed[0]),
+              (Handed{"Insert", "Close", "C:\\Work\\", "Desktop\\Computer\\C:\\Work\\"}));
+    EXPECT_EQ(Fields(platform.handed[1]), (Handed{"Ok", "Cancel", "", ""}))
+        << "no start path: the tree opens where it was left";
 }
 
 TEST_F(OrvexTest, ARefusedCallHandsNothingOnAndTheNextOneIsItsOwn) {
@@ -187,9 +186,7 @@ TEST_F(OrvexTest, ARefusedCallHandsNothingOnAndTheNextOneIsItsOwn) {
     FiveArguments(L"", L"", std::wstring(127, L'c'));
     EXPECT_EQ(Orvex(platform), 1);
     ASSERT_EQ(platform.handed.size(), 1u);
-    EXPECT_EQ(platform.handed[0].acceptCaption, "Ok");
-    EXPECT_EQ(platform.handed[0].cancelCaption, std::string(127, 'c'));
-    EXPECT_EQ(platform.handed[0].startPath, "");
+    EXPECT_EQ(Fields(platform.handed[0]), (Handed{"Ok", std::string(127, 'c'), "", ""}));
 }
 
 TEST_F(OrvexTest, CancelReturnsNilDestroysTheDocumentAndGivesTheFocusBack) {
