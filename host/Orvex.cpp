@@ -7,13 +7,8 @@
 #include "settings/IniFile.h"
 #include "thumbs/DrawingFolder.h"
 
-#include <cstring>
 #include <cwchar>
-
-char g_szAcceptCaption[kCaptionChars] = "OK";
-char g_szCancelCaption[kCaptionChars] = "CANCEL";
-char g_szStartShellPath[kPathChars] = "";
-char g_szStartPath[kPathChars] = "";
+#include <utility>
 
 namespace {
 
@@ -26,15 +21,7 @@ void PrintAndAlert(const wchar_t* text) {
     acedAlert(text);
 }
 
-// Copies a narrow text into a fixed buffer; false (buffer untouched) when it does not fit.
-template <std::size_t N> bool CopyBounded(char (&buffer)[N], const std::string& text) {
-    if (text.size() + 1 > N)
-        return false;
-    std::memcpy(buffer, text.c_str(), text.size() + 1);
-    return true;
-}
-
-// A string argument that does not fit its buffer is refused as a whole: better no start than a wrong one.
+// A string argument that does not fit its bound is refused as a whole: better no start than a wrong one.
 bool RefuseTooLong(const wchar_t* what, std::size_t length, std::size_t limit) {
     if (length < limit)
         return false;
@@ -123,7 +110,7 @@ int Orvex(PickerPlatform& platform) {
         return 0;
     }
 
-    // Copies of the three texts, bounded like the buffers they end up in.
+    // Copies of the three texts, within the bounds of what a call may hand on.
     const std::size_t pathLength = std::wcslen(path->resval.rstring);
     const std::size_t acceptLength = std::wcslen(accept->resval.rstring);
     const std::size_t cancelLength = std::wcslen(cancel->resval.rstring);
@@ -146,18 +133,21 @@ int Orvex(PickerPlatform& platform) {
     // path is taken against the host's current folder now, before the explorer changes it.
     const std::string narrowPath =
         startPath.empty() ? std::string() : platform.WholeStartPath(NarrowAnsi(startPath));
-    if (!CopyBounded(g_szAcceptCaption, acceptCaption) || !CopyBounded(g_szCancelCaption, cancelCaption)) {
+    if (acceptCaption.size() >= kCaptionChars || cancelCaption.size() >= kCaptionChars) {
         RefuseTooLong(L"caption", kCaptionChars, kCaptionChars); // multi-byte code pages can grow a text
         return 0;
     }
     if (RefuseTooLong(L"start path", narrowPath.size(), kPathChars)) // made whole, it may have grown
         return 0;
 
-    g_szStartShellPath[0] = 0;
-    CopyBounded(g_szStartPath, narrowPath.size() < kPathChars ? narrowPath : std::string());
+    // This call's arguments exist only here, once every check has passed, and go to this run alone: a
+    // refused call leaves nothing behind, and one refused while another is open cannot reach the open one's.
+    PickerArguments call{acceptCaption, cancelCaption, narrowPath, std::string()};
     if (!narrowPath.empty()) {
-        const std::string shellPath = platform.StartShellPath(narrowPath);
-        if (!CopyBounded(g_szStartShellPath, shellPath))
+        std::string shellPath = platform.StartShellPath(narrowPath);
+        if (shellPath.size() < kPathChars)
+            call.startShellPath = std::move(shellPath);
+        else
             acutPrintf(L"\nOrvex: the start folder's shell path is too long; starting at the last folder\n");
     }
 
@@ -171,7 +161,7 @@ int Orvex(PickerPlatform& platform) {
         }
     } endOfRun{platform};
 
-    const int result = platform.RunDialog();
+    const int result = platform.RunDialog(call);
     const DrawingFolder* folder = platform.Folder();
     // Accept with no drawing chosen is a cancel: a folder is never returned as the picked drawing.
     const std::string picked = result == 1 && folder ? folder->ChosenPath() : std::string();

@@ -38,13 +38,13 @@ private:
     UINT m_doubleClickTime;
 };
 
-// Copies of what the LISP function took from its arguments, for the explorer of this call.
-ExplorerCall CallArguments() {
+// What the explorer of this call is given: the LISP function's arguments and the host's frame.
+ExplorerCall CallArguments(const PickerArguments& arguments) {
     ExplorerCall call;
-    call.acceptCaption = g_szAcceptCaption;
-    call.cancelCaption = g_szCancelCaption;
-    call.startPath = g_szStartPath;
-    call.startShellPath = g_szStartShellPath;
+    call.acceptCaption = arguments.acceptCaption;
+    call.cancelCaption = arguments.cancelCaption;
+    call.startPath = arguments.startPath;
+    call.startShellPath = arguments.startShellPath;
     call.hostFrame = acedGetAcadFrame();
     return call;
 }
@@ -70,9 +70,9 @@ public:
         return whole;
     }
 
-    int RunDialog() override {
+    int RunDialog(const PickerArguments& arguments) override {
         HostInputRestorer restorer;
-        CDialogRun dialog(m_app, CallArguments());
+        CDialogRun dialog(m_app, CallArguments(arguments));
         return static_cast<int>(dialog.DoModal());
     }
 

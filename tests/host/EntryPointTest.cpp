@@ -45,10 +45,12 @@ TEST_F(EntryPointTest, InvokeWithCodeZeroRunsThePickerOnce) {
     host.AddShort(1);
     host.AddShort(2);
     host.AddString(L"");
-    host.AddString(L"");
+    host.AddString(L"Insert");
     host.AddString(L"");
     DispatchEntryMessage(AcRx::kInvkSubrMsg, appId, platform);
     EXPECT_EQ(platform.runs, 1);
+    EXPECT_EQ(platform.handed.acceptCaption, "Insert");
+    EXPECT_EQ(platform.handed.cancelCaption, "Cancel");
     EXPECT_EQ(host.result, "nil");
 }
 

@@ -1,8 +1,9 @@
 // Fuzzes the argument checks of the `Orvex` LISP function through the fake host: the input is a LISP call
 // as the command line reads it, its arguments become the result-buffer chain the host hands over. Five
-// arguments (two short integers, three strings that fit their buffers) run the explorer; anything else
-// is refused with a printed and alerted message and no run. Either way the arguments are released, the
-// buffers hold only what fits, and a run ends with the document destroyed and the host's view focused.
+// arguments (two short integers, three strings within their bounds) run the explorer; anything else is
+// refused with a printed and alerted message, no run and nothing handed to the platform. Either way the
+// arguments are released; a run is handed exactly the narrowed captions and path, and ends with the
+// document destroyed and the host's view focused.
 #include "devhost/Lisp.h"
 #include "devhost/ResultBuffers.h"
 #include "devhost/Text.h"
@@ -14,7 +15,6 @@
 
 #include <cstdint>
 #include <cstdlib>
-#include <cstring>
 #include <cwchar>
 #include <string>
 #include <vector>
@@ -28,6 +28,7 @@ constexpr char kPickName[] = "door-900.dwg";
 struct FuzzPlatform : PickerPlatform {
     std::vector<std::string> steps;
     std::string shellPathAskedFor;
+    std::vector<PickerArguments> handed;
     bool pick = false;
     CTessel3Doc doc{std::string()}; // no settings file: nothing read, nothing saved
 
@@ -36,8 +37,9 @@ struct FuzzPlatform : PickerPlatform {
         steps.push_back("shell");
         return "Desktop\\" + path;
     }
-    int RunDialog() override {
+    int RunDialog(const PickerArguments& arguments) override {
         steps.push_back("dialog");
+        handed.push_back(arguments);
         picked.Pick(kPickFolder, kPickName);
         return pick ? 1 : 2;
     }
@@ -96,8 +98,6 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
 
     FuzzPlatform platform;
     platform.pick = valid && accept.size() % 2 == 1;
-    const std::string acceptBefore = g_szAcceptCaption;
-    const std::string cancelBefore = g_szCancelCaption;
     const int rc = Orvex(platform);
 
     if (host.liveNodes != 0) // the arguments and the result list are released
@@ -105,19 +105,23 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     if (rc != (valid ? 1 : 0))
         std::abort();
     if (!valid) {
-        // Refused: said on the command line and in an alert, nothing run, the buffers as they were.
-        if (!platform.steps.empty() || host.result != "unset" || !Contains(host.events, "print:") ||
-            !Contains(host.events, "alert:") || acceptBefore != g_szAcceptCaption ||
-            cancelBefore != g_szCancelCaption)
+        // Refused: said on the command line and in an alert, nothing run, nothing handed on.
+        if (!platform.steps.empty() || !platform.handed.empty() || host.result != "unset" ||
+            !Contains(host.events, "print:") || !Contains(host.events, "alert:"))
             std::abort();
         return 0;
     }
     const std::string expectAccept = accept.empty() ? "Ok" : NarrowAnsi(accept);
     const std::string expectCancel = cancel.empty() ? "Cancel" : NarrowAnsi(cancel);
     const std::string narrowPath = NarrowAnsi(path);
-    if (expectAccept != g_szAcceptCaption || expectCancel != g_szCancelCaption || narrowPath != g_szStartPath)
+    // The run is handed exactly these, and a shell path only when there is a start path and it fits.
+    const std::string shellPath = path.empty() ? std::string() : "Desktop\\" + narrowPath;
+    const std::string expectShellPath = shellPath.size() < kPathChars ? shellPath : std::string();
+    if (platform.handed.size() != 1)
         std::abort();
-    if (std::strlen(g_szStartShellPath) >= kPathChars)
+    const PickerArguments& handed = platform.handed.front();
+    if (handed.acceptCaption != expectAccept || handed.cancelCaption != expectCancel ||
+        handed.startPath != narrowPath || handed.startShellPath != expectShellPath)
         std::abort();
     // The shell is asked about a start path only, and the run always ends with destroy and focus.
     const std::vector<std::string> expectSteps =

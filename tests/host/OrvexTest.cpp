@@ -1,6 +1,7 @@
 #include "FakeHost.h"
 #include "host/EntryPoint.h"
 #include "host/Orvex.h"
+#include "hostapi/TextConv.h"
 #include "settings/Tessel3Doc.h"
 #include "tests/support/PickedDrawing.h"
 #include "tests/support/TempFolder.h"
@@ -27,6 +28,7 @@ struct FakePlatform : PickerPlatform {
     int dialogResult = 2;
     std::string pickFolder, pickName;
     std::string shellPathAskedFor;
+    std::vector<PickerArguments> handed; // what each run was given
     std::unique_ptr<CTessel3Doc> doc;
     std::vector<std::string> steps;
 
@@ -38,8 +40,9 @@ struct FakePlatform : PickerPlatform {
     std::string WholeStartPath(const std::string& path) override {
         return path.find(':') == std::string::npos ? currentFolder + path : path;
     }
-    int RunDialog() override {
+    int RunDialog(const PickerArguments& arguments) override {
         steps.push_back("dialog");
+        handed.push_back(arguments);
         doc = std::make_unique<CTessel3Doc>(settingsFile.string());
         picked.Pick(pickFolder, pickName);
         return dialogResult;
@@ -53,6 +56,12 @@ struct FakePlatform : PickerPlatform {
     }
     void FocusHostView() override { steps.push_back("focus"); }
 };
+
+// What a run was handed, field by field: accept, cancel, start path, shell path.
+std::vector<std::string> Fields(const PickerArguments& handed) {
+    return {handed.acceptCaption, handed.cancelCaption, handed.startPath, handed.startShellPath};
+}
+using Handed = std::vector<std::string>;
 
 struct OrvexTest : ::testing::Test {
     FakeHost host;
@@ -140,19 +149,44 @@ TEST_F(OrvexTest, MissingStringArgumentsAreTypeErrors) {
 TEST_F(OrvexTest, EmptyCaptionsBecomeOkAndCancelAndThereIsNoStartPath) {
     FiveArguments();
     EXPECT_EQ(Orvex(platform), 1);
-    EXPECT_STREQ(g_szAcceptCaption, "Ok");
-    EXPECT_STREQ(g_szCancelCaption, "Cancel");
-    EXPECT_STREQ(g_szStartShellPath, "");
+    ASSERT_EQ(platform.handed.size(), 1u);
+    EXPECT_EQ(Fields(platform.handed[0]), (Handed{"Ok", "Cancel", "", ""}));
     EXPECT_EQ(platform.shellPathAskedFor, "");
 }
 
 TEST_F(OrvexTest, CaptionsAndStartPathAreTakenFromTheArguments) {
     FiveArguments(L"C:\\Work\\a.dwg", L"Insert", L"Close");
     EXPECT_EQ(Orvex(platform), 1);
-    EXPECT_STREQ(g_szAcceptCaption, "Insert");
-    EXPECT_STREQ(g_szCancelCaption, "Close");
+    ASSERT_EQ(platform.handed.size(), 1u);
+    EXPECT_EQ(Fields(platform.handed[0]),
+              (Handed{"Insert", "Close", "C:\\Work\\a.dwg", "Desktop\\Computer\\C:\\Work\\a.dwg"}));
     EXPECT_EQ(platform.shellPathAskedFor, "C:\\Work\\a.dwg");
-    EXPECT_STREQ(g_szStartShellPath, "Desktop\\Computer\\C:\\Work\\a.dwg");
+}
+
+TEST_F(OrvexTest, EachCallIsHandedItsOwnArgumentsAndNothingOfTheCallBefore) {
+    FiveArguments(L"C:\\Work\\", L"Insert", L"Close");
+    EXPECT_EQ(Orvex(platform), 1);
+    FiveArguments();
+    EXPECT_EQ(Orvex(platform), 1);
+    ASSERT_EQ(platform.handed.size(), 2u);
+    EXPECT_EQ(Fields(platform.handed[0]),
+              (Handed{"Insert", "Close", "C:\\Work\\", "Desktop\\Computer\\C:\\Work\\"}));
+    EXPECT_EQ(Fields(platform.handed[1]), (Handed{"Ok", "Cancel", "", ""}))
+        << "no start path: the tree opens where it was left";
+}
+
+TEST_F(OrvexTest, ARefusedCallHandsNothingOnAndTheNextOneIsItsOwn) {
+    FiveArguments(L"C:\\Work\\", L"Insert", std::wstring(128, L'c'));
+    EXPECT_EQ(Orvex(platform), 0);
+    EXPECT_TRUE(platform.handed.empty());
+    EXPECT_EQ(platform.shellPathAskedFor, "") << "the shell is not asked for a refused call";
+    EXPECT_NE(host.printed().find("cancel caption is too long (128 characters; at most 127)"),
+              std::string::npos);
+
+    FiveArguments(L"", L"", std::wstring(127, L'c'));
+    EXPECT_EQ(Orvex(platform), 1);
+    ASSERT_EQ(platform.handed.size(), 1u);
+    EXPECT_EQ(Fields(platform.handed[0]), (Handed{"Ok", std::string(127, 'c'), "", ""}));
 }
 
 TEST_F(OrvexTest, CancelReturnsNilDestroysTheDocumentAndGivesTheFocusBack) {
@@ -211,8 +245,9 @@ TEST_F(OrvexTest, ASecondCallWhileTheExplorerIsOpenIsRefusedAndTheOpenOneGoesOn)
         int innerReturn = -1;
         std::vector<std::string> innerEvents;
         std::string innerResult, captionDuringRun;
-        int RunDialog() override {
-            FakePlatform::RunDialog();
+        std::size_t runsHandedDuringRun = 0;
+        int RunDialog(const PickerArguments& arguments) override {
+            FakePlatform::RunDialog(arguments);
             host->events.clear();
             host->AddShort(1);
             host->AddShort(2);
@@ -222,7 +257,8 @@ TEST_F(OrvexTest, ASecondCallWhileTheExplorerIsOpenIsRefusedAndTheOpenOneGoesOn)
             innerReturn = Orvex(*this);
             innerEvents = host->events;
             innerResult = host->result;
-            captionDuringRun = g_szAcceptCaption;
+            captionDuringRun = arguments.acceptCaption;
+            runsHandedDuringRun = handed.size();
             return dialogResult;
         }
     } reentering;
@@ -241,6 +277,7 @@ TEST_F(OrvexTest, ASecondCallWhileTheExplorerIsOpenIsRefusedAndTheOpenOneGoesOn)
                                   "alert:\nOrvex: the explorer is already open; this call returns nil\n"}));
     EXPECT_EQ(reentering.innerResult, "nil");
     EXPECT_EQ(reentering.captionDuringRun, "Insert") << "the open explorer keeps its captions";
+    EXPECT_EQ(reentering.runsHandedDuringRun, 1u) << "the refused call hands the platform nothing";
     EXPECT_EQ(reentering.steps, (std::vector<std::string>{"dialog", "destroy", "focus"}))
         << "the refused call neither runs a dialog nor destroys the open one's document";
     EXPECT_EQ(host.result, "(\"" + Folder() + "door.dwg\" (\"\" \"\" \"\"))");
@@ -254,8 +291,8 @@ TEST_F(OrvexTest, ASecondCallWhileTheExplorerIsOpenIsRefusedAndTheOpenOneGoesOn)
 
 TEST_F(OrvexTest, AnExceptionOutOfTheRunStillDestroysTheDocumentAndGivesTheFocusBack) {
     struct ThrowingPlatform : FakePlatform {
-        int RunDialog() override {
-            FakePlatform::RunDialog();
+        int RunDialog(const PickerArguments& arguments) override {
+            FakePlatform::RunDialog(arguments);
             throw std::runtime_error("run failed");
         }
     } throwing;
@@ -308,7 +345,8 @@ TEST_F(OrvexTest, AStartPathWithALineBreakOrAnotherControlCharacterIsRefusedWith
 TEST_F(OrvexTest, ARelativeStartPathIsTakenAgainstTheHostsCurrentFolder) {
     FiveArguments(L"Doors\\", L"Insert", L"Close");
     EXPECT_EQ(Orvex(platform), 1);
-    EXPECT_STREQ(g_szStartPath, "C:\\Host\\Doors\\");
+    ASSERT_EQ(platform.handed.size(), 1u);
+    EXPECT_EQ(platform.handed[0].startPath, "C:\\Host\\Doors\\");
     EXPECT_EQ(platform.shellPathAskedFor, "C:\\Host\\Doors\\");
 }
 
@@ -316,7 +354,8 @@ TEST_F(OrvexTest, StartPathsOf259CharactersAreTakenAnd260Or1000Refused) {
     const std::wstring whole259 = L"C:\\" + std::wstring(256, L'x');
     FiveArguments(whole259);
     EXPECT_EQ(Orvex(platform), 1);
-    EXPECT_EQ(std::string(g_szStartPath).size(), 259u);
+    ASSERT_EQ(platform.handed.size(), 1u);
+    EXPECT_EQ(platform.handed[0].startPath, NarrowAnsi(whole259));
     for (std::size_t n : {260u, 1000u}) {
         host.events.clear();
         platform.steps.clear();
@@ -336,6 +375,21 @@ TEST_F(OrvexTest, StartPathsOf259CharactersAreTakenAnd260Or1000Refused) {
     EXPECT_EQ(Orvex(platform), 0);
     EXPECT_TRUE(platform.steps.empty());
     EXPECT_NE(host.printed().find("start path is too long (305 characters; at most 259)"), std::string::npos);
+}
+
+TEST_F(OrvexTest, AShellPathTooLongIsSaidAndTheRunStartsWithoutOne) {
+    // This platform's shell path is the path behind "Desktop\Computer\" (17 characters): a start path of
+    // 242 characters gives 259, which is taken, and one of 243 gives 260, which is not.
+    FiveArguments(L"C:\\" + std::wstring(239, L'x'));
+    EXPECT_EQ(Orvex(platform), 1);
+    FiveArguments(L"C:\\" + std::wstring(240, L'x'));
+    EXPECT_EQ(Orvex(platform), 1);
+    ASSERT_EQ(platform.handed.size(), 2u);
+    EXPECT_EQ(platform.handed[0].startShellPath.size(), 259u);
+    EXPECT_EQ(platform.handed[1].startPath.size(), 243u) << "the start path itself is still handed on";
+    EXPECT_EQ(platform.handed[1].startShellPath, "");
+    EXPECT_EQ(host.printed(),
+              "\nOrvex: the start folder's shell path is too long; starting at the last folder\n");
 }
 
 } // namespace

@@ -2,8 +2,9 @@
 
 namespace testsupport {
 
-int CancellingPicker::RunDialog() {
+int CancellingPicker::RunDialog(const PickerArguments& arguments) {
     ++runs;
+    handed = arguments;
     return 2; // cancelled
 }
 

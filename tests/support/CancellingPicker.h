@@ -9,10 +9,11 @@
 namespace testsupport {
 
 struct CancellingPicker : PickerPlatform {
-    int runs = 0; // how many times the dialog was asked for
+    int runs = 0;           // how many times the dialog was asked for
+    PickerArguments handed; // what the last run was given
 
     std::string StartShellPath(const std::string&) override { return {}; }
-    int RunDialog() override;
+    int RunDialog(const PickerArguments& arguments) override;
     CTessel3Doc* Document() override { return nullptr; }
     void DestroyDocument() override {}
     void FocusHostView() override {}
