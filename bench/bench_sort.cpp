@@ -31,7 +31,7 @@ std::vector<DwgFindEntry> MakeEntries() {
         // Shuffled numbers, so the scan order is not the name order.
         e.name = dwggen::SampleName(rng.Next() % 1000000, 1);
         e.timeWrite = 1500000000 + static_cast<std::int64_t>(rng.Next() % 200000000);
-        e.size = static_cast<std::uint32_t>(8000 + rng.Next() % 2000000);
+        e.size = static_cast<std::uint64_t>(8000 + rng.Next() % 2000000);
         entries.push_back(e);
     }
     return entries;

@@ -81,9 +81,8 @@ void SortDwgList(int mode) {
     const int count = DwgList.GetSize();
     if (count == 0)
         return;
-    // The last record is left out on purpose: the last file the scan found stays last.
     DwgData* first = DwgList.GetData();
-    DwgData* last = first + (count - 1);
+    DwgData* last = first + count;
     switch (mode) {
     case DwgSortByName: {
         const NameFoldTable& fold = NameFold();

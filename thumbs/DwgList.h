@@ -15,7 +15,7 @@ struct DwgFindEntry {
     std::string name;
     bool isDirectory = false;
     std::int64_t timeWrite = 0; // seconds since 1970-01-01 UTC
-    std::uint32_t size = 0;
+    std::uint64_t size = 0;     // bytes: files of 2 GiB and more are drawings too
 };
 
 // One drawing file of the current folder. The name is bare (relative to the current folder).
@@ -37,7 +37,7 @@ public:
     std::uint8_t m_bSelected = 0;
     std::string m_strName;
     std::int64_t m_timeWrite = 0;
-    std::uint32_t m_nSize = 0;
+    std::uint64_t m_nSize = 0;
 };
 
 using CDwgArray = CArray<DwgData, DwgData&>;
@@ -89,8 +89,7 @@ std::string SkippedFilesMessage(int skipped);
 
 // --- Sorting -------------------------------------------------------------------------------------
 
-// Sorts every record but the last one by name (0), date (1) or size (2), ascending; the last record
-// found by the scan stays last. Other modes leave the list as it is.
+// Sorts every record by name (0), date (1) or size (2), ascending. Other modes leave the list as it is.
 void SortDwgList(int mode);
 
 // --- Selection and search ------------------------------------------------------------------------

@@ -29,12 +29,12 @@ private:
     intptr_t m_handle;
 };
 
-DwgFindEntry EntryOf(const struct _finddata64i32_t& found) {
+DwgFindEntry EntryOf(const struct __finddata64_t& found) {
     DwgFindEntry entry;
     entry.name = found.name;
     entry.isDirectory = (found.attrib & _A_SUBDIR) != 0;
     entry.timeWrite = found.time_write;
-    entry.size = static_cast<std::uint32_t>(found.size);
+    entry.size = static_cast<std::uint64_t>(found.size);
     return entry;
 }
 
@@ -121,8 +121,9 @@ bool FileSystemFolderReader::Read(const std::string& folder, std::vector<DwgData
         return false;
     }
     std::string pattern = DrawingFolder::Join(folder, "*");
-    struct _finddata64i32_t found;
-    FindHandle search(_findfirst64i32(pattern.c_str(), &found));
+    // The 64-bit size: a 32-bit one turns a file of 2 GiB and more into a negative or wrong size.
+    struct __finddata64_t found;
+    FindHandle search(_findfirst64(pattern.c_str(), &found));
     if (search.get() == -1)
         return false;
     int tooLong = 0;
@@ -139,7 +140,7 @@ bool FileSystemFolderReader::Read(const std::string& folder, std::vector<DwgData
             continue;
         }
         drawings.emplace_back(std::move(entry));
-    } while (_findnext64i32(search.get(), &found) == 0);
+    } while (_findnext64(search.get(), &found) == 0);
     problem = SkippedFilesMessage(tooLong);
     return true;
 }

@@ -3,10 +3,8 @@
 #include <algorithm>
 #include <cstdio>
 
-std::string TooltipSizeText(std::uint32_t size) {
-    char buffer[32];
-    std::snprintf(buffer, sizeof buffer, "Size=%d ", static_cast<int>(size));
-    return buffer;
+std::string TooltipSizeText(std::uint64_t size) {
+    return "Size=" + std::to_string(size) + " ";
 }
 
 std::string TooltipDateText(const std::tm* local) {
@@ -35,7 +33,7 @@ bool LocalTimeOf(std::int64_t timeWrite, std::tm& out) {
 #endif
 }
 
-ThumbTooltip BuildTooltip(const std::string& name, std::uint32_t size, const std::tm* local) {
+ThumbTooltip BuildTooltip(const std::string& name, std::uint64_t size, const std::tm* local) {
     ThumbTooltip tip;
     tip.sizeText = TooltipSizeText(size);
     tip.dateText = TooltipDateText(local);
@@ -51,7 +49,7 @@ ThumbTooltip BuildTooltip(const std::string& name, std::uint32_t size, const std
     return tip;
 }
 
-ThumbTooltip BuildTooltipForTime(const std::string& name, std::uint32_t size, std::int64_t timeWrite) {
+ThumbTooltip BuildTooltipForTime(const std::string& name, std::uint64_t size, std::int64_t timeWrite) {
     std::tm local{};
     const bool ok = LocalTimeOf(timeWrite, local);
     return BuildTooltip(name, size, ok ? &local : nullptr);

@@ -12,6 +12,7 @@
 
 #include <cstdio>
 #include <cstring>
+#include <filesystem>
 #include <fstream>
 #include <set>
 #include <sstream>
@@ -123,7 +124,9 @@ std::vector<unsigned char> Words(std::initializer_list<unsigned> words) {
 }
 
 // The smallest metafile: its header (12 words in all, largest record 3) and the end record.
-std::vector<unsigned char> MinimalWmf() { return Words({1, 9, 0x0300, 12, 0, 0, 3, 0, 0, 3, 0, 0}); }
+std::vector<unsigned char> MinimalWmf() {
+    return Words({1, 9, 0x0300, 12, 0, 0, 3, 0, 0, 3, 0, 0});
+}
 
 bool Parse(const std::vector<unsigned char>& file, DwgPreview& out) {
     return ParseDwgPreview(file.data(), file.size(), out);
@@ -435,7 +438,9 @@ TEST(DwgPreview, DamagedPngIsRejected) {
 
 TEST(DwgPreview, MetafilesWhoseSizesLieAreRejected) {
     DwgPreview p;
-    auto parses = [&](const std::vector<unsigned char>& wmf) { return Parse(Container({{dwgfmt::kWmf, wmf}}), p); };
+    auto parses = [&](const std::vector<unsigned char>& wmf) {
+        return Parse(Container({{dwgfmt::kWmf, wmf}}), p);
+    };
     // A rectangle between header and end: accepted, also without its end record.
     EXPECT_TRUE(parses(Words({1, 9, 0x0300, 19, 0, 0, 7, 0, 0, 7, 0, 0x041B, 190, 290, 10, 10, 3, 0, 0})));
     EXPECT_TRUE(parses(Words({1, 9, 0x0300, 16, 0, 0, 7, 0, 0, 7, 0, 0x041B, 190, 290, 10, 10})));
@@ -508,6 +513,77 @@ TEST(DwgPreview, FileReadAndDamagedFiles) {
     DwgPreview missing;
     EXPECT_FALSE(ReadDwgPreview(dir + "/orvex-no-such-file.dwg", missing));
 }
+
+// --- Drawings of gigabytes ------------------------------------------------------------------------
+
+#ifdef __linux__
+// Bytes this process has read so far (the kernel's count of every read call).
+std::uint64_t BytesReadSoFar() {
+    std::ifstream io("/proc/self/io");
+    std::string key;
+    std::uint64_t value = 0;
+    while (io >> key >> value)
+        if (key == "rchar:")
+            return value;
+    return 0;
+}
+
+constexpr std::uint64_t kThreeGiB = 3ull << 30;
+
+// A drawing of 3 GiB whose image section lies at address; everything else is a hole (a sparse file,
+// no room taken on disk).
+void WriteSparseDrawing(const std::string& path, std::uint64_t address) {
+    const std::size_t packed = 0x40;
+    const auto small = Container(
+        {{dwgfmt::kHeader, std::vector<unsigned char>(80, 1)}, {dwgfmt::kBmp, SmallDib()}}, "AC1018", packed);
+    std::vector<unsigned char> header(small.begin(), small.begin() + dwgfmt::kFileHeaderBytes);
+    PutLe32(header, dwgfmt::kImageAddressOffset, static_cast<std::uint32_t>(address));
+    std::vector<unsigned char> section(small.begin() + packed, small.end());
+    const std::size_t count = section[20];
+    for (std::size_t i = 0; i < count; ++i) {
+        const std::size_t at = dwgfmt::kSectionHeadBytes + i * dwgfmt::kEntryBytes + 1;
+        const std::uint32_t start = static_cast<std::uint32_t>(section[at]) | section[at + 1] << 8 |
+                                    section[at + 2] << 16 | static_cast<std::uint32_t>(section[at + 3]) << 24;
+        PutLe32(section, at, static_cast<std::uint32_t>(start - packed + address));
+    }
+    WriteAll(path, header);
+    std::filesystem::resize_file(path, kThreeGiB);
+    std::fstream out(path, std::ios::binary | std::ios::in | std::ios::out);
+    out.seekp(static_cast<std::streamoff>(address));
+    out.write(reinterpret_cast<const char*>(section.data()), static_cast<std::streamsize>(section.size()));
+    ASSERT_TRUE(out.good());
+}
+
+TEST(DwgPreview, ADrawingOfThreeGibibytesIsNotReadWhole) {
+    const std::string path = TempDir() + "/three-gib.dwg";
+    // The image section right behind the header, and near the end of the file.
+    for (std::uint64_t address : {std::uint64_t(0x40), kThreeGiB - 4096}) {
+        SCOPED_TRACE(address);
+        WriteSparseDrawing(path, address);
+        ASSERT_EQ(std::filesystem::file_size(path), kThreeGiB);
+        const std::uint64_t before = BytesReadSoFar();
+        DwgPreview p;
+        EXPECT_TRUE(ReadDwgPreview(path, p));
+        const std::uint64_t read = BytesReadSoFar() - before;
+        EXPECT_EQ(p.kind, DwgPreviewKind::Bmp);
+        EXPECT_EQ(p.bytes, SmallDib());
+        EXPECT_GT(read, 0u) << "the count of bytes read does not move";
+        EXPECT_LT(read, 1u << 20) << "bytes read for the preview of a 3 GiB drawing";
+        std::remove(path.c_str());
+    }
+}
+
+TEST(DwgPreview, AFileOfThreeGibibytesWithoutAHeaderIsNotReadWhole) {
+    const std::string path = TempDir() + "/zeros.dwg";
+    WriteAll(path, {});
+    std::filesystem::resize_file(path, kThreeGiB);
+    const std::uint64_t before = BytesReadSoFar();
+    DwgPreview p;
+    EXPECT_FALSE(ReadDwgPreview(path, p));
+    EXPECT_LT(BytesReadSoFar() - before, 1u << 20);
+    std::remove(path.c_str());
+}
+#endif
 
 // --- The sample generator --------------------------------------------------------------------------
 

@@ -30,7 +30,7 @@ struct MemoryReader : FolderReader {
     void MakeCurrentDirectory(const std::string& folder) override { currentDirectories.push_back(folder); }
 };
 
-DwgData Drawing(const std::string& name, std::int64_t time = 0, std::uint32_t size = 0) {
+DwgData Drawing(const std::string& name, std::int64_t time = 0, std::uint64_t size = 0) {
     DwgFindEntry entry;
     entry.name = name;
     entry.timeWrite = time;
@@ -185,6 +185,22 @@ TEST_F(DrawingFolderTest, TheChosenDrawingStaysChosenThroughASort) {
     folder.Sort(DwgSortByName);
     EXPECT_EQ(folder.ChosenName(), "c.dwg");
     EXPECT_EQ(folder.ChosenPath(), "C:\\dwg\\c.dwg");
+}
+
+TEST_F(DrawingFolderTest, TheLastDrawingFoundTakesItsPlaceInEveryOrder) {
+    // The read finds c, a, b: b, found last, belongs in the middle by name, date and size.
+    for (int mode : {DwgSortByName, DwgSortByDate, DwgSortBySize}) {
+        SCOPED_TRACE(mode);
+        folder.Show("C:\\dwg");
+        folder.Choose(2); // b.dwg
+        folder.Sort(mode);
+        ASSERT_EQ(folder.Count(), 3);
+        EXPECT_EQ(folder.Drawing(0).m_strName, "a.dwg");
+        EXPECT_EQ(folder.Drawing(1).m_strName, "b.dwg");
+        EXPECT_EQ(folder.Drawing(2).m_strName, "c.dwg");
+        EXPECT_EQ(folder.Chosen(), 1);
+        EXPECT_EQ(folder.ChosenPath(), "C:\\dwg\\b.dwg");
+    }
 }
 
 TEST_F(DrawingFolderTest, SelectedPathsAreTheSelectedDrawingsInTheFolder) {

@@ -7,7 +7,7 @@
 
 namespace {
 
-DwgFindEntry File(const std::string& name, std::int64_t time = 0, std::uint32_t size = 0) {
+DwgFindEntry File(const std::string& name, std::int64_t time = 0, std::uint64_t size = 0) {
     DwgFindEntry e;
     e.name = name;
     e.timeWrite = time;
@@ -51,6 +51,11 @@ TEST(DwgData, BuiltFromSearchEntry) {
     EXPECT_EQ(d.m_timeWrite, 1614953229);
     EXPECT_EQ(d.m_nSize, 1234u);
     EXPECT_EQ(d.m_bSelected, 0);
+}
+
+TEST(DwgData, KeepsSizesOfFourGibibytesAndMore) {
+    EXPECT_EQ(DwgData(File("3g.dwg", 0, 3221225472u)).m_nSize, 3221225472u);
+    EXPECT_EQ(DwgData(File("5g.dwg", 0, 5368709120ull)).m_nSize, 5368709120ull);
 }
 
 TEST(DwgData, CopyAndAssignmentCopyAllFields) {
@@ -186,36 +191,61 @@ TEST(AcceptScanEntry, LowersTheCodePageLettersAsTheSearchFoldsThem) {
     EXPECT_EQ(e.name, "\xE9tage-\x9A.dwg");
 }
 
-TEST_F(DwgListTest, SortByNameKeepsLastRecordLast) {
+TEST_F(DwgListTest, SortByNameMovesTheLastFileFoundToo) {
     Scan({File("c.dwg"), File("a.dwg"), File("b.dwg")});
     SortDwgList(DwgSortByName);
-    EXPECT_EQ(Names(), (std::vector<std::string>{"a.dwg", "c.dwg", "b.dwg"}));
+    EXPECT_EQ(Names(), (std::vector<std::string>{"a.dwg", "b.dwg", "c.dwg"}));
+}
+
+TEST_F(DwgListTest, TheLastFileFoundTakesItsPlaceInEveryOrder) {
+    // Found last, yet first by name, date and size alike.
+    Scan({File("m.dwg", 200, 1400000), File("z.dwg", 300, 800000), File("a.dwg", 100, 19000)});
+    for (int mode : {DwgSortByName, DwgSortByDate, DwgSortBySize}) {
+        SCOPED_TRACE(mode);
+        SortDwgList(mode);
+        EXPECT_EQ(DwgList[0].m_strName, "a.dwg");
+    }
+    SortDwgList(DwgSortBySize);
+    EXPECT_EQ(Names(), (std::vector<std::string>{"a.dwg", "z.dwg", "m.dwg"}));
 }
 
 TEST_F(DwgListTest, SortByNameIgnoresCase) {
     AppendScanEntry(File("Beta.dwg"));
     AppendScanEntry(File("alpha.dwg"));
     AppendScanEntry(File("CHARLIE.dwg"));
-    AppendScanEntry(File("last.dwg"));
+    AppendScanEntry(File("Aardvark.dwg"));
     SortDwgList(DwgSortByName);
-    EXPECT_EQ(Names(), (std::vector<std::string>{"alpha.dwg", "Beta.dwg", "CHARLIE.dwg", "last.dwg"}));
+    EXPECT_EQ(Names(), (std::vector<std::string>{"Aardvark.dwg", "alpha.dwg", "Beta.dwg", "CHARLIE.dwg"}));
 }
 
 TEST_F(DwgListTest, SortByDateOldestFirst) {
     Scan({File("n.dwg", 300), File("o.dwg", -10), File("m.dwg", 200), File("z.dwg", 0)});
     SortDwgList(DwgSortByDate);
-    EXPECT_EQ(Names(), (std::vector<std::string>{"o.dwg", "m.dwg", "n.dwg", "z.dwg"}));
+    EXPECT_EQ(Names(), (std::vector<std::string>{"o.dwg", "z.dwg", "m.dwg", "n.dwg"}));
 }
 
 TEST_F(DwgListTest, SortBySizeSmallestFirst) {
     Scan({File("big.dwg", 0, 4000000000u), File("small.dwg", 0, 10), File("mid.dwg", 0, 500),
           File("z.dwg", 0, 1)});
     SortDwgList(DwgSortBySize);
-    EXPECT_EQ(Names(), (std::vector<std::string>{"small.dwg", "mid.dwg", "big.dwg", "z.dwg"}));
+    EXPECT_EQ(Names(), (std::vector<std::string>{"z.dwg", "small.dwg", "mid.dwg", "big.dwg"}));
+}
+
+TEST_F(DwgListTest, SortBySizeAroundTwoAndFourGibibytes) {
+    // 2^31 and 2^32 are where 32-bit sizes turn negative or wrap to small numbers.
+    const std::uint64_t k2G = 1ull << 31;
+    const std::uint64_t k4G = 1ull << 32;
+    Scan({File("4g.dwg", 0, k4G), File("2g-1.dwg", 0, k2G - 1), File("5g.dwg", 0, 5 * (1ull << 30)),
+          File("4g+1.dwg", 0, k4G + 1), File("2g.dwg", 0, k2G), File("4g-1.dwg", 0, k4G - 1),
+          File("small.dwg", 0, 19000), File("2g+1.dwg", 0, k2G + 1)});
+    SortDwgList(DwgSortBySize);
+    EXPECT_EQ(Names(), (std::vector<std::string>{"small.dwg", "2g-1.dwg", "2g.dwg", "2g+1.dwg", "4g-1.dwg",
+                                                 "4g.dwg", "4g+1.dwg", "5g.dwg"}));
+    EXPECT_EQ(DwgList[7].m_nSize, 5368709120u);
 }
 
 TEST_F(DwgListTest, EqualSizesComeOutInEitherOrder) {
-    Scan({File("b.dwg", 0, 5), File("a.dwg", 0, 5), File("c.dwg", 0, 1), File("z.dwg", 0, 0)});
+    Scan({File("b.dwg", 0, 5), File("a.dwg", 0, 5), File("c.dwg", 0, 1), File("z.dwg", 0, 9)});
     SortDwgList(DwgSortBySize);
     const auto names = Names();
     EXPECT_EQ(names[0], "c.dwg");
@@ -238,17 +268,16 @@ TEST_F(DwgListTest, UnknownModeLeavesOrder) {
     EXPECT_EQ(Names(), (std::vector<std::string>{"c.dwg", "a.dwg", "b.dwg"}));
 }
 
-TEST_F(DwgListTest, LargeSortOrdersAllButLast) {
+TEST_F(DwgListTest, LargeSortOrdersEveryRecord) {
     std::vector<DwgFindEntry> entries;
     for (int i = 0; i < 1000; ++i)
         entries.push_back(
             File("f" + std::to_string((i * 7919) % 1000) + ".dwg", (i * 31) % 997, (i * 13) % 1009));
     Scan(entries);
-    const std::string last = DwgList[999].m_strName;
     for (int mode = 0; mode < 3; ++mode) {
         SortDwgList(mode);
-        EXPECT_EQ(DwgList[999].m_strName, last);
-        for (int i = 1; i < 999; ++i) {
+        ASSERT_EQ(DwgList.GetSize(), 1000);
+        for (int i = 1; i < 1000; ++i) {
             const DwgData& a = DwgList[i - 1];
             const DwgData& b = DwgList[i];
             if (mode == 0)

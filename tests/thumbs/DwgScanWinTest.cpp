@@ -10,6 +10,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cstdint>
 #include <string>
 #include <vector>
 
@@ -52,6 +53,36 @@ TEST(DwgScanWin, ListsDrawingFilesLowerCased) {
         }
     }
     EXPECT_EQ(DwgList.GetAllocated(), static_cast<std::size_t>(DwgList.GetSize()));
+}
+
+// Makes path a file of size bytes without writing them: on the Linux file system under Wine the
+// file is sparse and takes no room.
+bool MakeSparseFile(const std::string& path, std::uint64_t size) {
+    HANDLE file =
+        ::CreateFileA(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
+    if (file == INVALID_HANDLE_VALUE)
+        return false;
+    LARGE_INTEGER end;
+    end.QuadPart = static_cast<LONGLONG>(size);
+    const bool made = ::SetFilePointerEx(file, end, nullptr, FILE_BEGIN) && ::SetEndOfFile(file);
+    ::CloseHandle(file);
+    return made;
+}
+
+TEST(DwgScanWin, SizesOfTwoGibibytesAndMoreAreReadWhole) {
+    TempFolder folder;
+    folder.Write("small.dwg", std::string(19, 'x'));
+    ASSERT_TRUE(MakeSparseFile(folder.File("three.dwg"), 3221225472ull));
+    ASSERT_TRUE(MakeSparseFile(folder.File("five.dwg"), 5368709120ull));
+    ASSERT_EQ(ScanFolderPath(folder.Dir().c_str(), ".dwg"), 1);
+    ASSERT_EQ(DwgList.GetSize(), 3);
+    SortDwgList(DwgSortBySize);
+    EXPECT_EQ(DwgList[0].m_strName, "small.dwg");
+    EXPECT_EQ(DwgList[0].m_nSize, 19u);
+    EXPECT_EQ(DwgList[1].m_strName, "three.dwg");
+    EXPECT_EQ(DwgList[1].m_nSize, 3221225472ull);
+    EXPECT_EQ(DwgList[2].m_strName, "five.dwg");
+    EXPECT_EQ(DwgList[2].m_nSize, 5368709120ull);
 }
 
 TEST(DwgScanWin, MakesFolderCurrentDirectory) {

@@ -23,8 +23,24 @@ TEST(TooltipText, SizeAndDateTexts) {
     EXPECT_EQ(TooltipDateText(&t), "05/03/2021;14.07.09");
 }
 
-TEST(TooltipText, SizePrintedSigned) {
-    EXPECT_EQ(TooltipSizeText(4294967295u), "Size=-1 ");
+TEST(TooltipText, SizesOfTwoGibibytesAndMoreAreUnsignedSixtyFourBit) {
+    EXPECT_EQ(TooltipSizeText(2147483647u), "Size=2147483647 ");
+    EXPECT_EQ(TooltipSizeText(2147483648u), "Size=2147483648 "); // 2 GiB
+    EXPECT_EQ(TooltipSizeText(3221225472u), "Size=3221225472 "); // 3 GiB
+    EXPECT_EQ(TooltipSizeText(4294967295u), "Size=4294967295 ");
+    EXPECT_EQ(TooltipSizeText(4294967296ull), "Size=4294967296 "); // 4 GiB
+    EXPECT_EQ(TooltipSizeText(5368709120ull), "Size=5368709120 "); // 5 GiB
+    EXPECT_EQ(TooltipSizeText(18446744073709551615ull), "Size=18446744073709551615 ");
+}
+
+TEST(TooltipText, FiveGibibyteDrawingTooltip) {
+    const std::tm t = March5();
+    const ThumbTooltip tip = BuildTooltip("huge.dwg", 5368709120ull, &t);
+    EXPECT_EQ(tip.sizeText, "Size=5368709120 ");
+    EXPECT_EQ(tip.width, 19);
+    EXPECT_EQ(tip.text, "huge.dwg            "
+                        "Size=5368709120    "
+                        "05/03/2021;14.07.09");
 }
 
 TEST(TooltipText, FailedConversion) {

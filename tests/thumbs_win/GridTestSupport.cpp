@@ -216,7 +216,7 @@ struct BenchReader : FolderReader {
             std::snprintf(name, sizeof name, "d%05d.dwg", i);
             e.name = name;
             e.timeWrite = 1600000000 + i;
-            e.size = static_cast<std::uint32_t>(1000 + i);
+            e.size = static_cast<std::uint64_t>(1000 + i);
             drawings.emplace_back(std::move(e));
         }
         return true;

@@ -598,25 +598,28 @@ TEST(GridSearch, AHitNearTheEndIsShownWithTheLastRowsFillingTheWindow) {
     EXPECT_EQ(bench.view().GetFirstRow(), 10);
 }
 
-TEST(GridSort, RebuildSortsByTheFrameModeKeepingTheLastRecord) {
+TEST(GridSort, RebuildSortsEveryDrawingByTheFrameMode) {
     GridBench bench(700, 600);
     BeginScan();
-    const char* names[] = {"c.dwg", "a.dwg", "d.dwg", "b.dwg"};
+    // Found last, first by name: it leads the grid.
+    const char* names[] = {"c.dwg", "b.dwg", "d.dwg", "a.dwg"};
     for (int i = 0; i < 4; ++i) {
         DwgFindEntry e;
         e.name = names[i];
-        e.size = static_cast<std::uint32_t>(10 - i);
+        e.size = static_cast<std::uint64_t>(10 - i);
         AppendScanEntry(e);
     }
     EndScan();
     Frame().sortMode = 0;
     bench.view().Rebuild();
     EXPECT_EQ(DwgList[0].m_strName, "a.dwg");
-    EXPECT_EQ(DwgList[1].m_strName, "c.dwg");
-    EXPECT_EQ(DwgList[2].m_strName, "d.dwg");
-    EXPECT_EQ(DwgList[3].m_strName, "b.dwg");
+    EXPECT_EQ(DwgList[1].m_strName, "b.dwg");
+    EXPECT_EQ(DwgList[2].m_strName, "c.dwg");
+    EXPECT_EQ(DwgList[3].m_strName, "d.dwg");
     ASSERT_NE(bench.view().ControlOf(0), nullptr);
     EXPECT_EQ(bench.view().ControlOf(0)->Label().GetWindowText(), "a.dwg");
+    ASSERT_NE(bench.view().ControlOf(3), nullptr);
+    EXPECT_EQ(bench.view().ControlOf(3)->Label().GetWindowText(), "d.dwg");
 }
 
 } // namespace
