@@ -272,7 +272,8 @@ std::wstring LabelUnder(HWND thumbnail) {
     return text;
 }
 
-void PreviewShown(HWND window, const std::wstring& name);
+// name: the file drawn, or nullptr to read the label under the window (counted as measuring).
+void PreviewShown(HWND window, const std::wstring* name);
 
 // The library painting a picture it keeps in memory into a window: a picture on the screen, as when the
 // host's preview operation draws one.
@@ -284,11 +285,8 @@ int WINAPI TimedSetDIBitsToDevice(HDC dc, int x, int y, DWORD width, DWORD heigh
     if (done > 0 && g_inCall && GetCurrentThreadId() == g_uiThread) {
         try {
             HWND window = WindowFromDC(dc);
-            if (window) {
-                Overhead measuring;
-                const std::wstring name = LabelUnder(window);
-                PreviewShown(window, name);
-            }
+            if (window)
+                PreviewShown(window, nullptr);
         } catch (...) {
         }
     }
@@ -446,9 +444,10 @@ void TimingCallEnded() {
 }
 
 namespace {
-void PreviewShown(HWND window, const std::wstring& name) {
+void PreviewShown(HWND window, const std::wstring* fileName) {
     Overhead measuring; // the counting below is the benchmark's cost, not the library's
     const double ms = Elapsed();
+    const std::wstring name = fileName ? *fileName : LabelUnder(window);
     SetPropW(window, kDrawnProperty, reinterpret_cast<HANDLE>(1));
     VisibleCount count;
     count.parent = GetParent(window);
@@ -463,7 +462,8 @@ void PreviewShown(HWND window, const std::wstring& name) {
 void TimingPreviewDrawn(HWND window, const wchar_t* fileName) {
     if (!Host().options.timing)
         return;
-    PreviewShown(window, fileName ? std::wstring(fileName) : std::wstring());
+    const std::wstring name = fileName ? std::wstring(fileName) : std::wstring();
+    PreviewShown(window, &name);
 }
 
 } // namespace devhost
