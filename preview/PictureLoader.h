@@ -24,7 +24,10 @@ public:
     // How long the loader's end waits for the workers before it leaves them to end on their own.
     static constexpr DWORD kEndWaitMs = 100;
 
-    explicit PictureLoader(std::size_t cacheBytes, int workers = kWorkers);
+    // What a worker does with a key: DecodePicture, or a test's stand-in. Called on the workers.
+    using Decoder = Picture (*)(const PictureKey& key);
+
+    explicit PictureLoader(std::size_t cacheBytes, Decoder decode = nullptr, int workers = kWorkers);
     PictureLoader(const PictureLoader&) = delete;
     PictureLoader& operator=(const PictureLoader&) = delete;
     ~PictureLoader();

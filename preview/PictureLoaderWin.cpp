@@ -119,6 +119,7 @@ struct PictureLoader::Shared {
     PictureQueue queue;
     std::vector<std::pair<PictureKey, Picture>> finished;
     HWND window = nullptr; // cleared when the loader goes: nothing is posted after
+    PictureLoader::Decoder decode = &DecodePicture;
     bool stop = false;
     std::size_t readsBegun = 0;
     volatile LONG references = 1; // the loader's
@@ -149,7 +150,12 @@ void Serve(PictureLoader::Shared& shared) {
                 return;
             ++shared.readsBegun;
         }
-        Picture picture = DecodePicture(key);
+        Picture picture;
+        try {
+            picture = shared.decode(key);
+        } catch (...) {
+            picture = Picture(); // DecodePicture never throws; a stand-in might
+        }
         ExclusiveLock hold(shared.lock);
         shared.queue.Finished(key);
         if (shared.stop || !shared.window)
@@ -176,8 +182,10 @@ DWORD WINAPI Work(void* parameter) {
 
 // ---- the loader -------------------------------------------------------------------------------------
 
-PictureLoader::PictureLoader(std::size_t cacheBytes, int workers)
+PictureLoader::PictureLoader(std::size_t cacheBytes, Decoder decode, int workers)
     : m_shared(new Shared), m_cache(cacheBytes), m_nWorkers(workers > 0 ? workers : 1) {
+    if (decode)
+        m_shared->decode = decode;
     const HINSTANCE instance = reinterpret_cast<HINSTANCE>(&__ImageBase);
     WNDCLASSEXW windowClass{};
     windowClass.cbSize = sizeof windowClass;
