@@ -1,6 +1,7 @@
 #include "thumbs/Tessel3View.h"
 
 #include "preview/PictureLoader.h"
+#include "preview/ShowPreview.h"
 #include "res/resource.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
@@ -109,6 +110,7 @@ int CTessel3View::OnCreate(LPCREATESTRUCTA cs) {
     const int cacheMiB = doc ? doc->m_nPictureCacheMiB : CTessel3Doc::kDefaultPictureCacheMiB;
     m_pictures = std::make_unique<PictureLoader>(static_cast<std::size_t>(cacheMiB) << 20);
     m_pictures->onPictureReady = [this](const PictureKey& key) { OnPictureReady(key); };
+    NoteHostPreviewOperation();
     return CScrollView::OnCreate(cs);
 }
 
