@@ -40,8 +40,9 @@ public:
     // Whether the key waits for a worker or is being read.
     bool Knows(const PictureKey& key) const;
     // The pictures wanted now, in the order to read them; waiting reads not named are dropped, and
-    // pictures already in the cache are not read again.
-    void Want(const std::vector<PictureKey>& ordered);
+    // pictures already in the cache are not read again. The first `shown` of them are on the screen:
+    // the cache keeps them whatever its bound.
+    void Want(const std::vector<PictureKey>& ordered, std::size_t shown = 0);
     // Reads begun since the loader was made (the benchmarks' files read).
     std::size_t ReadsBegun() const;
     // Workers started (threads made), for the tests.

@@ -4,6 +4,7 @@
 #include "preview/DrawPreview.h"
 #include "preview/DwgPreview.h"
 
+#include <algorithm>
 #include <cstring>
 #include <utility>
 
@@ -254,7 +255,8 @@ bool PictureLoader::Knows(const PictureKey& key) const {
     return m_shared->queue.Knows(key);
 }
 
-void PictureLoader::Want(const std::vector<PictureKey>& ordered) {
+void PictureLoader::Want(const std::vector<PictureKey>& ordered, std::size_t shown) {
+    m_cache.Pin(std::vector<PictureKey>(ordered.begin(), ordered.begin() + std::min(shown, ordered.size())));
     std::vector<PictureKey> missing;
     missing.reserve(ordered.size());
     for (const PictureKey& key : ordered)

@@ -95,14 +95,20 @@ void PictureCache::Put(const PictureKey& key, Picture picture) {
     Evict(key);
 }
 
+void PictureCache::Pin(const std::vector<PictureKey>& keys) {
+    m_pinned = std::set<PictureKey>(keys.begin(), keys.end());
+}
+
 void PictureCache::Evict(const PictureKey& keep) {
-    while (m_bytes > m_bound && !m_uses.empty()) {
-        const PictureKey& oldest = m_uses.back();
-        if (oldest == keep)
-            break; // only the picture just put is left
-        const auto found = m_entries.find(oldest);
+    // From the least recently used up, past the pictures that must stay.
+    auto use = m_uses.end();
+    while (m_bytes > m_bound && use != m_uses.begin()) {
+        --use;
+        if (*use == keep || m_pinned.count(*use))
+            continue;
+        const auto found = m_entries.find(*use);
         m_bytes -= found->second.cost;
         m_entries.erase(found);
-        m_uses.pop_back();
+        use = m_uses.erase(use);
     }
 }

@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <list>
 #include <map>
+#include <set>
 #include <string>
 #include <tuple>
 #include <vector>
@@ -74,13 +75,16 @@ private:
 };
 
 // Decoded pictures, the least recently used dropped first when the bytes they hold pass the bound. The
-// picture put last is always kept, whatever its size, so that the thumbnail that asked for it shows it.
+// picture put last and the pinned ones (those the screen shows) are always kept, whatever their size: a
+// picture on the screen dropped would be read again as soon as its thumbnail repainted, for ever.
 class PictureCache {
 public:
     explicit PictureCache(std::size_t boundBytes) : m_bound(boundBytes) {}
     // The picture, or nullptr; a hit makes it the most recently used.
     const Picture* Find(const PictureKey& key);
     void Put(const PictureKey& key, Picture picture);
+    // The pictures that must stay (replaces the pinned set); nothing is dropped until the next Put.
+    void Pin(const std::vector<PictureKey>& keys);
     std::size_t Bytes() const { return m_bytes; }
     std::size_t Count() const { return m_entries.size(); }
     std::size_t Bound() const { return m_bound; }
@@ -99,6 +103,7 @@ private:
     std::size_t m_bytes = 0;
     std::map<PictureKey, Entry> m_entries;
     std::list<PictureKey> m_uses; // most recently used first
+    std::set<PictureKey> m_pinned;
 };
 
 // The cache's bound when the settings do not give one: 64 MiB.

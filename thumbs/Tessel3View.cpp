@@ -551,7 +551,12 @@ void CTessel3View::QueuePictures() {
     keys.reserve(order.size());
     for (int index : order)
         keys.push_back(DrawingPictureKey(Folder(), index, area.Width(), area.Height()));
-    m_pictures->Want(keys);
+    // The visible cells come first in the order, the cells ahead after them.
+    const std::size_t shown =
+        static_cast<std::size_t>(std::count_if(order.begin(), order.end(), [&](int index) {
+            return index >= m_nFirstRow * m_nColumns && index < m_nFirstRow * m_nColumns + cells;
+        }));
+    m_pictures->Want(keys, shown);
 }
 
 void CTessel3View::OnPictureReady(const PictureKey& key) {

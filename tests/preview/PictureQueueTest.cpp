@@ -158,6 +158,26 @@ TEST(PictureCache, ThePictureJustPutIsKeptEvenWhenLargerThanTheBound) {
     EXPECT_EQ(cache.Count(), 1u);
 }
 
+TEST(PictureCache, PicturesOnTheScreenAreNeverDropped) {
+    // A screen larger than the bound: its pictures stay, the others go first.
+    const std::size_t one = PictureCache::CostOf(Key("a.dwg"), Pixels(100, 80));
+    PictureCache cache(2 * one);
+    cache.Pin(Keys({"s1.dwg", "s2.dwg", "s3.dwg"}));
+    cache.Put(Key("s1.dwg"), Pixels(100, 80));
+    cache.Put(Key("s2.dwg"), Pixels(100, 80));
+    cache.Put(Key("ahead.dwg"), Pixels(100, 80));
+    cache.Put(Key("s3.dwg"), Pixels(100, 80));
+    EXPECT_EQ(cache.Find(Key("ahead.dwg")), nullptr);
+    EXPECT_NE(cache.Find(Key("s1.dwg")), nullptr);
+    EXPECT_NE(cache.Find(Key("s2.dwg")), nullptr);
+    EXPECT_NE(cache.Find(Key("s3.dwg")), nullptr);
+    // Scrolled on: the old screen may go.
+    cache.Pin(Keys({"t1.dwg"}));
+    cache.Put(Key("t1.dwg"), Pixels(100, 80));
+    EXPECT_LE(cache.Bytes(), cache.Bound());
+    EXPECT_NE(cache.Find(Key("t1.dwg")), nullptr);
+}
+
 TEST(PictureCache, PuttingAKeyAgainReplacesItsPicture) {
     PictureCache cache(kDefaultPictureCacheBytes);
     cache.Put(Key("a.dwg"), Pixels(100, 80));
