@@ -3,6 +3,7 @@
 #   bench_sort, bench_preview   (Windows build, under Wine)
 #   bench_first_paint.sh        LISP call -> first complete paint of the explorer
 #   bench_scroll.sh             one scroll step at the top and at the bottom of the grid
+#   bench_slow_share.sh         first screen, a row step and the host thread's longest wait at 0-50 ms a read
 #   bench_phases.sh             where the milliseconds of the first complete paint go
 #   bench_tree_expand           the folder tree expanding a folder of 2,000 and of 20,000 sub-folders
 #   bench_scan                  folder scan against a bare FindFirstFile loop (last: it makes its folders)
@@ -43,6 +44,8 @@ bench/bench_first_paint.sh
 echo
 echo "== bench_scroll.sh"
 bench/bench_scroll.sh
+echo "== bench_slow_share.sh"
+bench/bench_slow_share.sh
 echo
 echo "== bench_phases.sh"
 bench/bench_phases.sh

@@ -9,7 +9,7 @@ const wchar_t* const kUsage =
     L"                   [--layer NAME=ACI]... [--alert-box] [--after-ms MS --post accept|cancel]\n"
     L"                   [--load FILE]... [--eval EXPR]... [--script FILE] [--verbose] [--timing] "
     L"[--timing-sent]\n"
-    L"                   [--preview real|flat]\n"
+    L"                   [--preview real|flat] [--file-latency MS] [--file-hang NAME]\n"
     L"                   [--check-heaps] [--refuse-window CLASS-PREFIX]\n";
 
 namespace {
@@ -132,6 +132,22 @@ bool ParseOptions(const std::vector<std::wstring>& args, Options& options, std::
                 options.preview = Options::Preview::Flat;
             } else {
                 error = L"--preview takes real or flat, not " + text;
+                return false;
+            }
+        } else if (option == L"--file-latency") {
+            long number = 0;
+            if (!value(text))
+                return false;
+            if (!ParseNumber(text, 0, 60000, number)) {
+                error = L"--file-latency takes milliseconds from 0 to 60000, not " + text;
+                return false;
+            }
+            options.fileLatencyMs = static_cast<int>(number);
+        } else if (option == L"--file-hang") {
+            if (!value(options.fileHang))
+                return false;
+            if (options.fileHang.empty()) {
+                error = L"--file-hang needs a file name";
                 return false;
             }
         } else if (option == L"--check-heaps") {

@@ -140,6 +140,7 @@ const CommandName kCommands[] = {
     {L"count", ScriptCommand::Kind::Count, true, false},
     {L"text", ScriptCommand::Kind::Text, true, true},
     {L"rect", ScriptCommand::Kind::Rect, true, true},
+    {L"rects", ScriptCommand::Kind::Rects, true, false},
     {L"enabled", ScriptCommand::Kind::Enabled, true, true},
     {L"exists", ScriptCommand::Kind::Exists, true, false},
     {L"tooltip", ScriptCommand::Kind::Tooltip, false, false},

@@ -42,6 +42,7 @@ struct ScriptCommand {
         Type,
         Screenshot,
         Count,
+        Rects,
         Text,
         Rect,
         Enabled,

@@ -826,6 +826,15 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
              std::to_wstring(rect.right - rect.left) + L" " + std::to_wstring(rect.bottom - rect.top));
         break;
     }
+    case Kind::Rects:
+        // Every match at once, without waiting: the thumbnails of a grid, however many there are.
+        for (HWND hwnd : FindWindows(command.window)) {
+            RECT rect{};
+            GetWindowRect(hwnd, &rect);
+            Fact(L"rect " + std::to_wstring(rect.left) + L" " + std::to_wstring(rect.top) + L" " +
+                 std::to_wstring(rect.right - rect.left) + L" " + std::to_wstring(rect.bottom - rect.top));
+        }
+        break;
     case Kind::Enabled:
         Fact(L"enabled " + YesNo(IsWindowEnabled(WaitForWindow(command))));
         break;

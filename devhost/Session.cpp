@@ -9,6 +9,7 @@
 #include "devhost/Script.h"
 #include "devhost/ScriptRunner.h"
 #include "devhost/Text.h"
+#include "devhost/FileDelay.h"
 #include "devhost/Timing.h"
 #include "tests/support/MessagePump.h" // pumped wide: devhost's windows are Unicode
 #include "thumbs/AppMessages.h"
@@ -251,6 +252,8 @@ bool Session::LoadLibraryAndEntryPoints() {
     if (m_options.verbose)
         WriteLine(L"[host] loaded " + m_libraryPath);
     TimingWatchLibrary(m_library);
+    FileDelayWatch(m_library);
+    FileDelayWatch(GetModuleHandleW(nullptr)); // the host's own preview operation reads drawings too
     return true;
 }
 

@@ -1,11 +1,13 @@
 #include "devhost/Timing.h"
 
 #include "devhost/HostObjects.h"
+#include "devhost/ImportPatch.h"
 #include "devhost/Output.h"
 
 #include <cstdint>
 #include <cstdio>
 #include <cstring>
+#include <cwchar>
 #include <string>
 
 namespace devhost {
@@ -24,6 +26,7 @@ HHOOK g_sentHook = nullptr;
 bool g_afterKey = false;
 bool g_inCall = false;
 long g_scanEntries = 0;
+DWORD g_uiThread = 0;
 
 // Time devhost spends measuring (counting windows, writing lines) inside the call: left out of every
 // time printed, so that the lines show the library's time and the host's drawing, not the benchmark's.
@@ -246,46 +249,89 @@ int __cdecl TimedFindClose(std::intptr_t search) {
     return result;
 }
 
-// Replaces the address of the imported function `name` in module's import table by `replacement` and
-// returns the address it held (nullptr when the module does not import it).
-void* PatchImport(HMODULE module, const char* name, void* replacement) {
-    auto* base = reinterpret_cast<unsigned char*>(module);
-    const auto* dos = reinterpret_cast<const IMAGE_DOS_HEADER*>(base);
-    const auto* nt = reinterpret_cast<const IMAGE_NT_HEADERS*>(base + dos->e_lfanew);
-    const IMAGE_DATA_DIRECTORY& directory = nt->OptionalHeader.DataDirectory[IMAGE_DIRECTORY_ENTRY_IMPORT];
-    if (!directory.VirtualAddress)
-        return nullptr;
-    for (auto* import = reinterpret_cast<const IMAGE_IMPORT_DESCRIPTOR*>(base + directory.VirtualAddress);
-         import->Name; ++import) {
-        const auto* names = reinterpret_cast<const IMAGE_THUNK_DATA*>(
-            base + (import->OriginalFirstThunk ? import->OriginalFirstThunk : import->FirstThunk));
-        auto* addresses = reinterpret_cast<IMAGE_THUNK_DATA*>(base + import->FirstThunk);
-        for (; names->u1.AddressOfData; ++names, ++addresses) {
-            if (IMAGE_SNAP_BY_ORDINAL(names->u1.Ordinal))
-                continue;
-            const auto* byName =
-                reinterpret_cast<const IMAGE_IMPORT_BY_NAME*>(base + names->u1.AddressOfData);
-            if (std::strcmp(reinterpret_cast<const char*>(byName->Name), name) != 0)
-                continue;
-            DWORD protection = 0;
-            if (!VirtualProtect(&addresses->u1.Function, sizeof addresses->u1.Function, PAGE_READWRITE,
-                                &protection))
-                return nullptr;
-            void* original = reinterpret_cast<void*>(addresses->u1.Function);
-            addresses->u1.Function = reinterpret_cast<ULONG_PTR>(replacement);
-            VirtualProtect(&addresses->u1.Function, sizeof addresses->u1.Function, protection, &protection);
-            return original;
-        }
-    }
-    return nullptr;
+using SetDIBitsToDeviceFn = int(WINAPI*)(HDC, int, int, DWORD, DWORD, int, int, UINT, UINT, const VOID*,
+                                         const BITMAPINFO*, UINT);
+SetDIBitsToDeviceFn g_setDIBitsToDevice = nullptr;
+
+// The name shown under a thumbnail: the label a person reads there (a sibling edit just below it).
+std::wstring LabelUnder(HWND thumbnail) {
+    HWND parent = GetParent(thumbnail);
+    if (!parent)
+        return std::wstring();
+    RECT rc;
+    GetWindowRect(thumbnail, &rc);
+    POINT below{(rc.left + rc.right) / 2, rc.bottom + 4};
+    ScreenToClient(parent, &below);
+    HWND label = ChildWindowFromPointEx(parent, below, CWP_SKIPINVISIBLE | CWP_SKIPTRANSPARENT);
+    wchar_t className[32] = L"";
+    if (!label || label == parent || !GetClassNameW(label, className, 32) ||
+        lstrcmpiW(className, L"Edit") != 0)
+        return std::wstring();
+    wchar_t text[MAX_PATH] = L"";
+    GetWindowTextW(label, text, MAX_PATH);
+    return text;
 }
 
-template <class Fn> bool Watch(HMODULE module, const char* name, Fn replacement, Fn& original) {
-    void* was = PatchImport(module, name, reinterpret_cast<void*>(replacement));
-    if (!was)
-        return false;
-    original = reinterpret_cast<Fn>(was);
-    return true;
+// name: the file drawn, or nullptr to read the label under the window (counted as measuring).
+void PreviewShown(HWND window, const std::wstring* name);
+
+// The library painting a picture it keeps in memory into a window: a picture on the screen, as when the
+// host's preview operation draws one.
+int WINAPI TimedSetDIBitsToDevice(HDC dc, int x, int y, DWORD width, DWORD height, int sourceX, int sourceY,
+                                  UINT startScan, UINT lines, const VOID* bits, const BITMAPINFO* info,
+                                  UINT use) {
+    const int done =
+        g_setDIBitsToDevice(dc, x, y, width, height, sourceX, sourceY, startScan, lines, bits, info, use);
+    if (done > 0 && g_inCall && GetCurrentThreadId() == g_uiThread) {
+        try {
+            HWND window = WindowFromDC(dc);
+            if (window)
+                PreviewShown(window, nullptr);
+        } catch (...) {
+        }
+    }
+    return done;
+}
+
+// --timing's watch of the user-interface thread from outside: a thread of devhost's sends WM_NULL to the
+// explorer's frame every 10 ms and keeps the longest time one went unanswered.
+struct Pinger {
+    volatile LONG stop = 0;
+    volatile LONG longestMicro = 0;
+    DWORD uiThread = 0;
+};
+Pinger* g_pinger = nullptr;
+
+BOOL CALLBACK FindExplorer(HWND window, LPARAM found) {
+    wchar_t className[16] = L"";
+    if (IsWindowVisible(window) && GetClassNameW(window, className, 16) &&
+        std::wcsncmp(className, L"Orvex1:", 7) == 0) {
+        *reinterpret_cast<HWND*>(found) = window;
+        return FALSE;
+    }
+    return TRUE;
+}
+
+DWORD WINAPI PingExplorer(void* parameter) {
+    Pinger* pinger = static_cast<Pinger*>(parameter);
+    LARGE_INTEGER frequency;
+    QueryPerformanceFrequency(&frequency);
+    while (!pinger->stop) {
+        HWND explorer = nullptr;
+        EnumThreadWindows(pinger->uiThread, &FindExplorer, reinterpret_cast<LPARAM>(&explorer));
+        if (explorer) {
+            const LONGLONG begin = Now();
+            DWORD_PTR answer = 0;
+            SendMessageTimeoutW(explorer, WM_NULL, 0, 0, SMTO_NORMAL, 120000, &answer);
+            const LONGLONG micro = (Now() - begin) * 1000000 / frequency.QuadPart;
+            if (!pinger->stop && micro > pinger->longestMicro)
+                InterlockedExchange(&pinger->longestMicro, static_cast<LONG>(micro));
+        }
+        Sleep(10);
+    }
+    // The call's end took the figure; the pinger is devhost's, freed by its own thread.
+    delete pinger;
+    return 0;
 }
 
 struct VisibleCount {
@@ -339,6 +385,7 @@ void TimingWatchLibrary(HMODULE library) {
     if (!Watch(library, "_findnext64", &TimedFindNext, g_findNext))
         Watch(library, "_findnext64i32", &TimedFindNext, g_findNext);
     Watch(library, "_findclose", &TimedFindClose, g_findClose);
+    Watch(library, "SetDIBitsToDevice", &TimedSetDIBitsToDevice, g_setDIBitsToDevice);
 }
 
 void TimingCallBegins() {
@@ -357,14 +404,34 @@ void TimingCallBegins() {
     if (!g_sentHook && Host().options.timingSent)
         g_sentHook = SetWindowsHookExW(WH_CALLWNDPROC, &SentMessageHook, nullptr, GetCurrentThreadId());
     g_inCall = true;
+    g_uiThread = GetCurrentThreadId();
     Line(0.0, L"call");
+    g_pinger = new Pinger;
+    g_pinger->uiThread = g_uiThread;
+    HANDLE thread = CreateThread(nullptr, 0, &PingExplorer, g_pinger, 0, nullptr);
+    if (thread)
+        CloseHandle(thread);
+    else {
+        delete g_pinger;
+        g_pinger = nullptr;
+    }
 }
 
 void TimingCallEnded() {
     if (!Host().options.timing)
         return;
     g_inCall = false;
-    Line(Elapsed(), L"call-end");
+    const double end = Elapsed();
+    if (g_pinger) {
+        // Read before the stop: a send still waiting would count the time after the call.
+        const LONG longest = g_pinger->longestMicro;
+        InterlockedExchange(&g_pinger->stop, 1);
+        g_pinger = nullptr;
+        wchar_t number[32];
+        std::swprintf(number, sizeof number / sizeof number[0], L"%.3f", longest / 1000.0);
+        Line(end, L"longest-unanswered " + std::wstring(number));
+    }
+    Line(end, L"call-end");
     if (g_hook)
         UnhookWindowsHookEx(g_hook);
     g_hook = nullptr;
@@ -376,19 +443,27 @@ void TimingCallEnded() {
     g_sentHook = nullptr;
 }
 
-void TimingPreviewDrawn(HWND window, const wchar_t* fileName) {
-    if (!Host().options.timing)
-        return;
+namespace {
+void PreviewShown(HWND window, const std::wstring* fileName) {
     Overhead measuring; // the counting below is the benchmark's cost, not the library's
     const double ms = Elapsed();
+    const std::wstring name = fileName ? *fileName : LabelUnder(window);
     SetPropW(window, kDrawnProperty, reinterpret_cast<HANDLE>(1));
     VisibleCount count;
     count.parent = GetParent(window);
     GetClassNameW(window, count.className, 128);
     if (count.parent)
         EnumChildWindows(count.parent, &CountSibling, reinterpret_cast<LPARAM>(&count));
-    Line(ms, L"preview " + std::to_wstring(count.drawn) + L"/" + std::to_wstring(count.visible) + L" " +
-                 (fileName ? std::wstring(fileName) : std::wstring()));
+    Line(ms,
+         L"preview " + std::to_wstring(count.drawn) + L"/" + std::to_wstring(count.visible) + L" " + name);
+}
+} // namespace
+
+void TimingPreviewDrawn(HWND window, const wchar_t* fileName) {
+    if (!Host().options.timing)
+        return;
+    const std::wstring name = fileName ? std::wstring(fileName) : std::wstring();
+    PreviewShown(window, &name);
 }
 
 } // namespace devhost

@@ -3,14 +3,20 @@
 // (counting windows, writing these lines). Used on the user-interface thread only.
 //
 //   [timing] 0.000 call                   the call begins (the clock starts)
-//   [timing] MS preview DRAWN/VISIBLE NAME a preview was drawn into a window: VISIBLE windows of that
-//                                          window's class are shown inside their parent's client area
-//                                          (the thumbnails one can see), DRAWN of them have had a preview
-//                                          drawn since they were created
+//   [timing] MS preview DRAWN/VISIBLE NAME a preview was drawn into a window, by the host's preview
+//                                          operation or by the library from a picture it keeps in memory
+//                                          (SetDIBitsToDevice, seen in its import table; NAME is then the
+//                                          label under the window): VISIBLE windows of that window's class
+//                                          are shown inside their parent's client area (the thumbnails one
+//                                          can see), DRAWN of them have had a preview drawn since they were
+//                                          created
 //   [timing] MS key VK                    the user-interface thread took a key press (WM_KEYDOWN) from its
 //                                          queue; VK is the virtual-key code in decimal
 //   [timing] MS key-handled               the next message it took after that key: the key's handling
 //                                          had ended
+//   [timing] MS longest-unanswered W      at the call's end: the longest time W (ms) a WM_NULL sent to the
+//                                          explorer's frame every 10 ms by a thread of devhost waited for
+//                                          the user-interface thread to take it
 //   [timing] MS call-end                  the call returned
 //   [timing] MS create CLASS in PARENT    the thread is about to create a window of CLASS, child of a
 //                                          window of PARENT ("-": a top-level window)

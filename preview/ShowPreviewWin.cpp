@@ -9,3 +9,8 @@ bool ShowDwgPreview(HWND window, const wchar_t* fileName, std::uint32_t backgrou
     ReportMissingHostOperation("acdbDisplayPreviewFromDwg", "the library draws the previews itself");
     return DrawDwgPreviewInWindow(window, fileName, static_cast<COLORREF>(background));
 }
+
+void NoteHostPreviewOperation() {
+    if (!Host().acdbDisplayPreviewFromDwg)
+        ReportMissingHostOperation("acdbDisplayPreviewFromDwg", "the library draws the previews itself");
+}

@@ -48,6 +48,9 @@ void CTessel3Doc::Load(const std::string& settingsFile) {
         m_nPictureWidth = LenientInt(m_IniFile.GetValue(kSectionView, "PictureWidth"));
         m_nPictureHeight = LenientInt(m_IniFile.GetValue(kSectionView, "PictureHeight"));
         m_nSort = LenientInt(m_IniFile.GetValue(kSectionView, "Sort"));
+        const int cacheMiB = LenientInt(m_IniFile.GetValue(kSectionView, "PictureCacheMiB"));
+        if (cacheMiB >= 1 && cacheMiB <= 1024)
+            m_nPictureCacheMiB = cacheMiB;
     }
     if (m_nSplitterSize == 0)
         m_nSplitterSize = kDefaultSplitterSize;

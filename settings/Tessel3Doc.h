@@ -28,6 +28,10 @@ public:
     int m_nPictureWidth = 0;    // thumbnail picture size, used when both  [View] PictureWidth
     int m_nPictureHeight = 0;   // are non-zero                            [View] PictureHeight
     int m_nSort = 0;            // 0 name, 1 date, 2 size                  [View] Sort
+    // The bound of the decoded pictures kept in memory, in MiB (1 to 1024; [View] PictureCacheMiB). Only
+    // read: a key the user set stays in the file as written, like any key the explorer does not change.
+    int m_nPictureCacheMiB = kDefaultPictureCacheMiB;
+    static constexpr int kDefaultPictureCacheMiB = 64;
 
     // Kept for the document's lifetime so keys the explorer does not know survive the save.
     CIniFile m_IniFile;

@@ -20,6 +20,8 @@ constexpr UINT WM_ORVEX_OPEN_TARGET = WM_USER + 0x322;
 constexpr UINT WM_ORVEX_WALK_START = WM_USER + 0x323;
 // Posted to the grid view by itself: make the windows of the pool rows its layout left for later.
 constexpr UINT WM_ORVEX_MORE_ROWS = WM_USER + 0x325;
+// The grid tells its picture loader what the screen wants now, once the message being handled is done.
+constexpr UINT WM_ORVEX_PICTURES = WM_USER + 0x326;
 // Posted to the folder tree by itself when created: take the shell's image list of small icons.
 constexpr UINT WM_ORVEX_TREE_ICONS = WM_USER + 0x324;
 

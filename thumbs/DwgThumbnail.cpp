@@ -1,6 +1,7 @@
 #include "thumbs/DwgThumbnail.h"
 
 #include "hostapi/TextConv.h"
+#include "preview/PictureLoader.h"
 #include "preview/ShowPreview.h"
 #include "res/resource.h"
 #include "thumbs/DrawingFolder.h"
@@ -22,6 +23,20 @@ int ThumbnailLabelHeight() {
         return grid::LabelHeight(tm.tmHeight, ::GetSystemMetrics(SM_CYEDGE));
     }();
     return height;
+}
+
+PictureKey DrawingPictureKey(const DrawingFolder& folder, int index, int width, int height) {
+    PictureKey key;
+    if (index < 0 || index >= folder.Count())
+        return key;
+    const DwgData& record = folder.Drawing(index);
+    key.path = folder.PathOf(index);
+    key.fileSize = record.m_nSize;
+    key.writeTime = record.m_timeWrite;
+    key.width = width;
+    key.height = height;
+    key.background = kThumbnailBackground;
+    return key;
 }
 
 // ---- the label --------------------------------------------------------------------------------------
@@ -236,10 +251,27 @@ bool exCDwgThumbnail::DestroyWindow() {
 
 void exCDwgThumbnail::OnPaint() {
     CPaintDC dc(m_hWnd);
-    // The bare name: the host resolves it against the current directory, which the scan set.
+    PictureLoader* pictures = m_pOwner ? m_pOwner->Pictures() : nullptr;
+    const Picture* picture = nullptr;
+    PictureKey key;
+    if (pictures) {
+        const CRect client = GetClientRect();
+        key = DrawingPictureKey(m_pOwner->Folder(), m_nListIndex, client.Width(), client.Height());
+        picture = pictures->Find(key);
+        if (picture && picture->state != PictureState::HostDraws && PaintPicture(dc.GetSafeHdc(), *picture))
+            return;
+        if (!picture) {
+            // Read by the loader's workers; this control repaints when the picture arrives.
+            PaintLoading(dc.GetSafeHdc(), client, static_cast<COLORREF>(kThumbnailBackground));
+            if (!pictures->Knows(key))
+                m_pOwner->OnThumbnailPictureMissing();
+            return;
+        }
+    }
+    // No loader, or a picture only the host can draw: the host's operation, on this thread. The bare
+    // name: the host resolves it against the current directory, which the scan set.
     const std::wstring wide = WidenAnsi(m_strName);
-    const std::uint32_t background = 0;
-    ShowDwgPreview(m_hWnd, wide.c_str(), background);
+    ShowDwgPreview(m_hWnd, wide.c_str(), kThumbnailBackground);
 }
 
 LRESULT exCDwgThumbnail::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {

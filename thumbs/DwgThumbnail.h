@@ -10,10 +10,13 @@
 
 #include "framework/afxwin.h"
 #include "framework/afxbars.h" // CToolTipCtrl
+#include "preview/PictureQueue.h"
 
+#include <cstdint>
 #include <string>
 
 class DrawingFolder;
+class PictureLoader;
 
 // What the user did on a thumbnail, as its owner (the grid) hears it, and what the thumbnail asks of it.
 // The owner decides what each gesture means for the selection, the chosen drawing and the files.
@@ -35,6 +38,10 @@ public:
     // again once the message is done); anything else: the old name must come back.
     enum class RenameOutcome { Renamed, Refused };
     virtual RenameOutcome OnThumbnailRename(const std::string& oldName, const std::string& newName) = 0;
+    // The loader of the pictures; nullptr: the host's preview operation draws on each paint.
+    virtual PictureLoader* Pictures() = 0;
+    // A thumbnail painted its loading state: the owner queues the reads of what the screen shows.
+    virtual void OnThumbnailPictureMissing() = 0;
 
 protected:
     ~ThumbnailOwner() = default;
@@ -42,6 +49,13 @@ protected:
 
 // Height of a thumbnail's label, measured once from the system's font.
 int ThumbnailLabelHeight();
+
+// The background behind a thumbnail's picture (0x00BBGGRR), as the host's preview operation is asked
+// to draw it.
+constexpr std::uint32_t kThumbnailBackground = 0;
+
+// The picture of drawing `index` of folder at a picture area of width x height.
+PictureKey DrawingPictureKey(const DrawingFolder& folder, int index, int width, int height);
 
 // The label: a read-only edit that becomes the rename field.
 class CThumbLabel : public CEdit {

@@ -1,5 +1,7 @@
 #include "thumbs/Tessel3View.h"
 
+#include "preview/PictureLoader.h"
+#include "preview/ShowPreview.h"
 #include "res/resource.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
@@ -105,6 +107,10 @@ int CTessel3View::OnCreate(LPCREATESTRUCTA cs) {
         m_nCellHeight = size.height;
         m_nCellWidth = size.width;
     }
+    const int cacheMiB = doc ? doc->m_nPictureCacheMiB : CTessel3Doc::kDefaultPictureCacheMiB;
+    m_pictures = std::make_unique<PictureLoader>(static_cast<std::size_t>(cacheMiB) << 20);
+    m_pictures->onPictureReady = [this](const PictureKey& key) { OnPictureReady(key); };
+    NoteHostPreviewOperation();
     return CScrollView::OnCreate(cs);
 }
 
@@ -561,6 +567,52 @@ void CTessel3View::Layout() {
         top += g.RowPitch();
     }
     ScrollToPosition(GetScrollPosition());
+    SchedulePictures();
+}
+
+// ---- pictures ---------------------------------------------------------------------------------------
+
+void CTessel3View::SchedulePictures() {
+    if (!m_bPicturesPending && m_pictures && m_hWnd && PostMessage(WM_ORVEX_PICTURES))
+        m_bPicturesPending = true;
+}
+
+void CTessel3View::QueuePictures() {
+    m_bPicturesPending = false;
+    if (!m_pictures || !m_pFolder || m_nColumns <= 0)
+        return;
+    if (m_nFirstRow != m_nQueuedFirstRow)
+        m_nScrollDirection = m_nFirstRow > m_nQueuedFirstRow ? 1 : -1;
+    m_nQueuedFirstRow = m_nFirstRow;
+    // Every picture area has the size of the first live control's client area.
+    CRect area;
+    for (const auto& control : m_pool)
+        if (control->m_hWnd) {
+            area = control->GetClientRect();
+            break;
+        }
+    if (area.Width() <= 0 || area.Height() <= 0)
+        return;
+    // The visible rows and the one shown in part below them, then as many ahead.
+    const int cells = (m_nVisibleRows + 1) * m_nColumns;
+    const std::vector<int> order =
+        PictureOrder(m_nFirstRow * m_nColumns, cells, cells, m_nScrollDirection, m_nCount);
+    std::vector<PictureKey> keys;
+    keys.reserve(order.size());
+    for (int index : order)
+        keys.push_back(DrawingPictureKey(Folder(), index, area.Width(), area.Height()));
+    // The visible cells come first in the order, the cells ahead after them.
+    const std::size_t shown =
+        static_cast<std::size_t>(std::count_if(order.begin(), order.end(), [&](int index) {
+            return index >= m_nFirstRow * m_nColumns && index < m_nFirstRow * m_nColumns + cells;
+        }));
+    m_pictures->Want(keys, shown);
+}
+
+void CTessel3View::OnPictureReady(const PictureKey& key) {
+    for (const auto& control : m_pool)
+        if (control->m_hWnd && Folder().PathOf(control->ListIndex()) == key.path)
+            ::InvalidateRect(control->m_hWnd, nullptr, FALSE);
 }
 
 CPoint CTessel3View::SheetOrigin() const {
@@ -737,6 +789,7 @@ void CTessel3View::ApplyLineStep(const grid::LineStep& step, const grid::ScrollS
     if (!step.moved)
         return;
     m_nFirstRow = after.firstRow;
+    SchedulePictures();
     // The contents always move by exactly one row, whatever the capped scroll bar could show.
     ::SetScrollPos(m_hWnd, SB_VERT, after.y, TRUE);
     ScrollWindow(0, -direction * Geometry().RowPitch());
@@ -908,6 +961,7 @@ void CTessel3View::OnDraw(CDC* pDC) {
 
 void CTessel3View::OnDestroy() {
     DestroyPool();
+    m_pictures.reset(); // within PictureLoader::kEndWaitMs, even with a read that never returns
     CScrollView::OnDestroy();
 }
 
@@ -918,6 +972,9 @@ LRESULT CTessel3View::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
         return 0;
     case WM_ORVEX_MORE_ROWS:
         CreatePendingRows();
+        return 0;
+    case WM_ORVEX_PICTURES:
+        QueuePictures();
         return 0;
     case WM_PRINTCLIENT: {
         // Drawing into a given DC (screenshots, print-window): the background and the rename edge.

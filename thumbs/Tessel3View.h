@@ -25,6 +25,7 @@
 #include <vector>
 
 class CTessel3Doc;
+class PictureLoader;
 class CTessel3View;
 class DrawingFolder;
 
@@ -193,6 +194,14 @@ private:
     void OnThumbnailKey(WPARAM key, LPARAM data) override;
     void OnThumbnailMouseDown() override;
     RenameOutcome OnThumbnailRename(const std::string& oldName, const std::string& newName) override;
+    PictureLoader* Pictures() override { return m_pictures.get(); }
+    void OnThumbnailPictureMissing() override { SchedulePictures(); }
+    // Asks for QueuePictures once the message being handled is done (WM_ORVEX_PICTURES).
+    void SchedulePictures();
+    // Tells the loader which pictures the screen wants now: the visible cells, then one screen ahead.
+    void QueuePictures();
+    // A picture arrived: the controls that show that drawing repaint.
+    void OnPictureReady(const PictureKey& key);
     void RunThumbnailCommand(int index, int command);
     void TakeFocusFromElsewhere();
     // After a file command: the folder is read again; a failure is said (names: the drawings it was for).
@@ -250,4 +259,10 @@ private:
     CGridSheet m_wndSheet{*this};
     // The controls live on the heap: resizing the pool never moves or copies a live window.
     std::vector<std::unique_ptr<exCDwgThumbnail>> m_pool;
+    // The pictures, read and decoded off this thread; made with the window, ended with it (after the
+    // pool, whose controls paint from it).
+    std::unique_ptr<PictureLoader> m_pictures;
+    bool m_bPicturesPending = false; // WM_ORVEX_PICTURES is posted and not handled yet
+    int m_nQueuedFirstRow = 0;       // the first row when the pictures were last queued
+    int m_nScrollDirection = 1;      // of the last scroll: 1 down, -1 up
 };

@@ -67,6 +67,19 @@ TEST(Options, EveryOption) {
     EXPECT_TRUE(Parse({L"--timing-sent"}).timingSent);
     EXPECT_FALSE(Parse({L"--timing"}).timingSent);
     EXPECT_EQ(Parse({L"--preview", L"real"}).preview, Options::Preview::Real);
+    EXPECT_EQ(Parse({}).fileLatencyMs, 0);
+    EXPECT_EQ(Parse({L"--file-latency", L"20"}).fileLatencyMs, 20);
+    EXPECT_TRUE(Parse({}).fileHang.empty());
+    EXPECT_EQ(Parse({L"--file-hang", L"b.dwg"}).fileHang, L"b.dwg");
+}
+
+TEST(Options, FileDelaysRefused) {
+    EXPECT_EQ(Error({L"--file-latency", L"-1"}),
+              L"--file-latency takes milliseconds from 0 to 60000, not -1");
+    EXPECT_EQ(Error({L"--file-latency", L"60001"}),
+              L"--file-latency takes milliseconds from 0 to 60000, not 60001");
+    EXPECT_EQ(Error({L"--file-latency"}), L"--file-latency needs a value");
+    EXPECT_EQ(Error({L"--file-hang", L""}), L"--file-hang needs a file name");
 }
 
 TEST(Options, BadUsage) {
@@ -80,7 +93,8 @@ TEST(Options, BadUsage) {
     EXPECT_EQ(Error({L"--layer", L"A=257"}), L"--layer takes NAME=ACI with ACI from 0 to 256, not A=257");
     EXPECT_EQ(Error({L"--after-ms", L"10"}), L"--after-ms and --post go together");
     EXPECT_EQ(Error({L"--post", L"accept"}), L"--after-ms and --post go together");
-    EXPECT_EQ(Error({L"--refuse-window", L""}), L"--refuse-window needs the beginning of a window class name");
+    EXPECT_EQ(Error({L"--refuse-window", L""}),
+              L"--refuse-window needs the beginning of a window class name");
     EXPECT_EQ(Error({L"--preview", L"blurry"}), L"--preview takes real or flat, not blurry");
     EXPECT_EQ(Error({L"--preview"}), L"--preview needs a value");
     EXPECT_EQ(Error({L"--after-ms", L"10", L"--post", L"maybe"}),

@@ -405,3 +405,20 @@ TEST_F(Tessel3DocGuardTest, AFolderWithALineBreakIsNeverWrittenAndLaterClosesSti
     EXPECT_NE(ReadBytes(fileName).find("WindowWidth=700\r\n"), std::string::npos)
         << "the next close saves: nothing is frozen";
 }
+
+TEST_F(Tessel3DocTest, ThePictureCacheBoundIsReadInMiBAndKeptAsWritten) {
+    const std::string fileName = m_dir.File("Orvex1.ini");
+    EXPECT_EQ(CTessel3Doc(m_dir.File("none.ini")).m_nPictureCacheMiB, 64);
+    const std::string text = "[View]\r\nPictureCacheMiB=200\r\n";
+    WriteBytes(fileName, text);
+    {
+        CTessel3Doc doc(fileName);
+        EXPECT_EQ(doc.m_nPictureCacheMiB, 200);
+    }
+    EXPECT_NE(ReadBytes(fileName).find("PictureCacheMiB=200\r\n"), std::string::npos)
+        << "the key survives the save";
+    for (const char* refused : {"0", "-5", "1025", "lots"}) {
+        WriteBytes(fileName, std::string("[View]\r\nPictureCacheMiB=") + refused + "\r\n");
+        EXPECT_EQ(CTessel3Doc(fileName).m_nPictureCacheMiB, 64) << refused;
+    }
+}

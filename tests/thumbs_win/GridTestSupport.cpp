@@ -66,6 +66,14 @@ BenchFileCommands& BenchFiles() {
 
 // ---- host ---------------------------------------------------------------------------------------------
 
+void SettlePictures() {
+    for (int i = 0; i < 10; ++i) {
+        Pump();
+        ::MsgWaitForMultipleObjects(0, nullptr, FALSE, 30, QS_ALLINPUT);
+    }
+    Pump();
+}
+
 PaintRecord& Paints() {
     static PaintRecord record;
     return record;

@@ -83,6 +83,8 @@ protected:
 // Dispatches everything queued, offering each message to PreTranslateMessage first, as the explorer's
 // modal loop does.
 void Pump();
+// Pumps for a while, resting between rounds: the picture loader's workers hand their pictures over.
+void SettlePictures();
 // A key pressed on the window that has the focus: real input when the window is in the foreground,
 // otherwise the same messages posted to the focus window; then pumped.
 void PressKey(WORD vk);

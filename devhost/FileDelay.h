@@ -1,0 +1,16 @@
+// --file-latency MS and --file-hang NAME: a drawing library on a slow or stopped file server. Every read
+// of a drawing file (*.dwg) in the process, the library's and devhost's own preview operation's, waits MS
+// milliseconds first, on the thread that reads; a read of the file NAME (its last path component, case
+// ignored) waits until the process ends. Done through the modules' import tables (the C runtime's file
+// functions and the system's): the library is not changed and exports nothing for it.
+#pragma once
+
+#include <windows.h>
+
+namespace devhost {
+
+// Slows the drawing file reads of module (the library, or devhost.exe itself) as the options say;
+// nothing when neither option is given.
+void FileDelayWatch(HMODULE module);
+
+} // namespace devhost
