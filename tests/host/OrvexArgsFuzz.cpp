@@ -94,6 +94,10 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         accept = a[3]->resval.rstring;
         cancel = a[4]->resval.rstring;
         valid = path.size() < kPathChars && accept.size() < kCaptionChars && cancel.size() < kCaptionChars;
+        // A start path with a line break or another control character is refused.
+        for (const wchar_t c : path)
+            if (c < 0x20 || c == 0x7F)
+                valid = false;
     }
 
     FuzzPlatform platform;
