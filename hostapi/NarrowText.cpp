@@ -113,3 +113,11 @@ bool ContainsForbiddenCharacter(const std::string& name, const LeadByteTable& le
     }
     return false;
 }
+
+std::string CharactersAndBytes(const std::string& text, const LeadByteTable& lead) {
+    const std::size_t characters = CharacterCount(text, lead);
+    std::string length = std::to_string(characters) + " characters";
+    if (characters != text.size())
+        length += ", " + std::to_string(text.size()) + " bytes";
+    return length;
+}

@@ -61,3 +61,7 @@ std::vector<std::string> SplitLabelPath(const std::string& labelPath,
 
 // True when name holds a character a file name cannot: \ / : * ? " < > | or a control character.
 bool ContainsForbiddenCharacter(const std::string& name, const LeadByteTable& lead = ActiveLeadBytes());
+
+// A length for a message about a buffer of bytes: "12 characters" when each character is one byte, else
+// "161 characters, 301 bytes" (the limit is then to be said in bytes too).
+std::string CharactersAndBytes(const std::string& text, const LeadByteTable& lead = ActiveLeadBytes());

@@ -163,3 +163,14 @@ TEST(NarrowText, ActiveCodePageHasNoLeadBytesHere) {
 }
 
 } // namespace
+
+namespace {
+
+TEST(NarrowText, LengthsForMessages) {
+    EXPECT_EQ(CharactersAndBytes("C:\\dwg", LeadBytesOfCodePage(932)), "6 characters");
+    EXPECT_EQ(CharactersAndBytes("C:\\\x83\x5C\x83\x74\x83\x67", LeadBytesOfCodePage(932)),
+              "6 characters, 9 bytes");
+    EXPECT_EQ(CharactersAndBytes("C:\\\x83\x5C\x83\x74\x83\x67", LeadBytesOfCodePage(1252)), "9 characters");
+}
+
+} // namespace

@@ -29,8 +29,15 @@ tree clean thumbs/Walk.cpp '#include "hostapi/NarrowText.h"
 bool Ends(const std::string& p) { return EndsWithSeparator(p); }
 std::string Root(const std::string& p) { return p.substr(0, 3); }
 bool Drive(const std::string& p) { return p[2] == '"'"'\\'"'"'; } // one byte: after "C:" a byte is a character
-const char* kSet = "\\/:";'
+const char* kSet = "\\/:";
+// one byte: the third byte after "C:" starts a character
+bool Drive3(const std::string& p) { return p[2] != '"'"'\\'"'"'; }'
 run "walks by character, comments and marked drive tests pass" 0
+
+tree marked-too-far thumbs/Walk.cpp '// one byte: the third byte after "C:" starts a character
+
+bool Drive3(const std::string& p) { return p[2] != '"'"'\\'"'"'; }'
+run "a mark two lines up does not count" 1
 
 tree back thumbs/Scan.cpp 'bool Ends(const std::string& p) { return p.back() == '"'"'\\'"'"'; }'
 run "a last byte compared with a backslash fails" 1 \
