@@ -170,6 +170,23 @@ expect_line "932: 能 pasted into the search edit" "[script] text 能"
 expect_line "932: the search chose 能力.dwg, which accept returns" \
   "=> (\"$(picked "$lib932/ソフト/図表/能力.dwg")\" (\"\" \"\" \"\"))"
 
+# A tooltip shows name, size and date on three lines: a Japanese name whole on its line, the tooltip as
+# high as an English name's.
+drawing "$lib932/tips/ソフトウェア設計図.dwg" "$lib932/tips/software-plan.dwg"
+hover() { printf '%s\n' "move class=Edit text=\"$1\" at=60,-50" 'sleep 300' "move class=Edit text=\"$1\" at=70,-55" \
+  'sleep 1500' 'tooltip' 'rect class=tooltips_class32'; }
+script 'wait contains=".dwg" timeout=30000' "$(hover "ソフトウェア設計図.dwg")" \
+       "screenshot class=tooltips_class32 $(winpath "$WORK/cp932-tooltip.png")" "$(shot cp932-tooltip-frame)" \
+       'move class=Edit text="software-plan.dwg" at=60,10' 'sleep 500' "$(hover "software-plan.dwg")" \
+       "screenshot class=tooltips_class32 $(winpath "$WORK/cp932-tooltip-ascii.png")" 'key escape'
+in_locale ja_JP.UTF-8 run "$(call_at "$lib932/tips")"
+heights=$(printf '%s\n' "$OUT" | sed -n 's/^\[script\] rect [-0-9]* [-0-9]* [0-9]* \([0-9]*\)$/\1/p' | tr '\n' ' ' | sed 's/ $//')
+tips=$(printf '%s\n' "$OUT" | sed -n 's/^\[script\] tooltip //p')
+expect_true "932: the tooltips name their drawings (got $(tr '\n' '|' <<<"$tips"))" \
+  [ "$(sed -n 1p <<<"$tips" | cut -d' ' -f1)" == "ソフトウェア設計図.dwg" ]
+expect_true "932: a Japanese name's tooltip is as high as an English one's (got heights $heights)" \
+  bash -c '[ $# -eq 2 ] && [ "$1" -eq "$2" ]' _ $heights
+
 rm -f "$WORK/lib/Orvex1.ini"
 # --- 949: a Korean folder listed and sorted by name ------------------------------------------------------
 lib949="$base/kr/lib"
