@@ -89,6 +89,27 @@ expect_true "936: its labels are whole (got $(labels))" [ "$(labels)" == "plan.d
 expect_line "936: the pick returns the drawing of 運 with 運's settings" \
   "=> (\"$(picked "$lib936/運/plan.dwg")\" (\"墙\" \"3\" \"(c:ins)\"))"
 
+# The folder's settings edited in 運 from the tree's menu: the dialog shows 運's layer, writes 運\datains.ini
+# in the code page (not 運datains.ini beside it), the toolbar and the pick follow.
+shell936=$(ini_value ShellPath | iconv -f CP936 -t UTF-8)
+expect_true "936: the tree's label path ends in 運 (got $shell936)" [ "${shell936##*\\}" == "運" ]
+dialog='class=#32770 text="Folder settings"'
+erase7=('key backspace' 'key backspace' 'key backspace' 'key backspace' 'key backspace' 'key backspace' 'key backspace')
+script 'wait contains=".dwg" timeout=30000' "tree-right-click $tree path=\"$shell936\"" 'wait class=#32768 timeout=5000' \
+       'click class=#32768 at=30,10' "wait $dialog timeout=5000" "text $dialog > id=1017" \
+       "click $dialog > id=201" 'key end' "${erase7[@]}" 'type "(c:door)"' \
+       "screenshot $dialog $(winpath "$WORK/cp936-folder-settings.png")" "click $dialog > id=1" \
+       "gone $dialog timeout=5000" 'sleep 300' 'text contains="Layer name:"' "$(shot cp936-settings-saved)" \
+       'double-click class=Edit text="門.dwg" at=60,-50'
+in_locale zh_CN.UTF-8 run "$(call_at "$lib936/運")"
+expect_line "936: the dialog shows 運's layer" "[script] text 墙"
+expect_line "936: the toolbar shows it after Accept" "[script] text  Layer name: 墙"
+expect_true "936: 運\\datains.ini holds the new command ($(iconv -f CP936 -t UTF-8 <"$lib936/運/datains.ini" | tr -d '\r' | tr '\n' '|'))" \
+  grep -q '^Lisp command=(c:door)' "$lib936/運/datains.ini"
+expect_true "936: and nothing was written beside 運 ($(on_disk "$lib936"))" [ "$(on_disk "$lib936")" == "運 運輸.dwg" ]
+expect_line "936: the pick returns 門.dwg with 運's new settings" \
+  "=> (\"$(picked "$lib936/運/門.dwg")\" (\"墙\" \"3\" \"(c:door)\"))"
+
 # The settings file is written in the code page of the run that saved it: each locale starts afresh.
 rm -f "$WORK/lib/Orvex1.ini"
 # --- 950: a start folder ending in 功: Delete there and the pick; then Copy and Paste ----------------------
