@@ -58,6 +58,11 @@ std::string StartShellPathOf(const std::string& path) {
         drive = path.substr(0, 2);
     if (const std::size_t last = LastSeparator(path); last != std::string::npos && last >= drive.size())
         dir = path.substr(drive.size(), last + 1 - drive.size());
+    // As the runtime's path splitting does: folders its buffer cannot hold give neither drive nor folders.
+    if (dir.size() >= _MAX_DIR) {
+        drive.clear();
+        dir.clear();
+    }
     std::string driveName;
     if (!drive.empty()) {
         std::string root = drive + "\\";

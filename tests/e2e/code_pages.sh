@@ -4,18 +4,21 @@
 # (0x5C). Folders ending in such a character are opened and picked from (never their parent's drawings),
 # the tree walks through ソフト, drawings are copied, pasted, deleted and renamed there, the saved name's
 # search text is whole, a folder's settings in 運 are read with the pick, and a Korean folder is listed.
-# One Wine prefix serves all code pages: each program takes its code page from LANG when it starts (the
-# probe below checks it). tools/ensure-packages generates the locales and installs a CJK font.
+# Wine takes each program's code page from LANG when it starts (the probe below checks it); tools/wine-run
+# runs the CJK locales in a prefix of their own whose interface font links to the CJK font that
+# tools/ensure-packages installs (with the locales).
 . "$(dirname "$0")/lib.sh"
 
 : "${CODEPAGE_PROBE:?path of codepage_probe.exe}"
 
 # Wine's trash (a delete below) is the desktop's (XDG): this test's own. Wine's services read it when
-# they start, so the test waits for the Wine of an earlier test to end before its first Windows program.
+# they start, so the test waits for the Wine of an earlier test to end before its first Windows program,
+# in both prefixes (tools/wine-run runs the CJK locales in one of their own).
 export XDG_DATA_HOME="$WORK/xdg"
 mkdir -p "$XDG_DATA_HOME"
-WINEPREFIX="${WINEPREFIX:-$ROOT/build/wineprefix}" "$(command -v wineserver || echo /usr/lib/wine/wineserver)" -w \
-  2>/dev/null || true
+for prefix in "$ROOT/build/wineprefix" "$ROOT/build/wineprefix-cjk"; do
+  WINEPREFIX="${WINEPREFIX:-$prefix}" "$(command -v wineserver || echo /usr/lib/wine/wineserver)" -w 2>/dev/null || true
+done
 
 # in_locale LOCALE COMMAND...: runs a command (a shell function too) with Wine in that locale.
 in_locale() {

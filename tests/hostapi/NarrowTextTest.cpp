@@ -174,3 +174,22 @@ TEST(NarrowText, LengthsForMessages) {
 }
 
 } // namespace
+
+#ifdef _WIN32
+#include <windows.h>
+
+namespace {
+
+// Run in each locale (ctest orvex_hostapi_tests_cpNNN): the tables written here are the system's own.
+TEST(NarrowText, ActiveLeadBytesAreTheSystemsCodePage) {
+    const unsigned acp = ::GetACP();
+    const LeadByteTable written = LeadBytesOfCodePage(acp);
+    for (int c = 0; c < 256; ++c) {
+        EXPECT_EQ(ActiveLeadBytes().lead[c], ::IsDBCSLeadByteEx(acp, static_cast<BYTE>(c)) != FALSE)
+            << acp << " " << c;
+        EXPECT_EQ(written.lead[c], ActiveLeadBytes().lead[c]) << acp << " " << c;
+    }
+}
+
+} // namespace
+#endif
