@@ -158,6 +158,7 @@ const CommandName kCommands[] = {
     {L"clipboard-put", ScriptCommand::Kind::ClipboardPut, false, false},
     {L"clipboard-files", ScriptCommand::Kind::ClipboardFiles, false, false},
     {L"remove", ScriptCommand::Kind::Remove, false, false},
+    {L"clipboard-text", ScriptCommand::Kind::ClipboardText, false, false},
     {L"post", ScriptCommand::Kind::Post, true, true},
     {L"call", ScriptCommand::Kind::Call, false, false},
 };
@@ -307,6 +308,13 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
     case ScriptCommand::Kind::Type:
         if (positional.size() != 1) {
             error = L"type takes one text (quote it when it has blanks)";
+            return false;
+        }
+        command.text = positional[0];
+        return true;
+    case ScriptCommand::Kind::ClipboardText:
+        if (positional.size() != 1) {
+            error = L"clipboard-text takes one text (quote it when it has blanks)";
             return false;
         }
         command.text = positional[0];

@@ -62,6 +62,7 @@ struct ScriptCommand {
         ClipboardPut,
         ClipboardFiles,
         Remove,
+        ClipboardText,
         Post,
         Call
     };
@@ -74,7 +75,7 @@ struct ScriptCommand {
     int x = 0, y = 0;
     unsigned modifiers = 0;          // with=ctrl+shift+alt
     std::vector<KeyChord> keys;      // key
-    std::wstring text;               // type, echo
+    std::wstring text;               // type, echo, clipboard-text
     std::wstring file;               // screenshot, remove
     int ms = 0;                      // sleep
     std::wstring treePath;           // path=: a tree item's label path, labels joined by backslashes

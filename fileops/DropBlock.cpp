@@ -1,5 +1,7 @@
 #include "fileops/DropBlock.h"
 
+#include "hostapi/NarrowText.h"
+
 #include <cstring>
 
 namespace {
@@ -93,7 +95,7 @@ std::vector<std::string> ReadDropBlock(const unsigned char* block, std::size_t s
 }
 
 std::string PathExtension(const std::string& path) {
-    const std::size_t separator = path.find_last_of("\\/:");
+    const std::size_t separator = LastCharacterOf(path, "\\/:");
     const std::size_t nameStart = separator == std::string::npos ? 0 : separator + 1;
     const std::size_t dot = path.rfind('.');
     if (dot == std::string::npos || dot < nameStart)

@@ -5,6 +5,7 @@
 #include "fileops/ShellFileOp.h"
 #include "framework/afxfiledlg.h"
 #include "framework/afxwin.h"
+#include "hostapi/NarrowText.h"
 
 #include <shellapi.h>
 #include <shlobj.h>
@@ -231,7 +232,7 @@ int ForFileCommands::RenameFile(const std::string& source, const std::string& de
         result = op.Rename();
     }
     if (result != 0 && label && label->m_hWnd) {
-        const auto separator = source.find_last_of('\\');
+        const auto separator = LastCharacterOf(source, "\\");
         label->SetWindowText(separator == std::string::npos ? source : source.substr(separator + 1));
     }
     return result;

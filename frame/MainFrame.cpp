@@ -2,6 +2,7 @@
 
 #include "frame/AboutDlgArx.h"
 #include "fileops/ForFileCommands.h"
+#include "hostapi/NarrowText.h"
 #include "settings/DialogSetLa.h"
 #include "settings/FolderSettings.h"
 #include "settings/IniFile.h"
@@ -106,7 +107,7 @@ std::string HelpFilePath() {
     std::string path(module, n < MAX_PATH ? n : 0);
     // The extension after the last dot of the file name, not of a folder.
     const auto dot = path.rfind('.');
-    const auto separator = path.find_last_of("\\/");
+    const auto separator = LastSeparator(path);
     if (dot != std::string::npos && (separator == std::string::npos || dot > separator))
         path.erase(dot);
     return path + ".hlp";

@@ -2,6 +2,7 @@
 
 #include "frame/MainFrame.h"
 #include "hostapi/HostApi.h"
+#include "hostapi/NarrowText.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/DwgList.h"
 #include "thumbs/Tessel3View.h"
@@ -41,9 +42,9 @@ bool OnAMonitor(const RECT& rc) {
     return ::MonitorFromRect(&rc, MONITOR_DEFAULTTONULL) != nullptr;
 }
 
-// The position of the last separator of a path ("\", "/" or the drive's ":"), or npos.
-std::string::size_type LastSeparator(const std::string& path) {
-    return path.find_last_of("\\/:");
+// The position of the last separator of a path ("\", "/" or the drive's ":"), or npos, found by character.
+std::string::size_type LastSeparatorOrDrive(const std::string& path) {
+    return LastCharacterOf(path, "\\/:");
 }
 
 } // namespace
@@ -105,21 +106,20 @@ std::string StartFolder(const std::string& startPath, const std::string& savedPa
     std::string folder;
     if (!startPath.empty()) {
         // Drive and folders: everything up to the last separator (no fixed buffer for a long path).
-        const auto end = LastSeparator(startPath);
+        const auto end = LastSeparatorOrDrive(startPath);
         folder = end == std::string::npos ? std::string() : startPath.substr(0, end + 1);
     } else {
         folder = savedPath;
     }
     // "C:\Work\" scans as "C:\Work"; a drive's root keeps its separator.
-    while (folder.size() > 1 && (folder.back() == '\\' || folder.back() == '/') &&
-           !(folder.size() == 3 && folder[1] == ':'))
+    while (folder.size() > 1 && EndsWithSeparator(folder) && !(folder.size() == 3 && folder[1] == ':'))
         folder.pop_back();
     return folder;
 }
 
 std::string SearchTextOf(const std::string& drawingName) {
     // The name stored in the settings file can be of any length: no fixed buffer.
-    const auto separator = LastSeparator(drawingName);
+    const auto separator = LastSeparatorOrDrive(drawingName);
     std::string name = separator == std::string::npos ? drawingName : drawingName.substr(separator + 1);
     const auto dot = name.rfind('.');
     if (dot != std::string::npos)

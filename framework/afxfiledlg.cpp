@@ -42,8 +42,15 @@ INT_PTR CFileDialog::DoModal() {
 }
 
 std::string CFileDialog::GetFileName() const {
-    const auto separator = m_strFile.find_last_of("\\/");
-    return separator == std::string::npos ? m_strFile : m_strFile.substr(separator + 1);
+    // The name after the last separator, walked by character in the ANSI code page: the second byte of a
+    // double-byte character may be a backslash.
+    std::size_t nameStart = 0;
+    for (const char* p = m_strFile.c_str(); *p; p = ::CharNextA(p)) {
+        // one byte: p is at the start of a character
+        if (*p == '\\' || *p == '/')
+            nameStart = static_cast<std::size_t>(p - m_strFile.c_str()) + 1;
+    }
+    return m_strFile.substr(nameStart);
 }
 
 int AfxMessageBox(const std::string& text, UINT type, UINT) {

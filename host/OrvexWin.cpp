@@ -57,6 +57,7 @@ public:
 
     std::string WholeStartPath(const std::string& path) override {
         if (!::PathIsRelativeA(path.c_str()) &&
+            // one byte: after "C:" the third byte starts a character (":" is never a second byte)
             !(path.size() > 1 && path[1] == ':' && (path.size() == 2 || (path[2] != '\\' && path[2] != '/'))))
             return path; // "C:\x\", "\\server\share\": whole already ("C:x" is relative to C:'s folder)
         const DWORD needed = ::GetFullPathNameA(path.c_str(), 0, nullptr, nullptr);

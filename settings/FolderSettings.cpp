@@ -1,5 +1,6 @@
 #include "settings/FolderSettings.h"
 
+#include "hostapi/NarrowText.h"
 #include "settings/IniFile.h"
 
 #include <cstdio>
@@ -13,10 +14,12 @@ bool FolderSettingsPathFits(const std::string& folder) {
 }
 
 std::string FolderPathTooLongMessage(const std::string& folder) {
-    const std::size_t length = FolderSettingsFilePath(folder).size();
-    return "The folder's path is too long for its settings (" + std::to_string(length) +
-           " characters with \\" + kFolderSettingsFile + ", at most " +
-           std::to_string(kFolderPathBufferSize - 1) + "); they cannot be edited here:\n" + folder;
+    // The dialog's buffer holds bytes: a double-byte character takes two.
+    const std::string path = FolderSettingsFilePath(folder);
+    const bool multiByte = CharacterCount(path) != path.size();
+    return "The folder's path is too long for its settings (" + CharactersAndBytes(path) + " with \\" +
+           kFolderSettingsFile + ", at most " + std::to_string(kFolderPathBufferSize - 1) +
+           (multiByte ? " bytes" : "") + "); they cannot be edited here:\n" + folder;
 }
 
 std::string FolderSettingsNotSavedAlert(const std::string& filePath) {

@@ -2,6 +2,8 @@
 
 #include "settings/SettingsReport.h"
 
+#include "hostapi/NarrowText.h"
+
 #include <cstring>
 
 bool FormSettingsFileName(const std::string& moduleFileName, char* pszFileName) {
@@ -15,17 +17,19 @@ bool FormSettingsFileName(const std::string& moduleFileName, char* pszFileName) 
     }
     // The extension is what follows the last dot of the file's own name (not of a folder's); as with
     // the platform's path splitting, a name without one simply gets ".ini".
-    const std::string::size_type nameStart = moduleFileName.find_last_of("\\/:");
+    const std::string::size_type nameStart = LastCharacterOf(moduleFileName, "\\/:");
     std::string::size_type dot = moduleFileName.find_last_of('.');
     if (dot == std::string::npos || (nameStart != std::string::npos && dot < nameStart))
         dot = moduleFileName.size();
     const std::string fileName = moduleFileName.substr(0, dot) + ".ini";
 
     if (fileName.size() >= static_cast<std::size_t>(kSettingsFileNameSize)) {
+        // The buffer holds bytes: a double-byte character takes two.
+        const bool multiByte = CharacterCount(fileName) != fileName.size();
         ReportSettingsProblem(
             "\nOrvex: the library's folder is too long for its settings file (" +
-                std::to_string(fileName.size()) + " characters, at most " +
-                std::to_string(kSettingsFileNameSize - 1) +
+                CharactersAndBytes(fileName) + ", at most " + std::to_string(kSettingsFileNameSize - 1) +
+                (multiByte ? " bytes" : "") +
                 "); the explorer uses its default settings and does not save them: " + fileName + "\n",
             true);
         return false;

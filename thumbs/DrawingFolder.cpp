@@ -1,6 +1,7 @@
 #include "thumbs/DrawingFolder.h"
 
 #include "settings/Tessel3Doc.h"
+#include "hostapi/NarrowText.h"
 #include "thumbs/NameFold.h"
 
 #include <utility>
@@ -10,30 +11,11 @@ namespace {
 constexpr char kSeparator = '\\';
 constexpr char kOtherSeparator = '/';
 
-// The start of each character of text, in the names' code page: a lead byte and the byte after it are one
-// character, whatever that second byte looks like.
-std::vector<std::size_t> CharacterStarts(const std::string& text) {
-    const NameFoldTable& fold = NameFold();
-    std::vector<std::size_t> starts;
-    starts.reserve(text.size());
-    for (std::size_t i = 0; i < text.size();) {
-        starts.push_back(i);
-        const bool lead = fold.leadByte[static_cast<unsigned char>(text[i])];
-        i += lead && i + 1 < text.size() ? 2 : 1;
-    }
-    return starts;
-}
-
 // True when the character is a one-byte separator ("\" or "/").
 bool SeparatorAt(const std::string& text, const std::vector<std::size_t>& starts, std::size_t character) {
     const std::size_t start = starts[character];
     const std::size_t end = character + 1 < starts.size() ? starts[character + 1] : text.size();
     return end - start == 1 && (text[start] == kSeparator || text[start] == kOtherSeparator);
-}
-
-bool EndsWithSeparator(const std::string& text) {
-    const std::vector<std::size_t> starts = CharacterStarts(text);
-    return !starts.empty() && SeparatorAt(text, starts, starts.size() - 1);
 }
 
 // "\\server\share" (a share's root, which keeps a separator at its end): two separators, a server name, a
@@ -78,10 +60,7 @@ std::string DrawingFolder::Spelling(const std::string& folder) {
 std::string DrawingFolder::Join(const std::string& folder, const std::string& name) {
     if (folder.empty())
         return name;
-    std::string path = folder;
-    if (!EndsWithSeparator(folder))
-        path += kSeparator;
-    return path + name;
+    return WithSeparator(folder) + name;
 }
 
 bool DrawingFolder::SameFolder(const std::string& a, const std::string& b) {

@@ -1,9 +1,10 @@
 #include "thumbs/DwgList.h"
 
-#include <utility>
+#include "hostapi/NarrowText.h"
 
 #include <algorithm>
 #include <cstring>
+#include <utility>
 
 CDwgArray DwgList;
 
@@ -56,18 +57,20 @@ int ScanEntries(const DwgFindEntry* entries, int count, const char* needle) {
 std::string FolderPathProblem(const std::string& folder) {
     if (folder.empty())
         return "No folder to read";
-    const bool separator = folder.back() == '\\' || folder.back() == '/';
-    const std::size_t pattern = folder.size() + (separator ? 1 : 2);
+    // The runtime's path limit counts characters, as the messages do.
+    const bool separator = EndsWithSeparator(folder);
+    const std::size_t length = CharacterCount(folder);
+    const std::size_t pattern = length + (separator ? 1 : 2);
     if (pattern <= kMaxPathChars)
         return {};
     const std::size_t longest = kMaxPathChars - (separator ? 1 : 2);
-    return "The folder cannot be read: its path is " + std::to_string(folder.size()) +
-           " characters long, at most " + std::to_string(longest) + " are possible";
+    return "The folder cannot be read: its path is " + std::to_string(length) + " characters long, at most " +
+           std::to_string(longest) + " are possible";
 }
 
 bool FullPathFits(const std::string& folder, const std::string& name) {
-    const bool separator = !folder.empty() && (folder.back() == '\\' || folder.back() == '/');
-    return folder.size() + (separator ? 0 : 1) + name.size() <= kMaxPathChars;
+    const bool separator = EndsWithSeparator(folder);
+    return CharacterCount(folder) + (separator ? 0 : 1) + CharacterCount(name) <= kMaxPathChars;
 }
 
 std::string SkippedFilesMessage(int skipped) {

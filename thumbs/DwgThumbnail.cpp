@@ -176,7 +176,7 @@ bool exCDwgThumbnail::Create(const std::string& name, int listIndex, const char*
         const DwgData& record = m_pOwner->Folder().Drawing(listIndex);
         const ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
         m_strToolTip = tip.text;
-        m_nToolTipWidth = tip.width;
+        m_toolTip = tip;
     }
     CreateLabel(name, cell, parent);
     return true;
@@ -194,7 +194,7 @@ bool exCDwgThumbnail::Rebind(const std::string& name, int listIndex, const RECT&
     m_bToolTipActive = false;
     const ThumbTooltip tip = BuildTooltipForTime(record.m_strName, record.m_nSize, record.m_timeWrite);
     m_strToolTip = tip.text;
-    m_nToolTipWidth = tip.width;
+    m_toolTip = tip;
 
     constexpr UINT kMove = SWP_NOZORDER | SWP_NOACTIVATE | SWP_NOCOPYBITS;
     const CRect rc(cell);
@@ -212,8 +212,19 @@ bool exCDwgThumbnail::Rebind(const std::string& name, int listIndex, const RECT&
 void exCDwgThumbnail::CreateToolTip() {
     if (m_wndToolTip.m_hWnd || !m_wndToolTip.Create(this, 0))
         return;
-    // A width of so few pixels makes the tooltip break its text at the blanks: name, size, date.
-    m_wndToolTip.SetMaxTipWidth(m_nToolTipWidth);
+    // As wide as its widest line in its own font: the text breaks at the blanks between name, size and
+    // date, and never inside the name (a line may break between any two Japanese or Chinese characters).
+    m_wndToolTip.SetMaxTipWidth(TooltipPixelWidth(m_toolTip, [this](const std::string& text) {
+        CClientDC dc(m_wndToolTip.m_hWnd);
+        const CSelectObject font(dc.GetSafeHdc(),
+                                 reinterpret_cast<HGDIOBJ>(m_wndToolTip.SendMessage(WM_GETFONT)));
+        // Measured as the tooltip draws it: in Unicode, converted from the ANSI code page (the A function
+        // would read the bytes in the font's own code page).
+        const std::wstring wide = WidenAnsi(text);
+        SIZE size{};
+        ::GetTextExtentPoint32W(dc.GetSafeHdc(), wide.c_str(), static_cast<int>(wide.size()), &size);
+        return static_cast<int>(size.cx);
+    }));
     m_wndToolTip.AddTool(this, m_strToolTip);
     m_wndToolTip.Activate(false);
 }

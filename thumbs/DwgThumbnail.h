@@ -11,6 +11,7 @@
 #include "framework/afxwin.h"
 #include "framework/afxbars.h" // CToolTipCtrl
 #include "preview/PictureQueue.h"
+#include "thumbs/TooltipText.h"
 
 #include <cstdint>
 #include <string>
@@ -135,7 +136,7 @@ private:
     int m_nListIndex = -1;
     CToolTipCtrl m_wndToolTip;
     std::string m_strToolTip;
-    int m_nToolTipWidth = 0;
+    ThumbTooltip m_toolTip; // its lines, measured when the tooltip is made
     bool m_bToolTipActive = false;
 };
 

@@ -1,4 +1,6 @@
-// The names' code page on Windows: the system's ANSI code page, asked once for every byte.
+// The names' code page on Windows: the system's ANSI code page, asked once for every byte; its lead bytes
+// are the ones every walk of narrow text uses.
+#include "hostapi/NarrowText.h"
 #include "thumbs/NameFold.h"
 
 #include <windows.h>
@@ -6,7 +8,7 @@
 namespace {
 
 bool IsLead(unsigned char c) {
-    return ::IsDBCSLeadByteEx(CP_ACP, c) != FALSE;
+    return ActiveLeadBytes().lead[c];
 }
 
 unsigned char LowerByte(unsigned char c) {

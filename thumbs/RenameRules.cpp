@@ -1,20 +1,10 @@
 #include "thumbs/RenameRules.h"
 
+#include "hostapi/NarrowText.h"
 #include "thumbs/DwgList.h"
 #include "thumbs/NameFold.h"
 
-#include <cstring>
-
 namespace {
-
-bool HasBadCharacter(const std::string& name) {
-    for (const char c : name) {
-        const auto byte = static_cast<unsigned char>(c);
-        if (byte < 0x20 || byte == 0x7F || std::strchr("\\/:*?\"<>|", c) != nullptr)
-            return true;
-    }
-    return false;
-}
 
 // The part before the first dot, trailing blanks dropped: what Windows compares with its device names.
 bool IsDeviceName(const std::string& name) {
@@ -49,14 +39,14 @@ RenameVerdict CheckRename(const std::string& folder, const std::string& oldName,
         return RenameVerdict::Unchanged;
     // The same name in other letters' case: the file itself answers to it, it is no other file.
     const bool caseOnly = CompareNamesNoCase(newName, oldName) == 0;
-    if (HasBadCharacter(newName))
+    if (ContainsForbiddenCharacter(newName))
         return RenameVerdict::BadCharacter;
     if (!IsDrawingName(newName))
         return RenameVerdict::NotDrawing;
     if (IsDeviceName(newName))
         return RenameVerdict::DeviceName;
     // A file system keeps at most 255 characters in one name.
-    if (newName.size() > 255 || !FullPathFits(folder, newName))
+    if (CharacterCount(newName) > 255 || !FullPathFits(folder, newName))
         return RenameVerdict::TooLong;
     if (!caseOnly && exists && exists(newName))
         return RenameVerdict::Exists;

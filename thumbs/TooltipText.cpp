@@ -1,5 +1,7 @@
 #include "thumbs/TooltipText.h"
 
+#include "hostapi/NarrowText.h"
+
 #include <algorithm>
 #include <cstdio>
 
@@ -33,19 +35,19 @@ bool LocalTimeOf(std::int64_t timeWrite, std::tm& out) {
 #endif
 }
 
-ThumbTooltip BuildTooltip(const std::string& name, std::uint64_t size, const std::tm* local) {
+ThumbTooltip BuildTooltip(const std::string& name, std::uint64_t size, const std::tm* local,
+                          const LeadByteTable& lead) {
     ThumbTooltip tip;
     tip.sizeText = TooltipSizeText(size);
     tip.dateText = TooltipDateText(local);
-    const std::size_t width = std::max({name.size(), tip.sizeText.size(), tip.dateText.size()});
+    // Characters, not bytes: a double-byte character is one.
+    const std::size_t nameLength = CharacterCount(name, lead);
+    const std::size_t width = std::max({nameLength, tip.sizeText.size(), tip.dateText.size()});
     tip.width = static_cast<int>(width);
-    tip.text = name;
-    tip.text.append(width - name.size(), ' ');
-    tip.text += ' ';
-    tip.text += tip.sizeText;
-    tip.text.append(width - tip.sizeText.size(), ' ');
-    tip.text += tip.dateText;
-    tip.text.append(width - tip.dateText.size(), ' ');
+    tip.lines[0] = name + std::string(width - nameLength + 1, ' ');
+    tip.lines[1] = tip.sizeText + std::string(width - tip.sizeText.size(), ' ');
+    tip.lines[2] = tip.dateText + std::string(width - tip.dateText.size(), ' ');
+    tip.text = tip.lines[0] + tip.lines[1] + tip.lines[2];
     return tip;
 }
 
@@ -53,4 +55,12 @@ ThumbTooltip BuildTooltipForTime(const std::string& name, std::uint64_t size, st
     std::tm local{};
     const bool ok = LocalTimeOf(timeWrite, local);
     return BuildTooltip(name, size, ok ? &local : nullptr);
+}
+
+int TooltipPixelWidth(const ThumbTooltip& tip, const std::function<int(const std::string&)>& measure) {
+    if (!measure)
+        return 0;
+    // Each line with the blanks that pad it: where a line may break between two characters (Japanese,
+    // Chinese), the system breaks there rather than at blanks that do not fit.
+    return std::max({measure(tip.lines[0]), measure(tip.lines[1]), measure(tip.lines[2])});
 }

@@ -1,17 +1,21 @@
 // The tooltip text of a thumbnail: the file name, its size and its last-write date, each padded with
-// blanks to the same width so that a tooltip as narrow as that width breaks it into three lines.
+// blanks to the same width so that a tooltip as wide as its widest line breaks it into three lines.
 // Portable: no <windows.h>.
 #pragma once
 
 #include <cstdint>
 #include <ctime>
+#include <functional>
 #include <string>
+
+#include "hostapi/NarrowText.h"
 
 struct ThumbTooltip {
     std::string sizeText; // "Size=1234 "
     std::string dateText; // "05/03/2021;14.07.09"
     int width = 0;        // the longest of name, size text and date text, in characters
-    std::string text;     // padded name + one blank, padded size text, padded date text
+    std::string lines[3]; // padded name + one blank, padded size text, padded date text
+    std::string text;     // the three lines one after the other
 };
 
 // "Size=N " with the size in bytes as an unsigned decimal (all 64 bits: files of 4 GiB and more too).
@@ -22,6 +26,13 @@ std::string TooltipDateText(const std::tm* local);
 // Converts a last-write time to local time; false when the runtime cannot.
 bool LocalTimeOf(std::int64_t timeWrite, std::tm& out);
 
-ThumbTooltip BuildTooltip(const std::string& name, std::uint64_t size, const std::tm* local);
+// lead: the code page of name (its length counts characters).
+ThumbTooltip BuildTooltip(const std::string& name, std::uint64_t size, const std::tm* local,
+                          const LeadByteTable& lead = ActiveLeadBytes());
 // Same from the record's last-write time, converted to local time here.
 ThumbTooltip BuildTooltipForTime(const std::string& name, std::uint64_t size, std::int64_t timeWrite);
+
+// The tooltip's width in pixels: the widest of its three lines (name, size text, date text, each with the
+// blanks that pad it) as measure gives them in the tooltip's font. Narrower, a line would break inside
+// itself (between two Japanese or Chinese characters of a name); the blanks between the lines still break.
+int TooltipPixelWidth(const ThumbTooltip& tip, const std::function<int(const std::string&)>& measure);

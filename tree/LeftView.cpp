@@ -1,5 +1,6 @@
 #include "tree/LeftView.h"
 
+#include "hostapi/NarrowText.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
 #include "tree/StartShellPath.h"
@@ -62,7 +63,8 @@ bool CLeftView::Create(const char* className, const char* windowName, DWORD styl
     if (!m_strStartShellPath.empty())
         doc->m_strShellPath = m_strStartShellPath;
     else if (doc->m_strShellPath.empty() && !doc->m_strPath.empty())
-        doc->m_strShellPath = StartShellPathOf(doc->m_strPath + "\\"); // settings that only know the folder
+        doc->m_strShellPath =
+            StartShellPathOf(WithSeparator(doc->m_strPath)); // settings that only know the folder
     // The walk along that path is the frame's to start (WalkToStartLater), once the grid has its pictures.
     return true;
 }

@@ -2,6 +2,8 @@
 
 #include "ShellString.h"
 
+#include "hostapi/NarrowText.h"
+
 #include <algorithm>
 
 std::string ShellDisplayName(IShellFolder* parentFolder, LPCITEMIDLIST relativeId, SHGDNF how) {
@@ -32,10 +34,15 @@ std::string ShellLabelOf(IShellFolder* parentFolder, LPCITEMIDLIST absoluteId, s
     if ((flags & kShellFileSystemName) && ShellFileSystemPath(absoluteId, label) &&
         !(flags & kShellNormalName)) {
         // The rightmost n characters, n being the position of the last backslash: the tree has always
-        // cut its labels this way, which is not the same as taking the file name.
-        const std::size_t slash = label.find_last_of('\\');
-        const std::size_t n = slash == std::string::npos ? 0 : slash;
-        label = label.substr(label.size() - n);
+        // cut its labels this way, which is not the same as taking the file name. Counted in characters.
+        const std::vector<std::size_t> starts = CharacterStarts(label);
+        const std::size_t slash = LastCharacterOf(label, "\\");
+        const std::size_t n =
+            slash == std::string::npos
+                ? 0
+                : static_cast<std::size_t>(std::lower_bound(starts.begin(), starts.end(), slash) -
+                                           starts.begin());
+        label = n == 0 ? std::string() : label.substr(starts[starts.size() - n]);
     }
     if (label.empty())
         label = ShellDisplayName(parentFolder, LastItemId(absoluteId),
@@ -124,16 +131,9 @@ ShellPathWalk WalkShellLabelPath(const std::string& labelPath) {
     if (FAILED(SHGetSpecialFolderLocation(nullptr, CSIDL_DESKTOP, desktopId.Receive())) || !desktopId)
         return walk;
 
-    std::size_t position = 0;
-    for (;;) {
-        const std::size_t slash = labelPath.find('\\', position);
-        const std::string component =
-            labelPath.substr(position, slash == std::string::npos ? std::string::npos : slash - position);
-        position = slash == std::string::npos ? labelPath.size() : slash + 1;
-        if (component.empty()) {
-            walk.complete = true;
-            return walk;
-        }
+    for (const std::string& component : SplitLabelPath(labelPath)) {
+        if (component.empty())
+            break; // a path ends at its first empty name
         // The candidates: the Desktop at the top, else the children of the node reached last.
         IShellFolder* parent = nullptr;
         CShellPidl parentId;
@@ -163,4 +163,6 @@ ShellPathWalk WalkShellLabelPath(const std::string& labelPath) {
         if (!found)
             return walk;
     }
+    walk.complete = true;
+    return walk;
 }

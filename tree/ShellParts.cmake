@@ -7,6 +7,6 @@ if(WIN32)
     ${CMAKE_CURRENT_LIST_DIR}/ShellNamespace.cpp
     ${CMAKE_CURRENT_LIST_DIR}/StartShellPath.cpp)
   target_include_directories(orvex_tree_shell PUBLIC ${PROJECT_SOURCE_DIR})
-  target_link_libraries(orvex_tree_shell PUBLIC shell32 shlwapi ole32 user32)
+  target_link_libraries(orvex_tree_shell PUBLIC orvex_hostapi shell32 shlwapi ole32 user32)
   orvex_warnings(orvex_tree_shell)
 endif()

@@ -1,5 +1,6 @@
 #include "tree/ShellTreeCtrl.h"
 
+#include "hostapi/NarrowText.h"
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
 #include "thumbs/DrawingFolder.h"
@@ -40,7 +41,7 @@ bool IsMarkedFolder(DWORD fileAttributes) {
 std::string PlainFolderPath(LPCITEMIDLIST absoluteId, SFGAOF attributes) {
     std::string path;
     if (!(attributes & SFGAO_FOLDER) || ItemIdCount(absoluteId) < 3 ||
-        !ShellFileSystemPath(absoluteId, path) || path.size() <= 3 || path[1] != ':' || path[2] != '\\' ||
+        !ShellFileSystemPath(absoluteId, path) || path.size() <= 3 || path.compare(1, 2, ":\\") != 0 ||
         IsMarkedFolder(::GetFileAttributesA(path.c_str())))
         path.clear();
     return path;
@@ -205,8 +206,8 @@ int CShellTreeCtrl::PlainFolderIcon(const std::string& path, bool open) const {
     // Every plain folder has the icon of the first plain folder on the path, the one nearest the drive's
     // root: the cheapest to ask about, as such folders hold few entries.
     std::string folder = path;
-    for (std::size_t slash = path.find('\\', 3); slash != std::string::npos;
-         slash = path.find('\\', slash + 1)) {
+    for (std::size_t slash = FindCharacter(path, '\\', 3); slash != std::string::npos;
+         slash = FindCharacter(path, '\\', slash + 1)) {
         if (!IsMarkedFolder(::GetFileAttributesA(path.substr(0, slash).c_str()))) {
             folder = path.substr(0, slash);
             break;
@@ -291,20 +292,17 @@ std::string CShellTreeCtrl::GetLabelPath(HTREEITEM item) const {
 
 void CShellTreeCtrl::ExpandToLabelPath(const std::string& labelPath, bool openTarget) {
     HTREEITEM current = nullptr;
-    std::size_t position = 0;
-    for (;;) {
-        const std::size_t slash = labelPath.find('\\', position);
-        const std::string component =
-            labelPath.substr(position, slash == std::string::npos ? std::string::npos : slash - position);
-        position = slash == std::string::npos ? labelPath.size() : slash + 1;
+    const std::vector<std::string> names = SplitLabelPath(labelPath);
+    for (std::size_t i = 0; i < names.size(); ++i) {
+        const std::string& component = names[i];
         if (component.empty())
             break;
         HTREEITEM candidate = current ? GetChildItem(current) : GetRootItem();
         while (candidate && ::lstrcmpiA(GetItemText(candidate).c_str(), component.c_str()) != 0)
             candidate = GetNextSiblingItem(candidate);
         if (!candidate)
-            return; // the path target keeps what it had
-        const bool last = position >= labelPath.size() || labelPath[position] == '\\'; // no component follows
+            return;                                                      // the path target keeps what it had
+        const bool last = i + 1 == names.size() || names[i + 1].empty(); // no component follows
         // The nodes on the way are filled at once: an animated filling costs a thread and a paint apiece.
         if (!last)
             FillWithoutAnimation(candidate);

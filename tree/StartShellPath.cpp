@@ -1,6 +1,8 @@
 // The start folder's label path, built from the shell's display names.
 #include "tree/StartShellPath.h"
 
+#include "hostapi/NarrowText.h"
+
 #include <windows.h>
 #include <shellapi.h>
 #include <shlobj.h>
@@ -49,11 +51,21 @@ std::string StartShellPathOf(const std::string& path) {
     const std::string networkName = SpecialFolderName(desktop, CSIDL_NETWORK);
     desktop->Release();
 
-    char drive[_MAX_DRIVE] = "", dir[_MAX_DIR] = "", fname[_MAX_FNAME] = "", ext[_MAX_EXT] = "";
-    _splitpath(path.c_str(), drive, dir, fname, ext);
+    // The drive ("C:") and the folders after it up to the last separator, found by character: the
+    // second byte of a double-byte character may look like a separator.
+    std::string drive, dir;
+    if (path.size() >= 2 && path[1] == ':')
+        drive = path.substr(0, 2);
+    if (const std::size_t last = LastSeparator(path); last != std::string::npos && last >= drive.size())
+        dir = path.substr(drive.size(), last + 1 - drive.size());
+    // As the runtime's path splitting does: folders its buffer cannot hold give neither drive nor folders.
+    if (dir.size() >= _MAX_DIR) {
+        drive.clear();
+        dir.clear();
+    }
     std::string driveName;
-    if (drive[0]) {
-        std::string root = std::string(drive) + "\\";
+    if (!drive.empty()) {
+        std::string root = drive + "\\";
         SHFILEINFOA info{};
         if (SHGetFileInfoA(root.c_str(), 0, &info, sizeof info, SHGFI_DISPLAYNAME))
             driveName = info.szDisplayName;
@@ -61,7 +73,7 @@ std::string StartShellPathOf(const std::string& path) {
             driveName = root;
     }
     std::string result = desktopName + "\\";
-    if (drive[0])
+    if (!drive.empty())
         result += computerName + "\\" + driveName;
     else
         result += networkName;

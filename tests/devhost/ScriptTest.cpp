@@ -173,6 +173,16 @@ TEST(Script, ClipboardCommands) {
     EXPECT_NE(Error(L"clipboard-put\n").find(L"ansi or wide"), std::wstring::npos);
 }
 
+TEST(Script, ClipboardTextTakesOneText) {
+    const auto commands = Read(L"clipboard-text \"\u8868\u793A b\"\nclipboard-text abc\n");
+    ASSERT_EQ(commands.size(), 2u);
+    EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::ClipboardText);
+    EXPECT_EQ(commands[0].text, L"\u8868\u793A b");
+    EXPECT_EQ(commands[1].text, L"abc");
+    EXPECT_NE(Error(L"clipboard-text\n").find(L"one text"), std::wstring::npos);
+    EXPECT_NE(Error(L"clipboard-text a b\n").find(L"one text"), std::wstring::npos);
+}
+
 TEST(Script, PostNamesAWindowAMessageAndItsParameters) {
     const auto commands = Read(L"post class=#32770 visible=any 32768 1 -7\npost class=X 32769\n");
     ASSERT_EQ(commands.size(), 2u);

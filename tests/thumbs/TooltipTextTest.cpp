@@ -1,5 +1,7 @@
 #include "thumbs/TooltipText.h"
 
+#include "hostapi/NarrowText.h"
+
 #include <gtest/gtest.h>
 
 #include <cstdlib>
@@ -81,3 +83,52 @@ TEST(TooltipText, FromWriteTimeUsesLocalTime) {
 }
 
 } // namespace
+
+TEST(TooltipText, PixelWidthIsTheWidestLineInTheFont) {
+    std::tm local{};
+    local.tm_year = 2021 - 1900;
+    local.tm_mon = 2;
+    local.tm_mday = 5;
+    local.tm_hour = 14;
+    local.tm_min = 7;
+    local.tm_sec = 9;
+    const ThumbTooltip tip = BuildTooltip("a.dwg", 1234, &local);
+    // A font whose characters are all 7 pixels wide: the name's line (padded to 19 characters, and the
+    // blank before the size) is the widest.
+    const auto fixed = [](const std::string& text) { return static_cast<int>(text.size()) * 7; };
+    EXPECT_EQ(TooltipPixelWidth(tip, fixed), 20 * 7);
+    // A font with narrow blanks: the date text, which has none, is the widest line.
+    const auto narrowBlanks = [](const std::string& text) {
+        int width = 0;
+        for (const char c : text)
+            width += c == ' ' ? 2 : 7;
+        return width;
+    };
+    EXPECT_EQ(TooltipPixelWidth(tip, narrowBlanks), 19 * 7);
+    EXPECT_EQ(TooltipPixelWidth(tip, nullptr), 0);
+}
+
+TEST(TooltipText, JapaneseNameCountsCharactersAndSetsTheWidth) {
+    const LeadByteTable sjis = LeadBytesOfCodePage(932);
+    std::string name;
+    for (int i = 0; i < 10; ++i)
+        name += "\x83\x5C"; // ten katakana So, the second byte a backslash
+    std::tm local{};
+    local.tm_year = 2021 - 1900;
+    local.tm_mday = 1;
+    const ThumbTooltip tip = BuildTooltip(name + "-plan.dwg", 1234, &local, sjis);
+    EXPECT_EQ(tip.width, 19) << "19 characters, 29 bytes: the date is as long";
+    EXPECT_EQ(tip.lines[0], name + "-plan.dwg "); // no blank but the one before the size
+    EXPECT_EQ(tip.text, tip.lines[0] + "Size=1234          01/01/2021;00.00.00");
+    // A Japanese font: 12 pixels for a double-byte character, 7 for any other; the name's line is widest.
+    const auto japanese = [&sjis](const std::string& text) {
+        int width = 0;
+        for (std::size_t i = 0; i < text.size();) {
+            const std::size_t next = NextCharacter(text, i, sjis);
+            width += next - i == 2 ? 12 : 7;
+            i = next;
+        }
+        return width;
+    };
+    EXPECT_EQ(TooltipPixelWidth(tip, japanese), 10 * 12 + 10 * 7);
+}

@@ -173,7 +173,15 @@ TEST(ThumbnailTooltip, NameSizeAndLocalDateInOneNarrowTip) {
     Pump();
     ASSERT_NE(tip.m_hWnd, nullptr);
     EXPECT_EQ(tip.GetToolCount(), 1);
-    EXPECT_EQ(tip.SendMessage(TTM_GETMAXTIPWIDTH), 19);
+    // As wide as the widest line, the date (the other lines are shorter with their blanks), in the
+    // tooltip's font: three lines, none broken inside.
+    {
+        CClientDC dc(tip.m_hWnd);
+        const CSelectObject font(dc.GetSafeHdc(), reinterpret_cast<HGDIOBJ>(tip.SendMessage(WM_GETFONT)));
+        SIZE date{};
+        ::GetTextExtentPoint32A(dc.GetSafeHdc(), "05/03/2021;14.07.09", 19, &date);
+        EXPECT_EQ(tip.SendMessage(TTM_GETMAXTIPWIDTH), date.cx);
+    }
     char text[256] = {};
     TTTOOLINFOA ti{};
     ti.cbSize = TTTOOLINFOA_V2_SIZE;
