@@ -83,6 +83,10 @@ bool IsWritableEdit(HWND window) {
 } // namespace
 
 bool CMainFrame::PreTranslateMessage(MSG* pMsg) {
+    if (pMsg->message == WM_KEYDOWN && m_wndToolBar2.m_hWnd && ::GetFocus() == m_wndToolBar2.m_hWnd &&
+        !IsHeld(VK_CONTROL) && !IsHeld(VK_MENU) &&
+        HandlePickBarKey(static_cast<UINT>(pMsg->wParam), IsHeld(VK_SHIFT)))
+        return true;
     // In an edit box Ctrl+A selects its text, Ctrl+V pastes text into it, and so on, as in every edit box:
     // those keys must not reach the drawings (select all, copy, paste files into the folder).
     if ((pMsg->message == WM_KEYDOWN || pMsg->message == WM_SYSKEYDOWN) && IsWritableEdit(::GetFocus()) &&
@@ -334,6 +338,7 @@ CView* CMainFrame::MakeGridView() {
             SetMessageText(text);
     };
     grid->onTellUser = [this](const std::string& text) { TellUser(text); };
+    grid->onFocusPickButtons = [this] { FocusPickButton(m_bPickEnabled ? ID_ACCEPT : ID_CANCEL_PICK); };
     grid->onFocusFolderTree = [this] {
         if (CChildView* tree = GetFolderTree())
             tree->SetFocus();
@@ -378,6 +383,7 @@ bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {
         if (m_pGridView)
             m_pGridView->RunSearch(text);
     };
+    m_wndSearch.onAccept = [this] { OnCmdMsg(ID_ACCEPT, 0); };
     if (!m_wndSplitter.CreateStatic(this, 1, 2))
         return false;
     const int leftWidth = m_pDoc ? m_pDoc->m_nSplitterSize : 100;
@@ -432,6 +438,60 @@ void CMainFrame::EnablePick(bool enable) {
         m_wndToolBar2.GetToolBarCtrl().EnableButton(ID_ACCEPT, enable);
     if (m_wndAcceptLabel.m_hWnd)
         m_wndAcceptLabel.EnableWindow(enable);
+}
+
+void CMainFrame::FocusPickButton(UINT id) {
+    if (!m_wndToolBar2.m_hWnd)
+        return;
+    const int index = m_wndToolBar2.CommandToIndex(id);
+    if (index < 0)
+        return;
+    if (::GetFocus() != m_wndToolBar2.m_hWnd)
+        m_wndToolBar2.SetFocus();
+    m_wndToolBar2.SendMessage(TB_SETHOTITEM, static_cast<WPARAM>(index));
+}
+
+void CMainFrame::LeavePickBar() {
+    if (m_wndToolBar2.m_hWnd)
+        m_wndToolBar2.SendMessage(TB_SETHOTITEM, static_cast<WPARAM>(-1));
+}
+
+bool CMainFrame::HandlePickBarKey(UINT vk, bool shift) {
+    const int hot = static_cast<int>(m_wndToolBar2.SendMessage(TB_GETHOTITEM));
+    const UINT id = hot >= 0 ? m_wndToolBar2.GetItemID(hot) : 0;
+    // Accept is skipped while no drawing is chosen.
+    const bool onAccept = id == ID_ACCEPT;
+    switch (vk) {
+    case VK_TAB:
+        if (!shift && onAccept) {
+            FocusPickButton(ID_CANCEL_PICK);
+        } else if (shift && !onAccept && m_bPickEnabled) {
+            FocusPickButton(ID_ACCEPT);
+        } else {
+            LeavePickBar();
+            if (shift && m_pGridView && m_pGridView->m_hWnd)
+                m_pGridView->SetFocus();
+            else if (CChildView* tree = GetFolderTree())
+                tree->SetFocus();
+            else if (m_pGridView && m_pGridView->m_hWnd)
+                m_pGridView->SetFocus();
+        }
+        return true;
+    case VK_LEFT:
+    case VK_RIGHT:
+        FocusPickButton(vk == VK_RIGHT || !m_bPickEnabled ? ID_CANCEL_PICK : ID_ACCEPT);
+        return true;
+    case VK_RETURN:
+    case VK_SPACE:
+        if (id == ID_ACCEPT || id == ID_CANCEL_PICK)
+            OnCmdMsg(id, 0);
+        return true;
+    case VK_ESCAPE:
+        PostAppResult(kAppCancel);
+        return true;
+    default:
+        return false;
+    }
 }
 
 void CMainFrame::SetTitleText(const std::string& text) {

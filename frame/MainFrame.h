@@ -49,6 +49,8 @@ class CEditSearch : public CEdit {
 public:
     // Set by the frame: runs the search for the edit's new text.
     std::function<void(const std::string&)> onSearch;
+    // Set by the frame: Enter takes the drawing the search chose, as the accept button does.
+    std::function<void()> onAccept;
 
 protected:
     bool OnCommandReflect(UINT code) override; // EN_CHANGE
@@ -129,6 +131,11 @@ private:
     void SetSortMode(int mode);
     void ShowHelp();
     void TellUser(const std::string& text);
+    // The accept and cancel buttons take the keyboard: the bottom toolbar gets the focus with the button
+    // shown hot; Tab, the arrows, Enter and Space act on it there.
+    void FocusPickButton(UINT id);
+    bool HandlePickBarKey(UINT vk, bool shift);
+    void LeavePickBar();
 
     CSplitterWnd m_wndSplitter;
     CEditSearch m_wndSearch;

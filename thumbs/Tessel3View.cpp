@@ -807,8 +807,18 @@ bool CTessel3View::OnScroll(UINT scrollCode, UINT pos, bool doScroll) {
 bool CTessel3View::HandleKey(UINT key) {
     switch (key) {
     case VK_TAB:
-        if (onFocusFolderTree)
-            onFocusFolderTree();
+        // Tab goes on to the accept and cancel buttons, Shift+Tab back to the tree.
+        if (::GetKeyState(VK_SHIFT) & 0x8000) {
+            if (onFocusFolderTree)
+                onFocusFolderTree();
+        } else if (onFocusPickButtons) {
+            onFocusPickButtons();
+        }
+        return true;
+    case VK_RETURN:
+        // Enter takes the chosen drawing, as the accept button does; with none chosen it does nothing.
+        if (m_pFolder && m_pFolder->Chosen() >= 0)
+            PostAppResult(kAppAccept);
         return true;
     case VK_PRIOR:
         m_nFirstRow = grid::PageUpFirstRow(m_nFirstRow, m_nVisibleRows);

@@ -84,7 +84,8 @@ public:
     std::function<void(int mode)> onSort;                 // a sort chosen in a thumbnail's menu
     std::function<void(const std::string&)> onStatusText; // the status bar's message (empty clears)
     std::function<void(const std::string&)> onTellUser;   // something the user must read
-    std::function<void()> onFocusFolderTree;              // Tab leaves the grid for the folder tree
+    std::function<void()> onFocusFolderTree;              // Shift+Tab leaves the grid for the folder tree
+    std::function<void()> onFocusPickButtons;             // Tab leaves the grid for accept and cancel
     // Align: the frame grows (or shrinks) by so many pixels, to hold whole columns and rows.
     std::function<void(int widthChange, int heightChange)> onGrowFrame;
 

@@ -511,19 +511,37 @@ TEST(GridSize, AlignFitsTheFrameToWholeColumnsAndRows) {
     EXPECT_EQ(view.GetColumns(), (client.right + 5) / pitch);
 }
 
-TEST(GridKeys, EscapeCancelsTabGoesToTheTree) {
+TEST(GridKeys, EscapeCancelsTabGoesToTheAcceptAndCancelButtons) {
     GridBench bench(700, 600);
     FillList(20);
     bench.view().Rebuild();
     Pump();
     bench.view().SetFocus();
     PressKey(VK_TAB);
-    EXPECT_EQ(Frame().treeFocusRequests, 1);
+    EXPECT_EQ(Frame().pickFocusRequests, 1);
+    EXPECT_EQ(Frame().treeFocusRequests, 0);
     bench.view().SetFocus();
     PressKey(VK_ESCAPE);
     Pump();
     ASSERT_EQ(Main().results.size(), 1u);
     EXPECT_EQ(Main().results[0], 2u);
+}
+
+TEST(GridKeys, EnterTakesTheChosenDrawingOnly) {
+    GridBench bench(700, 600);
+    FillList(20);
+    bench.view().Rebuild();
+    Pump();
+    bench.view().SetFocus();
+    PressKey(VK_RETURN);
+    Pump();
+    EXPECT_TRUE(Main().results.empty()) << "nothing chosen: Enter takes nothing";
+    Drawings().Choose(3);
+    bench.view().SetFocus();
+    PressKey(VK_RETURN);
+    Pump();
+    ASSERT_EQ(Main().results.size(), 1u);
+    EXPECT_EQ(Main().results[0], 1u);
 }
 
 TEST(GridKeys, KeysOnAThumbnailReachTheGrid) {

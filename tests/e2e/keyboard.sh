@@ -1,0 +1,67 @@
+#!/usr/bin/env bash
+# The explorer with the keyboard alone, as a person uses it: Enter takes the chosen drawing (in the grid
+# and in the search box), Tab reaches the accept and cancel buttons, F6 moves between the tree and the
+# grid, F5 reads the folder again. Real keys through devhost's script; the screenshots are looked at.
+. "$(dirname "$0")/lib.sh"
+
+folder="$WORK/orvexkeys"
+names=(alpha.dwg bravo.dwg charlie.dwg delta.dwg)
+gen_dwg "$WORK/gen" ${#names[@]} --variant 2
+mkdir -p "$folder"
+i=0
+for f in "$WORK/gen"/*; do
+  mv "$f" "$folder/${names[$i]}"
+  i=$((i + 1))
+done
+
+call="(Orvex 1 2 \"$(lisppath "$folder")\\\\\" \"Insert\" \"Close\")"
+frame='contains="orvexkeys" nth=0'
+settings="$WORK/lib/Orvex1.ini"
+printf '[Size]\r\nSplitterSize=150\r\nWindowWidth=760\r\nWindowHeight=560\r\n\r\n' >"$settings"
+run() { devhost --script "$(winpath "$WORK/script.txt")" --eval "$call"; }
+shot() { printf 'screenshot %s %s' "$frame" "$(winpath "$WORK/$1")"; }
+picked() { printf '=> ("%s\\\\%s" ("" "" ""))' "$(lisppath "$folder")" "$1"; }
+
+# 1. Enter in the grid takes the drawing chosen with a click.
+script_with_host_checks "wait $frame timeout=30000" 'sleep 500' 'click class=Edit text="charlie.dwg" at=60,-60' \
+  'sleep 300' "$(shot enter-grid.png)" 'key enter' 'sleep 500'
+run
+expect_line "Enter in the grid takes the chosen drawing" "$(picked charlie.dwg)"
+
+# 2. Enter in the search box takes the drawing the search chose.
+script_with_host_checks "wait $frame timeout=30000" 'sleep 500' 'click id=32790' 'type "del"' 'sleep 300' \
+  "$(shot enter-search.png)" 'key enter' 'sleep 500'
+run
+expect_line "Enter in the search box takes the drawing it chose" "$(picked delta.dwg)"
+
+# 3. Enter in the search box with nothing chosen does nothing: the explorer stays open.
+script_with_host_checks "wait $frame timeout=30000" 'sleep 500' 'click id=32790' 'type "zz"' 'key enter' \
+  'sleep 500' "exists $frame" 'key escape'
+run
+expect_line "Enter with nothing chosen leaves the explorer open" "[script] exists yes"
+expect_line "and Escape then cancels" "=> nil"
+
+# 4. Tab from the grid reaches the accept button, Enter presses it.
+script_with_host_checks "wait $frame timeout=30000" 'sleep 500' 'click class=Edit text="bravo.dwg" at=60,-60' \
+  'sleep 300' 'key tab' 'focus' "$(shot tab-accept.png)" 'key enter' 'sleep 500'
+run
+expect_line "Tab from the grid goes to the accept and cancel buttons" "[script] focus ToolbarWindow32 id=59396"
+expect_line "Enter on the accept button takes the drawing" "$(picked bravo.dwg)"
+
+# 5. Tab twice reaches cancel; Space presses it.
+script_with_host_checks "wait $frame timeout=30000" 'sleep 500' 'click class=Edit text="bravo.dwg" at=60,-60' \
+  'sleep 300' 'key tab' 'key tab' 'focus' "$(shot tab-cancel.png)" 'key space' 'sleep 500'
+run
+expect_line "Tab again stays on the buttons (cancel)" "[script] focus ToolbarWindow32 id=59396"
+expect_line "Space on the cancel button cancels" "=> nil"
+
+# 6. Tab once more goes on to the tree, then to the grid; Shift+Tab in the grid goes back to the tree.
+script_with_host_checks "wait $frame timeout=30000" 'sleep 500' 'click class=Edit text="bravo.dwg" at=60,-60' \
+  'sleep 300' 'key tab' 'key tab' 'key tab' 'focus' 'key tab' 'focus' 'key shift+tab' 'focus' 'key escape'
+run
+foci=$(sed -n 's/^\[script\] focus //p' <<<"$OUT" | head -3 | tr '\n' '|')
+[[ "$foci" == "SysTreeView32 id=59648|"*" id=59649|SysTreeView32 id=59648|" ]] &&
+  pass "Tab goes round: the buttons, the tree, the grid; Shift+Tab goes back to the tree" ||
+  fail "the focus after Tab, Tab, Tab, Tab, Shift+Tab: $foci"
+
+finish
