@@ -440,6 +440,16 @@ void CMainFrame::EnablePick(bool enable) {
         m_wndAcceptLabel.EnableWindow(enable);
 }
 
+void CMainFrame::RefreshFolder() {
+    // Through the tree while it has a selection: a virtual folder selected there shows no drawings, and
+    // reading the folder shown before it would show some.
+    CChildView* tree = GetFolderTree();
+    if (tree && tree->m_hWnd && tree->GetSelectedItem())
+        tree->RefreshCurrentFolder();
+    else
+        m_folder.Refresh();
+}
+
 void CMainFrame::FocusPickButton(UINT id) {
     if (!m_wndToolBar2.m_hWnd)
         return;
@@ -549,6 +559,9 @@ bool CMainFrame::OnCmdMsg(UINT id, int code) {
     case ID_CANCEL_PICK:
         PostAppResult(kAppCancel);
         return true;
+    case ID_VIEW_REFRESH:
+        RefreshFolder();
+        return true;
     case ID_APP_ABOUT: {
         CAboutDlgArx about(this);
         about.DoModal();
@@ -574,6 +587,7 @@ bool CMainFrame::OnUpdateCmdUI(CCmdUI* pCmdUI) {
         pCmdUI->Enable(m_bPickEnabled);
         return true;
     case ID_CANCEL_PICK:
+    case ID_VIEW_REFRESH:
     case ID_VIEW_BEGIN:
     case ID_VIEW_INCREASE:
     case ID_VIEW_DECREASE:

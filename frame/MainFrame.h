@@ -134,6 +134,8 @@ private:
     // The accept and cancel buttons take the keyboard: the bottom toolbar gets the focus with the button
     // shown hot; Tab, the arrows, Enter and Space act on it there.
     void FocusPickButton(UINT id);
+    // F5: the folder shown is read again (drawings another program added or removed show).
+    void RefreshFolder();
     bool HandlePickBarKey(UINT vk, bool shift);
     void LeavePickBar();
 

@@ -18,6 +18,7 @@ call="(Orvex 1 2 \"$(lisppath "$folder")\\\\\" \"Insert\" \"Close\")"
 frame='contains="orvexkeys" nth=0'
 settings="$WORK/lib/Orvex1.ini"
 printf '[Size]\r\nSplitterSize=150\r\nWindowWidth=760\r\nWindowHeight=560\r\n\r\n' >"$settings"
+script() { printf '%s\n' "$@" >"$WORK/script.txt"; }
 run() { devhost --script "$(winpath "$WORK/script.txt")" --eval "$call"; }
 shot() { printf 'screenshot %s %s' "$frame" "$(winpath "$WORK/$1")"; }
 picked() { printf '=> ("%s\\\\%s" ("" "" ""))' "$(lisppath "$folder")" "$1"; }
@@ -63,5 +64,39 @@ foci=$(sed -n 's/^\[script\] focus //p' <<<"$OUT" | head -3 | tr '\n' '|')
 [[ "$foci" == "SysTreeView32 id=59648|"*" id=59649|SysTreeView32 id=59648|" ]] &&
   pass "Tab goes round: the buttons, the tree, the grid; Shift+Tab goes back to the tree" ||
   fail "the focus after Tab, Tab, Tab, Tab, Shift+Tab: $foci"
+
+# 7. Refresh: another program adds a drawing (when the first screenshot is taken) and removes one; F5 in
+#    the grid reads the folder again: the new one shows, the removed one is gone.
+gen_dwg "$WORK/extra" 2 --variant 3
+extra=("$WORK/extra"/*)
+# Another program: waits for the screenshot that marks the explorer as shown, then adds a drawing.
+add_when() { # SHOT SOURCE TARGET
+  (for _ in $(seq 300); do [ -e "$WORK/$1" ] && { cp "$2" "$3"; exit 0; }; sleep 0.1; done) &
+}
+add_when refresh-before.png "${extra[0]}" "$folder/echo.dwg"
+script_with_host_checks "wait $frame timeout=30000" 'sleep 500' "$(shot refresh-before.png)" 'sleep 1500' \
+  "remove $(winpath "$folder/alpha.dwg")" 'exists class=Edit text="echo.dwg"' \
+  'click class=Edit text="bravo.dwg" at=60,-60' 'key f5' 'sleep 800' \
+  'exists class=Edit text="echo.dwg"' 'exists class=Edit text="alpha.dwg"' "$(shot refresh-after.png)" \
+  'key escape'
+run
+wait
+got=$(sed -n 's/^\[script\] exists //p' <<<"$OUT" | tr '\n' ' ')
+[ "$got" == "no yes no " ] && pass "F5 reads the folder again: the added drawing shows, the removed one is gone" ||
+  fail "labels of echo.dwg before F5, echo.dwg and alpha.dwg after: $got"
+
+# 8. A click on the folder already selected in the tree reads it again too.
+script 'wait contains="bravo.dwg" timeout=30000' 'key escape'
+run
+shell_path=$(tr -d '\r' <"$settings" | sed -n 's/^ShellPath=//p')
+add_when click-before.png "${extra[1]}" "$folder/foxtrot.dwg"
+script_with_host_checks "wait $frame timeout=30000" 'sleep 800' "$(shot click-before.png)" 'sleep 1500' \
+  'exists class=Edit text="foxtrot.dwg"' "tree-select class=SysTreeView32 path=\"$shell_path\"" 'sleep 800' \
+  'exists class=Edit text="foxtrot.dwg"' "$(shot click-after.png)" 'key escape'
+run
+wait
+got=$(sed -n 's/^\[script\] exists //p' <<<"$OUT" | tr '\n' ' ')
+[ "$got" == "no yes " ] && pass "a click on the selected folder reads it again ($shell_path)" ||
+  fail "labels of foxtrot.dwg before and after the click on the selected folder: $got"
 
 finish
