@@ -523,9 +523,24 @@ void CMainFrame::OnUpdateFrameTitle(bool addToTitle) {
 }
 
 bool CMainFrame::ForwardToGrid(UINT id) {
-    if (m_pGridView && m_pGridView->m_hWnd)
-        m_pGridView->SendMessage(WM_COMMAND, MAKEWPARAM(id, 0), 0);
-    return true;
+    // Whether the grid carried it out: an accelerator whose command no one takes is a key that does
+    // nothing.
+    return m_pGridView && m_pGridView->m_hWnd && static_cast<CWnd*>(m_pGridView)->OnCmdMsg(id, 0);
+}
+
+void CMainFrame::SwitchPane() {
+    LeavePickBar();
+    // Two panes: F6 and Shift+F6 both go to the other one (from anywhere else, to the tree).
+    HWND focus = ::GetFocus();
+    const bool inTree = focus && m_pFolderPane && m_pFolderPane->m_hWnd &&
+                        (focus == m_pFolderPane->m_hWnd || ::IsChild(m_pFolderPane->m_hWnd, focus));
+    CChildView* tree = GetFolderTree();
+    if (inTree || !tree || !tree->m_hWnd) {
+        if (m_pGridView && m_pGridView->m_hWnd)
+            m_pGridView->SetFocus();
+    } else {
+        tree->SetFocus();
+    }
 }
 
 void CMainFrame::SetSortMode(int mode) {
@@ -562,6 +577,10 @@ bool CMainFrame::OnCmdMsg(UINT id, int code) {
     case ID_VIEW_REFRESH:
         RefreshFolder();
         return true;
+    case ID_NEXT_PANE:
+    case ID_PREV_PANE:
+        SwitchPane();
+        return true;
     case ID_APP_ABOUT: {
         CAboutDlgArx about(this);
         about.DoModal();
@@ -588,6 +607,8 @@ bool CMainFrame::OnUpdateCmdUI(CCmdUI* pCmdUI) {
         return true;
     case ID_CANCEL_PICK:
     case ID_VIEW_REFRESH:
+    case ID_NEXT_PANE:
+    case ID_PREV_PANE:
     case ID_VIEW_BEGIN:
     case ID_VIEW_INCREASE:
     case ID_VIEW_DECREASE:

@@ -136,6 +136,8 @@ private:
     void FocusPickButton(UINT id);
     // F5: the folder shown is read again (drawings another program added or removed show).
     void RefreshFolder();
+    // F6, Shift+F6: the keyboard goes from the tree to the grid or back.
+    void SwitchPane();
     bool HandlePickBarKey(UINT vk, bool shift);
     void LeavePickBar();
 

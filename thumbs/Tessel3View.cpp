@@ -816,9 +816,7 @@ bool CTessel3View::HandleKey(UINT key) {
         }
         return true;
     case VK_RETURN:
-        // Enter takes the chosen drawing, as the accept button does; with none chosen it does nothing.
-        if (m_pFolder && m_pFolder->Chosen() >= 0)
-            PostAppResult(kAppAccept);
+        TakeChosen();
         return true;
     case VK_PRIOR:
         m_nFirstRow = grid::PageUpFirstRow(m_nFirstRow, m_nVisibleRows);
@@ -847,6 +845,12 @@ bool CTessel3View::HandleKey(UINT key) {
     default:
         return false;
     }
+}
+
+void CTessel3View::TakeChosen() {
+    // As the accept button does; with none chosen nothing happens.
+    if (m_pFolder && m_pFolder->Chosen() >= 0)
+        PostAppResult(kAppAccept);
 }
 
 bool CTessel3View::PreTranslateMessage(MSG* pMsg) {
@@ -878,6 +882,7 @@ bool CTessel3View::OnCmdMsg(UINT id, int code) {
         {ID_VIEW_DECREASE, [](CTessel3View& view) { view.Decrease(); }},
         {ID_VIEW_ALIGNE, [](CTessel3View& view) { view.Align(); }},
         {ID_SELECT_ALL, [](CTessel3View& view) { view.SelectAll(); }},
+        {ID_FILE_OPEN, [](CTessel3View& view) { view.TakeChosen(); }},
         {ID_EDIT_COPY, [](CTessel3View& view) { view.CopySelection(false); }},
         {ID_EDIT_CUT, [](CTessel3View& view) { view.CopySelection(true); }},
         {ID_EDIT_PASTE, [](CTessel3View& view) { view.PasteFiles(); }},

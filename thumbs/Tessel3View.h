@@ -113,6 +113,8 @@ public:
     void DeselectAll();
     // Marks every drawing selected, and every label shows it.
     void SelectAll();
+    // Enter and Ctrl+O: the chosen drawing is taken (the accept button's pick); nothing when none is.
+    void TakeChosen();
     void Increase();
     void Decrease();
     void Align();

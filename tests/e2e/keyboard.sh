@@ -99,4 +99,13 @@ got=$(sed -n 's/^\[script\] exists //p' <<<"$OUT" | tr '\n' ' ')
 [ "$got" == "no yes " ] && pass "a click on the selected folder reads it again ($shell_path)" ||
   fail "labels of foxtrot.dwg before and after the click on the selected folder: $got"
 
+# 9. F6 and Shift+F6 take the keyboard between the tree and the grid; Ctrl+O takes the chosen drawing.
+script_with_host_checks "wait $frame timeout=30000" 'sleep 500' 'click class=Edit text="delta.dwg" at=60,-60' \
+  'focus' 'key f6' 'focus' 'key shift+f6' 'focus' "$(shot f6.png)" 'key ctrl+o' 'sleep 500'
+run
+foci=$(sed -n 's/^\[script\] focus //p' <<<"$OUT" | head -3 | tr '\n' '|')
+[[ "$foci" == *" id=59649|SysTreeView32 id=59648|"*" id=59649|" ]] &&
+  pass "F6 goes from the grid to the tree, Shift+F6 back" || fail "the focus before and after F6, Shift+F6: $foci"
+expect_line "Ctrl+O takes the chosen drawing" "$(picked delta.dwg)"
+
 finish

@@ -21,6 +21,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <fstream>
 #include <functional>
@@ -891,4 +892,64 @@ TEST_F(ExplorerFrame, CancelButtonOfTheBottomToolbarCancelsByMouse) {
         bar.PostMessage(WM_LBUTTONUP, 0, MAKELPARAM(at.x, at.y));
     });
     EXPECT_EQ(Run(dialog), 2);
+}
+
+// Every key of the accelerator table does something: its command reaches a handler of the frame or of
+// the grid (a command no one takes is a key that does nothing).
+TEST_F(ExplorerFrame, EveryAcceleratorReachesAHandler) {
+    const auto files = {"one.dwg", "two.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-accel", files);
+    g_call.startPath = folder + "\\";
+    HACCEL table = ::LoadAcceleratorsA(AfxGetResourceHandle(), MAKEINTRESOURCEA(IDR_MAINFRAME));
+    ASSERT_NE(table, nullptr);
+    ACCEL entries[64];
+    const int count = ::CopyAcceleratorTableA(table, entries, 64);
+    ::DestroyAcceleratorTable(table);
+    ASSERT_GT(count, 0);
+    // Paste first, with nothing on the clipboard, and select all last: nothing is copied into the folder.
+    std::vector<UINT> commands;
+    for (int i = 0; i < count; ++i)
+        commands.push_back(entries[i].cmd);
+    std::stable_sort(commands.begin(), commands.end(), [](UINT a, UINT b) {
+        const auto rank = [](UINT id) { return id == ID_EDIT_PASTE ? 0 : id == ID_SELECT_ALL ? 2 : 1; };
+        return rank(a) < rank(b);
+    });
+    if (::OpenClipboard(nullptr)) {
+        ::EmptyClipboard();
+        ::CloseClipboard();
+    }
+    std::vector<UINT> unhandled;
+    RunDialog dialog;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        for (UINT id : commands)
+            if (!static_cast<CWnd&>(frame).OnCmdMsg(id, 0))
+                unhandled.push_back(id);
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(unhandled, std::vector<UINT>{}) << "commands of the accelerator table that nothing handles";
+    RemoveFolder(folder, files);
+}
+
+// F6 and Shift+F6 take the keyboard from the tree to the grid and back.
+TEST_F(ExplorerFrame, NextAndPreviousPaneMoveTheFocusBetweenTreeAndGrid) {
+    RunDialog dialog;
+    std::vector<HWND> foci;
+    HWND tree = nullptr, grid = nullptr;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        ASSERT_NE(frame.GetFolderTree(), nullptr);
+        ASSERT_NE(frame.GetGridView(), nullptr);
+        tree = frame.GetFolderTree()->m_hWnd;
+        grid = frame.GetGridView()->m_hWnd;
+        ::SetFocus(tree);
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_NEXT_PANE, 1), 0);
+        foci.push_back(::GetFocus());
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_PREV_PANE, 1), 0);
+        foci.push_back(::GetFocus());
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_PREV_PANE, 1), 0);
+        foci.push_back(::GetFocus());
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(foci, (std::vector<HWND>{grid, tree, grid}));
 }
