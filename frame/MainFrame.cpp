@@ -116,7 +116,17 @@ std::string HelpFilePath() {
     return path + ".hlp";
 }
 
+std::string DrawingCountText(int count) {
+    if (count <= 0)
+        return "No drawings";
+    return count == 1 ? "1 drawing" : std::to_string(count) + " drawings";
+}
+
 std::string LayerLabelText(const std::string& folder) {
+    // No folder yet (a first run without a start folder): nothing to read, and "\datains.ini" would be
+    // the root folder's file.
+    if (folder.empty())
+        return " Layer name: Current";
     // The separator is always added: datains.ini lies in the folder itself.
     CIniFile ini(FolderSettingsFilePath(folder));
     std::string layer;
@@ -159,6 +169,8 @@ int CMainFrame::OnCreate(LPCREATESTRUCTA cs) {
     // Without its labels or the search edit the frame still stands; the rest of the set-up is skipped.
     if (!CreateMainToolBar())
         return 0;
+    // Before any folder is shown (a first run) the label already says which layer a pick goes on.
+    UpdateLayerLabel();
     if (!m_wndToolBar2.CreateEx(this, TBSTYLE_FLAT,
                                 WS_CHILD | WS_VISIBLE | CBRS_BOTTOM | CBRS_TOOLTIPS | CBRS_FLYBY, CRect(),
                                 kPickToolBarId) ||
@@ -280,8 +292,12 @@ void CMainFrame::OnFolderShown() {
     if (m_pGridView && m_pGridView->m_hWnd)
         m_pGridView->Rebuild();
     UpdateLayerLabel();
-    if (!m_folder.Problem().empty())
-        SetMessageText(m_folder.Problem());
+    m_strIdleMessage = DrawingCountText(m_folder.Count());
+    SetMessageText(m_folder.Problem().empty() ? m_strIdleMessage : m_folder.Problem());
+}
+
+std::string CMainFrame::GetIdleMessage() const {
+    return m_strIdleMessage.empty() ? CFrameWnd::GetIdleMessage() : m_strIdleMessage;
 }
 
 void CMainFrame::OnDrawingChosen() {

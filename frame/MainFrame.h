@@ -103,6 +103,9 @@ public:
     // The frame's accelerators, but for the keys an edit box uses on its text while one has the focus.
     bool PreTranslateMessage(MSG* pMsg) override;
 
+    // How many drawings the folder shown holds, once one is shown: the status bar comes back to it.
+    std::string GetIdleMessage() const override;
+
 protected:
     int OnCreate(LPCREATESTRUCTA cs) override;
     void OnDestroy() override;
@@ -158,6 +161,7 @@ private:
     CTessel3Doc* m_pDoc = nullptr;       // of the creation context; outlives the frame
     CTessel3View* m_pGridView = nullptr; // the right pane
     CLeftView* m_pFolderPane = nullptr;  // the left pane
+    std::string m_strIdleMessage;        // the status bar's resting text; empty: the framework's
 };
 
 // The one command of the folder tree's right-click menu.
@@ -181,3 +185,5 @@ std::string ExplorerTitle(const std::string& windowText);
 std::string HelpFilePath();
 // The layer label of a folder: " Layer name: " and the folder's datains.ini layer, or "Current".
 std::string LayerLabelText(const std::string& folder);
+// The status bar's count of the drawings a folder holds: "No drawings", "1 drawing", "12 drawings".
+std::string DrawingCountText(int count);

@@ -43,6 +43,8 @@ bool CDialogSetLa::SetFolder(const std::string& folder) {
 
 bool CDialogSetLa::OnInitDialog() {
     CDialog::OnInitDialog();
+    // The settings are the folder's own: the caption says which folder they belong to.
+    SetWindowText(std::string("Folder settings - ") + m_szPath);
     m_LispCommand.SubclassDlgItem(IDC_SETLA_COMMAND, this);
     m_StaticColor.SubclassDlgItem(IDC_SETLA_COLOR, this);
     m_LayerName.SubclassDlgItem(IDC_SETLA_LAYER, this);

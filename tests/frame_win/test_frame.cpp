@@ -953,3 +953,36 @@ TEST_F(ExplorerFrame, NextAndPreviousPaneMoveTheFocusBetweenTreeAndGrid) {
     EXPECT_EQ(Run(dialog), 2);
     EXPECT_EQ(foci, (std::vector<HWND>{grid, tree, grid}));
 }
+
+// A first run: no settings, no start folder. The layer label already says where a pick goes.
+TEST_F(ExplorerFrame, FirstRunLayerLabelSaysCurrent) {
+    RunDialog dialog;
+    std::string label;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        label = frame.GetLayerLabel().GetWindowText();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(label, " Layer name: Current");
+}
+
+// The status bar says how many drawings the folder holds, and comes back to it after a prompt.
+TEST_F(ExplorerFrame, StatusBarCountsTheDrawingsOfTheFolder) {
+    const auto files = {"a.dwg", "b.dwg", "c.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-count", files);
+    g_call.startPath = folder + "\\";
+    RunDialog dialog;
+    std::string shown, idle;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        shown = frame.GetStatusBar().GetPaneText(0);
+        idle = frame.GetIdleMessage();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(shown, "3 drawings");
+    EXPECT_EQ(idle, "3 drawings");
+    EXPECT_EQ(DrawingCountText(0), "No drawings");
+    EXPECT_EQ(DrawingCountText(1), "1 drawing");
+    EXPECT_EQ(DrawingCountText(12345), "12345 drawings");
+    RemoveFolder(folder, files);
+}

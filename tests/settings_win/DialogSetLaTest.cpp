@@ -176,7 +176,7 @@ TEST_F(FolderSettingsDialog, TheTemplateAsDesigned) {
         EXPECT_EQ(got, swatchRect);
         d.Press(IDCANCEL);
     });
-    EXPECT_EQ(caption, "Folder settings");
+    EXPECT_EQ(caption, "Folder settings - " + m_folder.Dir()) << "the caption names the folder it edits";
     EXPECT_EQ(boxText, "&Use current layer");
     EXPECT_EQ(accept, "&Accept");
     EXPECT_EQ(cancel, "&Cancel");
