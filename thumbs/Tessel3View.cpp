@@ -686,13 +686,31 @@ void CTessel3View::Refit(bool resizeFrame) {
     if (m_nRows <= 0)
         return;
     FlagGuard guard(m_bAligning);
-    const CRect client = GetClientRect();
-    // With a frame of no size the numbers are what the frame must grow by.
-    const grid::RefitNumbers n = grid::ComputeRefit(Geometry(), client.right, client.bottom, 0, 0);
-    m_nColumns = n.columns;
-    if (resizeFrame && onGrowFrame)
+    CRect client = GetClientRect();
+    if (resizeFrame && onGrowFrame) {
+        // With a frame of no size the numbers are what the frame must grow (or shrink) by.
+        const CSize room = FrameRoom();
+        const grid::RefitNumbers n =
+            grid::ComputeRefit(Geometry(), client.right, client.bottom, 0, 0, room.cx, room.cy);
         onGrowFrame(n.frameWidth, n.frameHeight);
+        client = GetClientRect();
+    }
+    // The columns the client holds now (no room to grow: whole columns only).
+    m_nColumns = grid::ComputeRefit(Geometry(), client.right, client.bottom, 0, 0, 0, 0).columns;
     Relayout();
+}
+
+CSize CTessel3View::FrameRoom() const {
+    // How far the window may grow to the right and down and stay inside its screen's work area.
+    HWND top = ::GetAncestor(m_hWnd, GA_ROOT);
+    CRect frame;
+    MONITORINFO monitor{};
+    monitor.cbSize = sizeof monitor;
+    if (!top || !::GetWindowRect(top, &frame) ||
+        !::GetMonitorInfoA(::MonitorFromWindow(top, MONITOR_DEFAULTTONEAREST), &monitor))
+        return CSize(0, 0);
+    return CSize(std::max(0L, monitor.rcWork.right - frame.right),
+                 std::max(0L, monitor.rcWork.bottom - frame.bottom));
 }
 
 void CTessel3View::Relayout() {

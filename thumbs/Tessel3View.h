@@ -209,6 +209,7 @@ private:
     void Layout();
     void Refit(bool resizeFrame);
     void Relayout();
+    CSize FrameRoom() const;
     void CreateRow(int row, int rowTop);
     // Binds or creates the windows of a row's cells (onlyMissing: only of cells whose control has none).
     void PlaceRow(int row, int rowTop, bool onlyMissing);
