@@ -287,13 +287,21 @@ void CMainFrame::WireDrawingFolder() {
 void CMainFrame::OnFolderShown() {
     if (!m_hWnd)
         return;
-    SetTitleText(m_folder.Folder());
+    SetTitleText(FolderTitle());
     EnablePick(false);
     if (m_pGridView && m_pGridView->m_hWnd)
         m_pGridView->Rebuild();
     UpdateLayerLabel();
-    m_strIdleMessage = DrawingCountText(m_folder.Count());
-    SetMessageText(m_folder.Problem().empty() ? m_strIdleMessage : m_folder.Problem());
+    // What went wrong stays in the status bar; else it comes back to the count.
+    m_strIdleMessage = m_folder.Problem().empty() ? DrawingCountText(m_folder.Count()) : m_folder.Problem();
+    SetMessageText(m_strIdleMessage);
+}
+
+std::string CMainFrame::FolderTitle() const {
+    // A folder that could not be read is not open: the title does not name it (the status bar says why).
+    if (!m_folder.Folder().empty() && !m_folder.IsRead())
+        return kExplorerTitle;
+    return m_folder.Folder();
 }
 
 std::string CMainFrame::GetIdleMessage() const {
@@ -304,7 +312,7 @@ void CMainFrame::OnDrawingChosen() {
     if (!m_hWnd)
         return;
     const bool chosen = m_folder.Chosen() >= 0;
-    SetTitleText(chosen ? m_folder.ChosenPath() : m_folder.Folder());
+    SetTitleText(chosen ? m_folder.ChosenPath() : FolderTitle());
     EnablePick(chosen);
 }
 

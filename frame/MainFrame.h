@@ -128,6 +128,8 @@ private:
     // What the folder model says changed.
     void OnFolderShown();
     void OnDrawingChosen();
+    // The title for the folder shown: its path, or the explorer's name when it could not be read.
+    std::string FolderTitle() const;
     // The folder tree's right-click menu, "&Folder settings", and the dialog it opens.
     void ShowFolderMenu(HTREEITEM item);
     bool ForwardToGrid(UINT id);

@@ -986,3 +986,36 @@ TEST_F(ExplorerFrame, StatusBarCountsTheDrawingsOfTheFolder) {
     EXPECT_EQ(DrawingCountText(12345), "12345 drawings");
     RemoveFolder(folder, files);
 }
+
+// A start folder that is not there: the status bar says so, and the title does not name it as open.
+TEST_F(ExplorerFrame, AStartFolderThatDoesNotExistIsSaidAndNotShownAsOpen) {
+    const std::string folder = TempFolder("orvex-frame-gone") + "\\not-there";
+    g_call.startPath = folder + "\\";
+    RunDialog dialog;
+    std::string status, title, idle;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        status = frame.GetStatusBar().GetPaneText(0);
+        title = frame.GetWindowText();
+        idle = frame.GetIdleMessage();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(status, "The folder cannot be read: " + folder + " does not exist");
+    EXPECT_EQ(idle, status) << "the status bar comes back to it";
+    EXPECT_EQ(title.find("not-there"), std::string::npos) << title;
+}
+
+TEST_F(ExplorerFrame, AStartFolderThatIsAFileIsSaid) {
+    const std::string file = TempFolder("orvex-frame-file") + "\\plain";
+    std::ofstream(file, std::ios::binary) << "x";
+    g_call.startPath = file + "\\";
+    RunDialog dialog;
+    std::string status;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        status = frame.GetStatusBar().GetPaneText(0);
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    std::remove(file.c_str());
+    EXPECT_EQ(status, "The folder cannot be read: " + file + " is a file, not a folder");
+}
