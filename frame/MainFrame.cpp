@@ -8,6 +8,7 @@
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
 #include "thumbs/DrawingFolder.h"
+#include "thumbs/DwgList.h"
 #include "thumbs/Tessel3View.h"
 #include "tree/LeftView.h"
 
@@ -299,7 +300,8 @@ void CMainFrame::OnFolderShown() {
 
 std::string CMainFrame::FolderTitle() const {
     // A folder that could not be read is not open: the title does not name it (the status bar says why).
-    if (!m_folder.Folder().empty() && !m_folder.IsRead())
+    // One refused for its length is still there, and the title, Path and ShellPath all name it.
+    if (!m_folder.Folder().empty() && !m_folder.IsRead() && FolderPathProblem(m_folder.Folder()).empty())
         return kExplorerTitle;
     return m_folder.Folder();
 }

@@ -128,7 +128,8 @@ private:
     // What the folder model says changed.
     void OnFolderShown();
     void OnDrawingChosen();
-    // The title for the folder shown: its path, or the explorer's name when it could not be read.
+    // The title for the folder shown: its path, or the explorer's name when it does not exist or cannot
+    // be reached.
     std::string FolderTitle() const;
     // The folder tree's right-click menu, "&Folder settings", and the dialog it opens.
     void ShowFolderMenu(HTREEITEM item);

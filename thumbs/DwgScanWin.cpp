@@ -3,6 +3,7 @@
 #include "thumbs/DwgList.h"
 #include "thumbs/NameFold.h"
 
+#include <cerrno>
 #include <windows.h>
 
 #include <io.h>
@@ -136,11 +137,18 @@ bool FileSystemFolderReader::Read(const std::string& folder, std::vector<DwgData
     struct __finddata64_t found;
     FindHandle search(_findfirst64(pattern.c_str(), &found));
     if (search.get() == -1) {
-        // A drive's root without a single entry lists nothing, not even "." and "..": read, and empty.
+        const int findError = errno;
         const DWORD attributes = ::GetFileAttributesA(folder.c_str());
-        if (attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY))
+        const DWORD error = ::GetLastError();
+        const bool isFolder =
+            attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY);
+        // A drive's root without a single entry lists nothing, not even "." and "..": read, and empty.
+        if (isFolder && findError == ENOENT)
             return true;
-        problem = UnreadableFolderMessage(folder, attributes != INVALID_FILE_ATTRIBUTES, ::GetLastError());
+        if (isFolder)
+            problem = UnreadableFolderMessage(folder, false, findError == EACCES ? ERROR_ACCESS_DENIED : 0);
+        else
+            problem = UnreadableFolderMessage(folder, attributes != INVALID_FILE_ATTRIBUTES, error);
         return false;
     }
     int tooLong = 0;
