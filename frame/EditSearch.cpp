@@ -19,14 +19,20 @@ LRESULT CEditSearch::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
             PostAppResult(kAppCancel);
             return 0;
         }
+        if (wParam == VK_RETURN) {
+            if (onAccept)
+                onAccept();
+            return 0;
+        }
         if (wParam == 'A' && (::GetKeyState(VK_CONTROL) & 0x8000) && !(::GetKeyState(VK_MENU) & 0x8000)) {
             SetSel(0, -1); // select all of the text, as edit boxes do
             return 0;
         }
         break;
     case WM_CHAR:
-        // The edit would beep at the escape character (the key has already cancelled) and at Ctrl+A's.
-        if (wParam == VK_ESCAPE || wParam == 0x01)
+        // The edit would beep at the escape character (the key has already cancelled), at Enter's and at
+        // Ctrl+A's.
+        if (wParam == VK_ESCAPE || wParam == '\r' || wParam == 0x01)
             return 0;
         break;
     case WM_LBUTTONDOWN:

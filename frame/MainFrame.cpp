@@ -9,6 +9,7 @@
 #include "settings/Tessel3Doc.h"
 #include "thumbs/AppMessages.h"
 #include "thumbs/DrawingFolder.h"
+#include "thumbs/DwgList.h"
 #include "thumbs/Tessel3View.h"
 #include "tree/LeftView.h"
 
@@ -84,6 +85,10 @@ bool IsWritableEdit(HWND window) {
 } // namespace
 
 bool CMainFrame::PreTranslateMessage(MSG* pMsg) {
+    if (pMsg->message == WM_KEYDOWN && m_wndToolBar2.m_hWnd && ::GetFocus() == m_wndToolBar2.m_hWnd &&
+        !IsHeld(VK_CONTROL) && !IsHeld(VK_MENU) &&
+        HandlePickBarKey(static_cast<UINT>(pMsg->wParam), IsHeld(VK_SHIFT)))
+        return true;
     // In an edit box Ctrl+A selects its text, Ctrl+V pastes text into it, and so on, as in every edit box:
     // those keys must not reach the drawings (select all, copy, paste files into the folder).
     if ((pMsg->message == WM_KEYDOWN || pMsg->message == WM_SYSKEYDOWN) && IsWritableEdit(::GetFocus()) &&
@@ -113,7 +118,17 @@ std::string HelpFilePath() {
     return path + ".hlp";
 }
 
+std::string DrawingCountText(int count) {
+    if (count <= 0)
+        return "No drawings";
+    return count == 1 ? "1 drawing" : std::to_string(count) + " drawings";
+}
+
 std::string LayerLabelText(const std::string& folder) {
+    // No folder yet (a first run without a start folder): nothing to read, and "\datains.ini" would be
+    // the root folder's file.
+    if (folder.empty())
+        return " Layer name: Current";
     // The separator is always added: datains.ini lies in the folder itself.
     CIniFile ini(FolderSettingsFilePath(folder));
     std::string layer;
@@ -156,6 +171,8 @@ int CMainFrame::OnCreate(LPCREATESTRUCTA cs) {
     // Without its labels or the search edit the frame still stands; the rest of the set-up is skipped.
     if (!CreateMainToolBar())
         return 0;
+    // Before any folder is shown (a first run) the label already says which layer a pick goes on.
+    UpdateLayerLabel();
     if (!m_wndToolBar2.CreateEx(this, TBSTYLE_FLAT,
                                 WS_CHILD | WS_VISIBLE | CBRS_BOTTOM | CBRS_TOOLTIPS | CBRS_FLYBY, CRect(),
                                 kPickToolBarId) ||
@@ -272,20 +289,33 @@ void CMainFrame::WireDrawingFolder() {
 void CMainFrame::OnFolderShown() {
     if (!m_hWnd)
         return;
-    SetTitleText(m_folder.Folder());
+    SetTitleText(FolderTitle());
     EnablePick(false);
     if (m_pGridView && m_pGridView->m_hWnd)
         m_pGridView->Rebuild();
     UpdateLayerLabel();
-    if (!m_folder.Problem().empty())
-        SetMessageText(m_folder.Problem());
+    // What went wrong stays in the status bar; else it comes back to the count.
+    m_strIdleMessage = m_folder.Problem().empty() ? DrawingCountText(m_folder.Count()) : m_folder.Problem();
+    SetMessageText(m_strIdleMessage);
+}
+
+std::string CMainFrame::FolderTitle() const {
+    // A folder that could not be read is not open: the title does not name it (the status bar says why).
+    // One refused for its length is still there, and the title, Path and ShellPath all name it.
+    if (!m_folder.Folder().empty() && !m_folder.IsRead() && FolderPathProblem(m_folder.Folder()).empty())
+        return kExplorerTitle;
+    return m_folder.Folder();
+}
+
+std::string CMainFrame::GetIdleMessage() const {
+    return m_strIdleMessage.empty() ? CFrameWnd::GetIdleMessage() : m_strIdleMessage;
 }
 
 void CMainFrame::OnDrawingChosen() {
     if (!m_hWnd)
         return;
     const bool chosen = m_folder.Chosen() >= 0;
-    SetTitleText(chosen ? m_folder.ChosenPath() : m_folder.Folder());
+    SetTitleText(chosen ? m_folder.ChosenPath() : FolderTitle());
     EnablePick(chosen);
 }
 
@@ -335,6 +365,7 @@ CView* CMainFrame::MakeGridView() {
             SetMessageText(text);
     };
     grid->onTellUser = [this](const std::string& text) { TellUser(text); };
+    grid->onFocusPickButtons = [this] { FocusPickButton(m_bPickEnabled ? ID_ACCEPT : ID_CANCEL_PICK); };
     grid->onFocusFolderTree = [this] {
         if (CChildView* tree = GetFolderTree())
             tree->SetFocus();
@@ -379,6 +410,7 @@ bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {
         if (m_pGridView)
             m_pGridView->RunSearch(text);
     };
+    m_wndSearch.onAccept = [this] { OnCmdMsg(ID_ACCEPT, 0); };
     if (!m_wndSplitter.CreateStatic(this, 1, 2))
         return false;
     const int leftWidth = m_pDoc ? m_pDoc->m_nSplitterSize : 100;
@@ -435,6 +467,70 @@ void CMainFrame::EnablePick(bool enable) {
         m_wndAcceptLabel.EnableWindow(enable);
 }
 
+void CMainFrame::RefreshFolder() {
+    // Through the tree while it has a selection: a virtual folder selected there shows no drawings, and
+    // reading the folder shown before it would show some.
+    CChildView* tree = GetFolderTree();
+    if (tree && tree->m_hWnd && tree->GetSelectedItem())
+        tree->RefreshCurrentFolder();
+    else
+        m_folder.Refresh();
+}
+
+void CMainFrame::FocusPickButton(UINT id) {
+    if (!m_wndToolBar2.m_hWnd)
+        return;
+    const int index = m_wndToolBar2.CommandToIndex(id);
+    if (index < 0)
+        return;
+    if (::GetFocus() != m_wndToolBar2.m_hWnd)
+        m_wndToolBar2.SetFocus();
+    m_wndToolBar2.SendMessage(TB_SETHOTITEM, static_cast<WPARAM>(index));
+}
+
+void CMainFrame::LeavePickBar() {
+    if (m_wndToolBar2.m_hWnd)
+        m_wndToolBar2.SendMessage(TB_SETHOTITEM, static_cast<WPARAM>(-1));
+}
+
+bool CMainFrame::HandlePickBarKey(UINT vk, bool shift) {
+    const int hot = static_cast<int>(m_wndToolBar2.SendMessage(TB_GETHOTITEM));
+    const UINT id = hot >= 0 ? m_wndToolBar2.GetItemID(hot) : 0;
+    // Accept is skipped while no drawing is chosen.
+    const bool onAccept = id == ID_ACCEPT;
+    switch (vk) {
+    case VK_TAB:
+        if (!shift && onAccept) {
+            FocusPickButton(ID_CANCEL_PICK);
+        } else if (shift && !onAccept && m_bPickEnabled) {
+            FocusPickButton(ID_ACCEPT);
+        } else {
+            LeavePickBar();
+            if (shift && m_pGridView && m_pGridView->m_hWnd)
+                m_pGridView->SetFocus();
+            else if (CChildView* tree = GetFolderTree())
+                tree->SetFocus();
+            else if (m_pGridView && m_pGridView->m_hWnd)
+                m_pGridView->SetFocus();
+        }
+        return true;
+    case VK_LEFT:
+    case VK_RIGHT:
+        FocusPickButton(vk == VK_RIGHT || !m_bPickEnabled ? ID_CANCEL_PICK : ID_ACCEPT);
+        return true;
+    case VK_RETURN:
+    case VK_SPACE:
+        if (id == ID_ACCEPT || id == ID_CANCEL_PICK)
+            OnCmdMsg(id, 0);
+        return true;
+    case VK_ESCAPE:
+        PostAppResult(kAppCancel);
+        return true;
+    default:
+        return false;
+    }
+}
+
 void CMainFrame::SetTitleText(const std::string& text) {
     SetWindowText(text);
 }
@@ -454,9 +550,24 @@ void CMainFrame::OnUpdateFrameTitle(bool addToTitle) {
 }
 
 bool CMainFrame::ForwardToGrid(UINT id) {
-    if (m_pGridView && m_pGridView->m_hWnd)
-        m_pGridView->SendMessage(WM_COMMAND, MAKEWPARAM(id, 0), 0);
-    return true;
+    // Whether the grid carried it out: an accelerator whose command no one takes is a key that does
+    // nothing.
+    return m_pGridView && m_pGridView->m_hWnd && static_cast<CWnd*>(m_pGridView)->OnCmdMsg(id, 0);
+}
+
+void CMainFrame::SwitchPane() {
+    LeavePickBar();
+    // Two panes: F6 and Shift+F6 both go to the other one (from anywhere else, to the tree).
+    HWND focus = ::GetFocus();
+    const bool inTree = focus && m_pFolderPane && m_pFolderPane->m_hWnd &&
+                        (focus == m_pFolderPane->m_hWnd || ::IsChild(m_pFolderPane->m_hWnd, focus));
+    CChildView* tree = GetFolderTree();
+    if (inTree || !tree || !tree->m_hWnd) {
+        if (m_pGridView && m_pGridView->m_hWnd)
+            m_pGridView->SetFocus();
+    } else {
+        tree->SetFocus();
+    }
 }
 
 void CMainFrame::SetSortMode(int mode) {
@@ -490,6 +601,13 @@ bool CMainFrame::OnCmdMsg(UINT id, int code) {
     case ID_CANCEL_PICK:
         PostAppResult(kAppCancel);
         return true;
+    case ID_VIEW_REFRESH:
+        RefreshFolder();
+        return true;
+    case ID_NEXT_PANE:
+    case ID_PREV_PANE:
+        SwitchPane();
+        return true;
     case ID_APP_ABOUT: {
         CAboutDlgArx about(this);
         about.DoModal();
@@ -515,6 +633,9 @@ bool CMainFrame::OnUpdateCmdUI(CCmdUI* pCmdUI) {
         pCmdUI->Enable(m_bPickEnabled);
         return true;
     case ID_CANCEL_PICK:
+    case ID_VIEW_REFRESH:
+    case ID_NEXT_PANE:
+    case ID_PREV_PANE:
     case ID_VIEW_BEGIN:
     case ID_VIEW_INCREASE:
     case ID_VIEW_DECREASE:

@@ -49,6 +49,8 @@ class CEditSearch : public CEdit {
 public:
     // Set by the frame: runs the search for the edit's new text.
     std::function<void(const std::string&)> onSearch;
+    // Set by the frame: Enter takes the drawing the search chose, as the accept button does.
+    std::function<void()> onAccept;
 
 protected:
     bool OnCommandReflect(UINT code) override; // EN_CHANGE
@@ -101,6 +103,9 @@ public:
     // The frame's accelerators, but for the keys an edit box uses on its text while one has the focus.
     bool PreTranslateMessage(MSG* pMsg) override;
 
+    // How many drawings the folder shown holds, once one is shown: the status bar comes back to it.
+    std::string GetIdleMessage() const override;
+
 protected:
     int OnCreate(LPCREATESTRUCTA cs) override;
     void OnDestroy() override;
@@ -123,12 +128,24 @@ private:
     // What the folder model says changed.
     void OnFolderShown();
     void OnDrawingChosen();
+    // The title for the folder shown: its path, or the explorer's name when it does not exist or cannot
+    // be reached.
+    std::string FolderTitle() const;
     // The folder tree's right-click menu, "&Folder settings", and the dialog it opens.
     void ShowFolderMenu(HTREEITEM item);
     bool ForwardToGrid(UINT id);
     void SetSortMode(int mode);
     void ShowHelp();
     void TellUser(const std::string& text);
+    // The accept and cancel buttons take the keyboard: the bottom toolbar gets the focus with the button
+    // shown hot; Tab, the arrows, Enter and Space act on it there.
+    void FocusPickButton(UINT id);
+    // F5: the folder shown is read again (drawings another program added or removed show).
+    void RefreshFolder();
+    // F6, Shift+F6: the keyboard goes from the tree to the grid or back.
+    void SwitchPane();
+    bool HandlePickBarKey(UINT vk, bool shift);
+    void LeavePickBar();
 
     CSplitterWnd m_wndSplitter;
     CEditSearch m_wndSearch;
@@ -147,6 +164,7 @@ private:
     CTessel3Doc* m_pDoc = nullptr;       // of the creation context; outlives the frame
     CTessel3View* m_pGridView = nullptr; // the right pane
     CLeftView* m_pFolderPane = nullptr;  // the left pane
+    std::string m_strIdleMessage;        // the status bar's resting text; empty: the framework's
 };
 
 // The one command of the folder tree's right-click menu.
@@ -170,3 +188,5 @@ std::string ExplorerTitle(const std::string& windowText);
 std::string HelpFilePath();
 // The layer label of a folder: " Layer name: " and the folder's datains.ini layer, or "Current".
 std::string LayerLabelText(const std::string& folder);
+// The status bar's count of the drawings a folder holds: "No drawings", "1 drawing", "12 drawings".
+std::string DrawingCountText(int count);

@@ -59,7 +59,8 @@ public:
     void SetMessageText(const std::string& text);
     // The prompt of a command: its string resource up to the first "\n".
     virtual std::string GetMessageString(UINT id) const;
-    std::string GetIdleMessage() const;
+    // The status bar's resting text ("Ready" unless a frame has something of its own to say there).
+    virtual std::string GetIdleMessage() const;
 
     bool PreTranslateMessage(MSG* pMsg) override;
     bool OnCmdMsg(UINT id, int code) override;

@@ -66,3 +66,4 @@
 #define ID_THUMB_PROPERTY 32803
 #define ID_SEARCH_LABEL 32804  // toolbar placeholder that becomes the "Search:" label
 #define ID_LAYER_LABEL 32805   // toolbar placeholder that becomes the layer label
+#define ID_VIEW_REFRESH 32806  // F5: read the folder shown again

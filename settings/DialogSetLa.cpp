@@ -27,6 +27,18 @@ std::string RemovalFailureReason(const char* file, DWORD error) {
 
 } // namespace
 
+std::string FolderCaptionName(const std::string& folder) {
+    // The folder's own name, as the tree shows it: a whole path would not fit the caption and would cut
+    // off just that name. A drive's root has no name of its own: the path it is.
+    std::string path = folder;
+    while (path.size() > 1 && (path.back() == '\\' || path.back() == '/'))
+        path.pop_back();
+    const auto separator = path.find_last_of("\\/");
+    if (separator == std::string::npos || separator + 1 >= path.size() || path.back() == ':')
+        return folder;
+    return path.substr(separator + 1);
+}
+
 CDialogSetLa::CDialogSetLa(CWnd* parent) : CDialog(IDD_SETLA, parent) {}
 
 void CDialogSetLa::TellNotSaved() {
@@ -43,6 +55,8 @@ bool CDialogSetLa::SetFolder(const std::string& folder) {
 
 bool CDialogSetLa::OnInitDialog() {
     CDialog::OnInitDialog();
+    // The settings are the folder's own: the caption says which folder they belong to.
+    SetWindowText("Folder settings - " + FolderCaptionName(m_szPath));
     m_LispCommand.SubclassDlgItem(IDC_SETLA_COMMAND, this);
     m_StaticColor.SubclassDlgItem(IDC_SETLA_COLOR, this);
     m_LayerName.SubclassDlgItem(IDC_SETLA_LAYER, this);

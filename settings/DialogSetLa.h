@@ -52,3 +52,7 @@ private:
     CStaticColor m_StaticColor;
     CEdit m_LayerName;
 };
+
+// The name of a folder as the folder settings caption shows it: its last part ("C:\Drawings\Doors"
+// gives "Doors"), a drive's root as it is written.
+std::string FolderCaptionName(const std::string& folder);

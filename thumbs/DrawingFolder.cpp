@@ -83,6 +83,7 @@ bool DrawingFolder::Show(const std::string& folder) {
     }
     if (m_pDocument)
         m_pDocument->m_strPath = m_strFolder;
+    m_bRead = read;
     Fill(std::move(drawings));
     return read;
 }

@@ -66,6 +66,8 @@ public:
     const std::string& Folder() const { return m_strFolder; }
     // What the last Show has to tell the user (a refused path, files left out), or empty.
     const std::string& Problem() const { return m_strProblem; }
+    // Whether the last Show read its folder (false too while no folder has been shown).
+    bool IsRead() const { return m_bRead; }
 
     int Count() const;
     // The drawing at index (display order). Outside the list: the invalid-argument error.
@@ -119,6 +121,7 @@ private:
     CTessel3Doc* m_pDocument;
     std::string m_strFolder;
     std::string m_strProblem;
+    bool m_bRead = false;
     int m_nChosen = -1;
 };
 

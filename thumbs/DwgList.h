@@ -129,4 +129,7 @@ enum class PickedName {
 // Reads the folder's names as the file system holds them (wide) and looks for those the scan turns
 // into name. Costs one listing of the folder: for a pick, not for every file.
 PickedName CheckPickedName(const std::string& folder, const std::string& name);
+// What the status bar says of a folder the scan could not open: it is a file, it does not exist, access
+// is denied, or it cannot be reached (a drive not ready, a network share gone); error: the system's.
+std::string UnreadableFolderMessage(const std::string& folder, bool existsAsFile, unsigned long error);
 #endif

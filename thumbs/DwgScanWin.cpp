@@ -3,6 +3,7 @@
 #include "thumbs/DwgList.h"
 #include "thumbs/NameFold.h"
 
+#include <cerrno>
 #include <windows.h>
 
 #include <io.h>
@@ -79,6 +80,17 @@ private:
 
 } // namespace
 
+std::string UnreadableFolderMessage(const std::string& folder, bool existsAsFile, unsigned long error) {
+    const std::string start = "The folder cannot be read: " + folder;
+    if (existsAsFile)
+        return start + " is a file, not a folder";
+    if (error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND || error == ERROR_INVALID_NAME)
+        return start + " does not exist";
+    if (error == ERROR_ACCESS_DENIED)
+        return start + ": access is denied";
+    return start + " cannot be reached";
+}
+
 PickedName CheckPickedName(const std::string& folder, const std::string& name) {
     if (folder.empty() || name.empty())
         return PickedName::Missing;
@@ -124,8 +136,21 @@ bool FileSystemFolderReader::Read(const std::string& folder, std::vector<DwgData
     // The 64-bit size: a 32-bit one turns a file of 2 GiB and more into a negative or wrong size.
     struct __finddata64_t found;
     FindHandle search(_findfirst64(pattern.c_str(), &found));
-    if (search.get() == -1)
+    if (search.get() == -1) {
+        const int findError = errno;
+        const DWORD attributes = ::GetFileAttributesA(folder.c_str());
+        const DWORD error = ::GetLastError();
+        const bool isFolder =
+            attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY);
+        // A drive's root without a single entry lists nothing, not even "." and "..": read, and empty.
+        if (isFolder && findError == ENOENT)
+            return true;
+        if (isFolder)
+            problem = UnreadableFolderMessage(folder, false, findError == EACCES ? ERROR_ACCESS_DENIED : 0);
+        else
+            problem = UnreadableFolderMessage(folder, attributes != INVALID_FILE_ATTRIBUTES, error);
         return false;
+    }
     int tooLong = 0;
     do {
         DwgFindEntry entry = EntryOf(found);

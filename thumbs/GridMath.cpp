@@ -1,6 +1,7 @@
 #include "thumbs/GridMath.h"
 
 #include <algorithm>
+#include <climits>
 #include <cmath>
 #include <cstdlib>
 
@@ -180,16 +181,38 @@ bool GrowToLiveLimit(int& cellHeight, int& cellWidth, int labelHeight, int gap, 
 }
 
 RefitNumbers ComputeRefit(const Geometry& g, int clientRight, int clientBottom, int frameWidth,
-                          int frameHeight) {
+                          int frameHeight, int roomRight, int roomBottom) {
     RefitNumbers r;
     const int rowPitch = g.RowPitch();
     const int columnPitch = g.ColumnPitch();
-    r.remainder = rowPitch > 0 ? (clientBottom - g.originY) % rowPitch : 0;
-    r.columns = columnPitch > 0 ? std::max(1, (g.gap - g.originX + clientRight) / columnPitch) : 1;
+    const int height = clientBottom - g.originY;
+    r.remainder = rowPitch > 0 ? height % rowPitch : 0;
+    // To the nearest whole column: the frame grows when more than half a column is left over, and
+    // shrinks otherwise; it grows only as far as the room it has.
+    const long long width = static_cast<long long>(g.gap) - g.originX + clientRight;
+    int columns = 1;
+    if (columnPitch > 0) {
+        const long long nearest = std::max<long long>(1, (width + columnPitch / 2) / columnPitch);
+        const long long whole = std::max<long long>(1, width / columnPitch);
+        const long long grow = nearest * columnPitch - width;
+        columns =
+            static_cast<int>(std::min<long long>(grow <= roomRight ? nearest : whole, INT_MAX / columnPitch));
+    }
+    r.columns = columns;
     r.neededWidth = columnPitch * r.columns - g.gap + g.originX;
     r.frameWidth = frameWidth + (r.neededWidth - clientRight);
-    // A client too low for one whole row keeps its height.
-    r.frameHeight = r.remainder != clientBottom - g.originY ? frameHeight - r.remainder : frameHeight;
+    // Rows the same way; a client too low for one whole row grows to one when it has the room, or keeps
+    // its height.
+    r.frameHeight = frameHeight;
+    if (rowPitch > 0 && height >= 0) {
+        const long long nearest =
+            std::max<long long>(1, (static_cast<long long>(height) + rowPitch / 2) / rowPitch);
+        const long long whole = height / rowPitch;
+        const long long grow = nearest * rowPitch - height;
+        const long long rows = grow <= roomBottom ? nearest : whole;
+        if (rows > 0)
+            r.frameHeight = static_cast<int>(frameHeight + (rows * rowPitch - height));
+    }
     return r;
 }
 

@@ -3,6 +3,8 @@
 // <windows.h>. The grid view feeds it client sizes and scroll positions and acts on the answers.
 #pragma once
 
+#include <climits>
+
 namespace grid {
 
 // Scroll ranges are kept below this many pixels.
@@ -105,13 +107,14 @@ bool GrowToLiveLimit(int& cellHeight, int& cellWidth, int labelHeight, int gap, 
 // Numbers of a refit to the client rectangle.
 struct RefitNumbers {
     int remainder = 0;   // client height below the last whole row
-    int columns = 1;     // whole columns in the client width
+    int columns = 1;     // whole columns the refit client holds
     int neededWidth = 0; // client width that holds exactly those columns
     int frameWidth = 0;  // frame size that makes the client hold whole columns and rows
     int frameHeight = 0;
 };
+// roomRight, roomBottom: how far the frame may grow (to the edge of the screen's work area).
 RefitNumbers ComputeRefit(const Geometry& g, int clientRight, int clientBottom, int frameWidth,
-                          int frameHeight);
+                          int frameHeight, int roomRight = INT_MAX, int roomBottom = INT_MAX);
 
 // First row after a change of columns, keeping the first drawing shown in view.
 int RelayoutFirstRow(int oldColumns, int firstRow, int newColumns, int count);

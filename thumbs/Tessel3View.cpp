@@ -738,13 +738,31 @@ void CTessel3View::Refit(bool resizeFrame) {
     if (m_nRows <= 0)
         return;
     FlagGuard guard(m_bAligning);
-    const CRect client = GetClientRect();
-    // With a frame of no size the numbers are what the frame must grow by.
-    const grid::RefitNumbers n = grid::ComputeRefit(Geometry(), client.right, client.bottom, 0, 0);
-    m_nColumns = n.columns;
-    if (resizeFrame && onGrowFrame)
+    CRect client = GetClientRect();
+    if (resizeFrame && onGrowFrame) {
+        // With a frame of no size the numbers are what the frame must grow (or shrink) by.
+        const CSize room = FrameRoom();
+        const grid::RefitNumbers n =
+            grid::ComputeRefit(Geometry(), client.right, client.bottom, 0, 0, room.cx, room.cy);
         onGrowFrame(n.frameWidth, n.frameHeight);
+        client = GetClientRect();
+    }
+    // The columns the client holds now (no room to grow: whole columns only).
+    m_nColumns = grid::ComputeRefit(Geometry(), client.right, client.bottom, 0, 0, 0, 0).columns;
     Relayout();
+}
+
+CSize CTessel3View::FrameRoom() const {
+    // How far the window may grow to the right and down and stay inside its screen's work area.
+    HWND top = ::GetAncestor(m_hWnd, GA_ROOT);
+    CRect frame;
+    MONITORINFO monitor{};
+    monitor.cbSize = sizeof monitor;
+    if (!top || !::GetWindowRect(top, &frame) ||
+        !::GetMonitorInfoA(::MonitorFromWindow(top, MONITOR_DEFAULTTONEAREST), &monitor))
+        return CSize(0, 0);
+    return CSize(std::max(0L, monitor.rcWork.right - frame.right),
+                 std::max(0L, monitor.rcWork.bottom - frame.bottom));
 }
 
 void CTessel3View::Relayout() {
@@ -860,8 +878,16 @@ bool CTessel3View::OnScroll(UINT scrollCode, UINT pos, bool doScroll) {
 bool CTessel3View::HandleKey(UINT key) {
     switch (key) {
     case VK_TAB:
-        if (onFocusFolderTree)
-            onFocusFolderTree();
+        // Tab goes on to the accept and cancel buttons, Shift+Tab back to the tree.
+        if (::GetKeyState(VK_SHIFT) & 0x8000) {
+            if (onFocusFolderTree)
+                onFocusFolderTree();
+        } else if (onFocusPickButtons) {
+            onFocusPickButtons();
+        }
+        return true;
+    case VK_RETURN:
+        TakeChosen();
         return true;
     case VK_PRIOR:
         m_nFirstRow = grid::PageUpFirstRow(m_nFirstRow, m_nVisibleRows);
@@ -890,6 +916,12 @@ bool CTessel3View::HandleKey(UINT key) {
     default:
         return false;
     }
+}
+
+void CTessel3View::TakeChosen() {
+    // As the accept button does; with none chosen nothing happens.
+    if (m_pFolder && m_pFolder->Chosen() >= 0)
+        PostAppResult(kAppAccept);
 }
 
 bool CTessel3View::PreTranslateMessage(MSG* pMsg) {
@@ -921,6 +953,7 @@ bool CTessel3View::OnCmdMsg(UINT id, int code) {
         {ID_VIEW_DECREASE, [](CTessel3View& view) { view.Decrease(); }},
         {ID_VIEW_ALIGNE, [](CTessel3View& view) { view.Align(); }},
         {ID_SELECT_ALL, [](CTessel3View& view) { view.SelectAll(); }},
+        {ID_FILE_OPEN, [](CTessel3View& view) { view.TakeChosen(); }},
         {ID_EDIT_COPY, [](CTessel3View& view) { view.CopySelection(false); }},
         {ID_EDIT_CUT, [](CTessel3View& view) { view.CopySelection(true); }},
         {ID_EDIT_PASTE, [](CTessel3View& view) { view.PasteFiles(); }},

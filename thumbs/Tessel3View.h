@@ -85,7 +85,8 @@ public:
     std::function<void(int mode)> onSort;                 // a sort chosen in a thumbnail's menu
     std::function<void(const std::string&)> onStatusText; // the status bar's message (empty clears)
     std::function<void(const std::string&)> onTellUser;   // something the user must read
-    std::function<void()> onFocusFolderTree;              // Tab leaves the grid for the folder tree
+    std::function<void()> onFocusFolderTree;              // Shift+Tab leaves the grid for the folder tree
+    std::function<void()> onFocusPickButtons;             // Tab leaves the grid for accept and cancel
     // Align: the frame grows (or shrinks) by so many pixels, to hold whole columns and rows.
     std::function<void(int widthChange, int heightChange)> onGrowFrame;
 
@@ -113,6 +114,8 @@ public:
     void DeselectAll();
     // Marks every drawing selected, and every label shows it.
     void SelectAll();
+    // Enter and Ctrl+O: the chosen drawing is taken (the accept button's pick); nothing when none is.
+    void TakeChosen();
     void Increase();
     void Decrease();
     void Align();
@@ -215,6 +218,7 @@ private:
     void Layout();
     void Refit(bool resizeFrame);
     void Relayout();
+    CSize FrameRoom() const;
     void CreateRow(int row, int rowTop);
     // Binds or creates the windows of a row's cells (onlyMissing: only of cells whose control has none).
     void PlaceRow(int row, int rowTop, bool onlyMissing);

@@ -7,6 +7,7 @@
 #include "tree/ShellNamespace.h"
 
 #include <shellapi.h>
+#include <windowsx.h>
 
 #include <cstring>
 #include <memory>
@@ -372,6 +373,19 @@ LRESULT CShellTreeCtrl::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
         if (item && !m_bClosing)
             Expand(item, TVE_EXPAND);
         return 0;
+    }
+    case WM_LBUTTONDOWN: {
+        // A click on the folder already selected changes no selection: it reads that folder again, so a
+        // drawing another program added meanwhile shows.
+        UINT flags = 0;
+        HTREEITEM hit = HitTest(CPoint(GET_X_LPARAM(lParam), GET_Y_LPARAM(lParam)), &flags);
+        HTREEITEM selected = GetSelectedItem();
+        HWND self = m_hWnd;
+        const LRESULT result = CWaitingTreeCtrl::WindowProc(message, wParam, lParam);
+        if (hit && hit == selected && (flags & TVHT_ONITEM) && ::IsWindow(self) && !m_bClosing &&
+            m_bFollowSelection && GetSelectedItem() == hit)
+            ShowFolder(hit);
+        return result;
     }
     default:
         return CWaitingTreeCtrl::WindowProc(message, wParam, lParam);

@@ -60,16 +60,17 @@ got=$(texts | tr '\n' '|')
   fail "the search box's texts: $got"
 
 # 3. A rename given up: double-click a label, type, click another drawing, press Enter. The file keeps its
-#    name, the old name is shown again.
+#    name, the old name is shown again, and Enter takes the drawing clicked (it renames nothing).
 script_with_host_checks "wait $frame timeout=30000" 'double-click class=Edit text="door-1.dwg"' 'sleep 300' \
-  'type "yyy.dwg"' 'click class=Edit text="door-2.dwg" at=60,-60' 'sleep 300' 'key enter' 'sleep 800' \
+  'type "yyy.dwg"' 'click class=Edit text="door-2.dwg" at=60,-60' 'sleep 800' \
   'exists class=Edit text="door-1.dwg"' 'exists class=Edit text="yyy.dwg"' "$(shot rename-given-up.png)" \
-  'key escape'
+  'key enter' 'sleep 800'
 run
 expect_true "the file of a rename given up keeps its name" test -e "$folder/door-1.dwg"
 expect_true "no file takes the name typed" test ! -e "$folder/yyy.dwg"
 expect_line "the label shows the old name again" "[script] exists yes"
 expect_line "no label shows the name typed" "[script] exists no"
+expect_line "Enter then takes the drawing clicked" "=> (\"$(lisppath "$folder")\\\\door-2.dwg\" (\"\" \"\" \"\"))"
 
 # 4. A change of letter case alone renames the file.
 script_with_host_checks "wait $frame timeout=30000" 'double-click class=Edit text="arc.dwg"' 'sleep 300' \

@@ -14,7 +14,7 @@ for f in "$doors"/*; do mv "$f" "$doors/x.dwg"; done
 printf '[Mine]\r\nKeep=1\r\n\r\n' >"$doors/datains.ini"
 
 tree='class=SysTreeView32'
-dialog='class=#32770 text="Folder settings"'
+dialog='class=#32770 contains="Folder settings - "'
 colors='class=DevhostColorDialog'
 frame='contains="orvexsettings" nth=0' # the explorer's title shows the folder
 call=$(printf '(Orvex 1 2 "%s\\\\" "Insert" "Close")' "$(lisppath "$doors")")

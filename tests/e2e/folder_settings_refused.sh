@@ -18,7 +18,7 @@ cp "$doors/datains.ini" "$WORK/datains.saved"
 ini_win="$(winpath "$doors")\\datains.ini"
 
 tree='class=SysTreeView32'
-dialog='class=#32770 text="Folder settings"'
+dialog='class=#32770 contains="Folder settings - "'
 frame='contains="refusedsettings" nth=0'
 call=$(printf '(Orvex 1 2 "%s\\\\" "Insert" "Close")' "$(lisppath "$doors")")
 shot() { winpath "$WORK/$1"; }

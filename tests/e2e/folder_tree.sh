@@ -47,7 +47,7 @@ script 'wait contains="charlie-1.dwg" timeout=30000' "${look[@]}" "tree-items $t
        'key left' "${look[@]}" \
        'key right' "${look[@]}" \
        "tree-items $tree" \
-       'key tab' 'focus' 'key tab' 'focus' \
+       'key tab' 'focus' 'key shift+tab' 'focus' \
        'key escape'
 run "$(call_at "$root/a/b/c")"
 expect_line "Escape in the tree cancels" "=> nil"
@@ -60,7 +60,7 @@ expect_true "c is selected in the tree, opened from the start path" has "$OUT" '
 expect_true "only the selected item is highlighted after keys ($(stray_highlights | tr '\n' ' '))" [ -z "$(stray_highlights)" ]
 foci=$(printf '%s\n' "$OUT" | sed -n 's/^\[script\] focus //p' | tr '\n' '|')
 expect_true "Tab moves from the tree to the grid, the right pane (got $foci)" has "${foci%%|*}" ' id=59649$'
-expect_true "Tab in the grid moves back to the tree (got $foci)" [ "${foci#*|}" == "SysTreeView32 id=59648|" ]
+expect_true "Shift+Tab in the grid moves back to the tree (got $foci)" [ "${foci#*|}" == "SysTreeView32 id=59648|" ]
 expect_true "the settings keep the last folder (Path)" [ "$(ini_value Path)" == "$(winpath "$root/a/b")" ]
 shellpath=$(ini_value ShellPath)
 expect_true "the settings keep the tree's label path ($shellpath)" [ "${shellpath##*\\}" == "b" ]

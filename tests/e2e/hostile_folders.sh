@@ -32,11 +32,17 @@ expect_line "an empty folder: Close gives nil" "=> nil"
 # 2. A folder that cannot be read: an empty grid, no crash; Escape gives nil.
 # File modes do not bind root: there the folder is a link to itself, which no one can list either.
 if [ "$(id -u)" -eq 0 ]; then rm -rf "$base/locked"; ln -s locked "$base/locked"; else chmod 000 "$base/locked"; fi
-fresh_script 'wait contains="hostilefolders" nth=0 timeout=20000' 'sleep 1000' 'count class=Edit contains=".dwg"' \
-  "$(shot hostilefolders folders-unreadable)" 'key escape'
+# The status bar says so, and the title (the explorer's name) does not name it as open.
+fresh_script 'wait contains="Thumbnail Explorer" nth=0 timeout=20000' 'move contains="Thumbnail Explorer" nth=0' 'sleep 1000' \
+  'count class=Edit contains=".dwg"' \
+  'text class=msctls_statusbar32' 'text contains="Thumbnail Explorer" nth=0' \
+  "screenshot contains=\"Thumbnail Explorer\" nth=0 $(winpath "$WORK/folders-unreadable.png")" 'key escape'
 checked_devhost --script "$(winpath "$WORK/script.txt")" --eval "$(call_on "$(lisppath "$base/locked")\\\\")"
 [ -L "$base/locked" ] || chmod 755 "$base/locked"
 expect_line "an unreadable folder shows no cell" "[script] count 0"
+expect_true "an unreadable folder is said in the status bar" \
+  grep -q '^\[script\] text The folder cannot be read: .*locked' <(printf '%s\n' "$OUT")
+expect_line "the title does not name the unreadable folder" "[script] text Kelmar Dwg Thumbnail Explorer"
 expect_line "an unreadable folder: Escape gives nil" "=> nil"
 
 # 3. A folder deleted while the grid shows it: repaints and new cell sizes go on, a pick is refused with a

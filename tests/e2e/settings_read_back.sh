@@ -46,7 +46,7 @@ if tr -d '\r' <"$ini" | grep -q '^Path=.*doors$'; then pass "the folder is kept"
 label=$(ini_value ShellPath)
 expect_true "the tree's label path of the folder is known ($label)" [ "${label##*\\}" == "doors" ]
 tree='class=SysTreeView32'
-dialog='class=#32770 text="Folder settings"'
+dialog='class=#32770 contains="Folder settings - "'
 long=$(printf '(princ "%s")' "$(printf 'c%.0s' $(seq 1 2040))")   # 2,051 characters
 script 'wait contains="x.dwg" timeout=30000' \
        "tree-right-click $tree path=\"$label\"" \

@@ -21,6 +21,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <fstream>
 #include <functional>
@@ -891,4 +892,130 @@ TEST_F(ExplorerFrame, CancelButtonOfTheBottomToolbarCancelsByMouse) {
         bar.PostMessage(WM_LBUTTONUP, 0, MAKELPARAM(at.x, at.y));
     });
     EXPECT_EQ(Run(dialog), 2);
+}
+
+// Every key of the accelerator table does something: its command reaches a handler of the frame or of
+// the grid (a command no one takes is a key that does nothing).
+TEST_F(ExplorerFrame, EveryAcceleratorReachesAHandler) {
+    const auto files = {"one.dwg", "two.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-accel", files);
+    g_call.startPath = folder + "\\";
+    HACCEL table = ::LoadAcceleratorsA(AfxGetResourceHandle(), MAKEINTRESOURCEA(IDR_MAINFRAME));
+    ASSERT_NE(table, nullptr);
+    ACCEL entries[64];
+    const int count = ::CopyAcceleratorTableA(table, entries, 64);
+    ::DestroyAcceleratorTable(table);
+    ASSERT_GT(count, 0);
+    // Paste first, with nothing on the clipboard, and select all last: nothing is copied into the folder.
+    std::vector<UINT> commands;
+    for (int i = 0; i < count; ++i)
+        commands.push_back(entries[i].cmd);
+    std::stable_sort(commands.begin(), commands.end(), [](UINT a, UINT b) {
+        const auto rank = [](UINT id) { return id == ID_EDIT_PASTE ? 0 : id == ID_SELECT_ALL ? 2 : 1; };
+        return rank(a) < rank(b);
+    });
+    if (::OpenClipboard(nullptr)) {
+        ::EmptyClipboard();
+        ::CloseClipboard();
+    }
+    std::vector<UINT> unhandled;
+    RunDialog dialog;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        for (UINT id : commands)
+            if (!static_cast<CWnd&>(frame).OnCmdMsg(id, 0))
+                unhandled.push_back(id);
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(unhandled, std::vector<UINT>{}) << "commands of the accelerator table that nothing handles";
+    RemoveFolder(folder, files);
+}
+
+// F6 and Shift+F6 take the keyboard from the tree to the grid and back.
+TEST_F(ExplorerFrame, NextAndPreviousPaneMoveTheFocusBetweenTreeAndGrid) {
+    RunDialog dialog;
+    std::vector<HWND> foci;
+    HWND tree = nullptr, grid = nullptr;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        ASSERT_NE(frame.GetFolderTree(), nullptr);
+        ASSERT_NE(frame.GetGridView(), nullptr);
+        tree = frame.GetFolderTree()->m_hWnd;
+        grid = frame.GetGridView()->m_hWnd;
+        ::SetFocus(tree);
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_NEXT_PANE, 1), 0);
+        foci.push_back(::GetFocus());
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_PREV_PANE, 1), 0);
+        foci.push_back(::GetFocus());
+        frame.SendMessage(WM_COMMAND, MAKEWPARAM(ID_PREV_PANE, 1), 0);
+        foci.push_back(::GetFocus());
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(foci, (std::vector<HWND>{grid, tree, grid}));
+}
+
+// A first run: no settings, no start folder. The layer label already says where a pick goes.
+TEST_F(ExplorerFrame, FirstRunLayerLabelSaysCurrent) {
+    RunDialog dialog;
+    std::string label;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        label = frame.GetLayerLabel().GetWindowText();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(label, " Layer name: Current");
+}
+
+// The status bar says how many drawings the folder holds, and comes back to it after a prompt.
+TEST_F(ExplorerFrame, StatusBarCountsTheDrawingsOfTheFolder) {
+    const auto files = {"a.dwg", "b.dwg", "c.dwg"};
+    const std::string folder = FolderWithDrawings("orvex-frame-count", files);
+    g_call.startPath = folder + "\\";
+    RunDialog dialog;
+    std::string shown, idle;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        shown = frame.GetStatusBar().GetPaneText(0);
+        idle = frame.GetIdleMessage();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(shown, "3 drawings");
+    EXPECT_EQ(idle, "3 drawings");
+    EXPECT_EQ(DrawingCountText(0), "No drawings");
+    EXPECT_EQ(DrawingCountText(1), "1 drawing");
+    EXPECT_EQ(DrawingCountText(12345), "12345 drawings");
+    RemoveFolder(folder, files);
+}
+
+// A start folder that is not there: the status bar says so, and the title does not name it as open.
+TEST_F(ExplorerFrame, AStartFolderThatDoesNotExistIsSaidAndNotShownAsOpen) {
+    const std::string folder = TempFolder("orvex-frame-gone") + "\\not-there";
+    g_call.startPath = folder + "\\";
+    RunDialog dialog;
+    std::string status, title, idle;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        status = frame.GetStatusBar().GetPaneText(0);
+        title = frame.GetWindowText();
+        idle = frame.GetIdleMessage();
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    EXPECT_EQ(status, "The folder cannot be read: " + folder + " does not exist");
+    EXPECT_EQ(idle, status) << "the status bar comes back to it";
+    EXPECT_EQ(title.find("not-there"), std::string::npos) << title;
+}
+
+TEST_F(ExplorerFrame, AStartFolderThatIsAFileIsSaid) {
+    const std::string file = TempFolder("orvex-frame-file") + "\\plain";
+    std::ofstream(file, std::ios::binary) << "x";
+    g_call.startPath = file + "\\";
+    RunDialog dialog;
+    std::string status;
+    dialog.steps.push_back([&](CMainFrame& frame) {
+        status = frame.GetStatusBar().GetPaneText(0);
+        frame.PostMessage(WM_CLOSE);
+    });
+    EXPECT_EQ(Run(dialog), 2);
+    std::remove(file.c_str());
+    EXPECT_EQ(status, "The folder cannot be read: " + file + " is a file, not a folder");
 }

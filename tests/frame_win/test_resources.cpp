@@ -41,13 +41,15 @@ TEST(Resources, AcceleratorsAsListed) {
     std::set<std::tuple<int, int, int>> got;
     for (int i = 0; i < count; ++i)
         got.insert({entries[i].fVirt & ~FNOINVERT, entries[i].key, entries[i].cmd});
-    const int ctrl = FVIRTKEY | FCONTROL, shift = FVIRTKEY | FSHIFT, alt = FVIRTKEY | FALT, none = FVIRTKEY;
+    const int ctrl = FVIRTKEY | FCONTROL, shift = FVIRTKEY | FSHIFT, none = FVIRTKEY;
+    // Only keys that do something here: no new, save, print or undo in a picker (an edit box undoes its
+    // own typing with Ctrl+Z and Alt+Backspace).
     const std::set<std::tuple<int, int, int>> expected = {
-        {ctrl, 'A', 32793},       {ctrl, 'C', 57634},        {ctrl, 'N', 57600},   {ctrl, 'O', 57601},
-        {ctrl, 'P', 57607},       {ctrl, 'S', 57603},        {ctrl, 'V', 57637},   {alt, VK_BACK, 57643},
-        {none, VK_DELETE, 32794}, {shift, VK_DELETE, 57635}, {none, VK_F6, 57680}, {shift, VK_F6, 57681},
-        {ctrl, VK_INSERT, 57634}, {shift, VK_INSERT, 57637}, {ctrl, 'X', 57635},   {ctrl, 'Z', 57643}};
-    EXPECT_EQ(count, 16);
+        {ctrl, 'A', 32793},        {ctrl, 'C', 57634},       {ctrl, 'O', 57601},
+        {ctrl, 'V', 57637},        {none, VK_DELETE, 32794}, {shift, VK_DELETE, 57635},
+        {none, VK_F6, 57680},      {shift, VK_F6, 57681},    {ctrl, VK_INSERT, 57634},
+        {shift, VK_INSERT, 57637}, {ctrl, 'X', 57635},       {none, VK_F5, ID_VIEW_REFRESH}};
+    EXPECT_EQ(count, 12);
     EXPECT_EQ(got, expected);
     ::DestroyAcceleratorTable(table);
 }

@@ -176,7 +176,9 @@ TEST_F(FolderSettingsDialog, TheTemplateAsDesigned) {
         EXPECT_EQ(got, swatchRect);
         d.Press(IDCANCEL);
     });
-    EXPECT_EQ(caption, "Folder settings");
+    EXPECT_EQ(caption, "Folder settings - " + FolderCaptionName(m_folder.Dir()))
+        << "the caption names the folder it edits";
+    EXPECT_NE(FolderCaptionName(m_folder.Dir()), "");
     EXPECT_EQ(boxText, "&Use current layer");
     EXPECT_EQ(accept, "&Accept");
     EXPECT_EQ(cancel, "&Cancel");
@@ -702,4 +704,12 @@ TEST(StaticColorLayers, TakesTheColourOfALayerOfTheDrawingOrStaysAsItWas) {
     EXPECT_EQ(swatch.GetColorIndex(), 12);
     EXPECT_EQ(swatch.GetFillColor(), FakeRgb(12));
     SetHostApi(HostApi{});
+}
+
+TEST(FolderSettingsCaption, NamesTheFolderByItsLastPart) {
+    EXPECT_EQ(FolderCaptionName("C:\\Drawings\\Doors"), "Doors");
+    EXPECT_EQ(FolderCaptionName("C:\\Drawings\\Doors\\"), "Doors");
+    EXPECT_EQ(FolderCaptionName("C:\\"), "C:\\");
+    EXPECT_EQ(FolderCaptionName("C:"), "C:");
+    EXPECT_EQ(FolderCaptionName("\\\\server\\share\\plans"), "plans");
 }

@@ -250,22 +250,43 @@ TEST(GridMath, AClientBeyondTheLargestScreenGrowsTheCells) {
     EXPECT_LE(LiveThumbnailsFor(g, 32767, 32767), kMaxLiveThumbnails);
 }
 
-TEST(GridMath, RefitToWholeColumnsAndRows) {
-    const Geometry g = DefaultGeometry(); // row pitch 163
-    const RefitNumbers r = ComputeRefit(g, 700, 500, 1000, 800);
-    EXPECT_EQ(r.columns, 3);
-    EXPECT_EQ(r.neededWidth, 3 * 178 - 5);
+TEST(GridMath, RefitToTheNearestWholeColumnsAndRows) {
+    const Geometry g = DefaultGeometry(); // row pitch 163, column pitch 178
+    // 700 + 5 is 3.96 columns: the frame grows to 4; 500 is 3.07 rows: it shrinks to 3.
+    RefitNumbers r = ComputeRefit(g, 700, 500, 1000, 800);
+    EXPECT_EQ(r.columns, 4);
+    EXPECT_EQ(r.neededWidth, 4 * 178 - 5);
     EXPECT_EQ(r.remainder, 500 % 163);
-    EXPECT_EQ(r.frameWidth, 1000 + (529 - 700));
+    EXPECT_EQ(r.frameWidth, 1000 + (707 - 700));
     EXPECT_EQ(r.frameHeight, 800 - 11);
+    // 600 + 5 is 3.4 columns: it shrinks to 3; 470 is 2.88 rows: it grows to 3.
+    r = ComputeRefit(g, 600, 470, 1000, 800);
+    EXPECT_EQ(r.columns, 3);
+    EXPECT_EQ(r.frameWidth, 1000 + (529 - 600));
+    EXPECT_EQ(r.frameHeight, 800 + (489 - 470));
 }
 
-TEST(GridMath, RefitKeepsHeightWhenNoWholeRowFits) {
-    const RefitNumbers r = ComputeRefit(DefaultGeometry(), 100, 100, 400, 300);
+TEST(GridMath, RefitGrowsOnlyAsFarAsTheRoomAllows) {
+    const Geometry g = DefaultGeometry();
+    const RefitNumbers r = ComputeRefit(g, 700, 470, 1000, 800, 6, 18);
+    EXPECT_EQ(r.columns, 3) << "7 pixels more do not fit: whole columns";
+    EXPECT_EQ(r.frameWidth, 1000 + (529 - 700));
+    EXPECT_EQ(r.frameHeight, 800 - 144) << "19 pixels more do not fit: whole rows";
+    const RefitNumbers roomy = ComputeRefit(g, 700, 470, 1000, 800, 7, 19);
+    EXPECT_EQ(roomy.columns, 4);
+    EXPECT_EQ(roomy.frameHeight, 800 + 19);
+}
+
+TEST(GridMath, RefitOfAClientTooLowForOneRow) {
+    // It grows to one whole row when it has the room, else keeps its height.
+    RefitNumbers r = ComputeRefit(DefaultGeometry(), 100, 100, 400, 300);
     EXPECT_EQ(r.columns, 1);
     EXPECT_EQ(r.remainder, 100);
-    EXPECT_EQ(r.frameHeight, 300);
+    EXPECT_EQ(r.frameHeight, 300 + 63);
     EXPECT_EQ(r.frameWidth, 400 + 173 - 100);
+    r = ComputeRefit(DefaultGeometry(), 100, 100, 400, 300, 0, 0);
+    EXPECT_EQ(r.columns, 1);
+    EXPECT_EQ(r.frameHeight, 300);
 }
 
 TEST(GridMath, RelayoutKeepsFirstDrawingInView) {

@@ -50,6 +50,7 @@ void RecordFrameRequests(CTessel3View& view) {
     view.onStatusText = [](const std::string& text) { Frame().status = text; };
     view.onTellUser = [](const std::string& text) { Frame().toldUser.push_back(text); };
     view.onFocusFolderTree = [] { ++Frame().treeFocusRequests; };
+    view.onFocusPickButtons = [] { ++Frame().pickFocusRequests; };
 }
 
 } // namespace

@@ -23,6 +23,7 @@ struct FrameRecord {
     std::string status;                // the status bar's message
     std::vector<std::string> toldUser; // message boxes the user would have seen
     int treeFocusRequests = 0;
+    int pickFocusRequests = 0;
     std::vector<int> sortRequests; // sorts chosen in a thumbnail's menu
     HWND frame = nullptr;
 };

@@ -497,6 +497,32 @@ TEST(GridSize, NoWindowSizeHoldsMoreThanTheLiveLimit) {
                 view.GetPictureWidth(), view.GetPictureHeight());
 }
 
+// Align goes to the nearest whole columns and rows: a client short of a column by less than half of one
+// grows to hold it.
+TEST(GridSize, AlignGrowsTheFrameWhenMoreThanHalfAColumnAndRowIsLeftOver) {
+    GridBench bench(700, 600);
+    FillList(200);
+    CTessel3View& view = bench.view();
+    view.Rebuild();
+    Pump();
+    const int pitch = 173 + 5;
+    const int rowPitch = RowPitch(view);
+    // Short of 4 columns by 20 pixels, of 4 rows by 20 pixels.
+    CRect frame;
+    ::GetWindowRect(Frame().frame, &frame);
+    const CRect before = view.GetClientRect();
+    ::MoveWindow(Frame().frame, 0, 0, frame.Width() + (4 * pitch - 5 - 20) - before.right,
+                 frame.Height() + (4 * rowPitch - 20) - before.bottom, TRUE);
+    Pump();
+    ASSERT_EQ(view.GetClientRect().right, 4 * pitch - 5 - 20);
+    view.SendMessage(WM_COMMAND, ID_VIEW_ALIGNE);
+    Pump();
+    const CRect client = view.GetClientRect();
+    EXPECT_EQ(client.right, 4 * pitch - 5) << "grown to 4 whole columns";
+    EXPECT_EQ(client.bottom, 4 * rowPitch) << "grown to 4 whole rows";
+    EXPECT_EQ(view.GetColumns(), 4);
+}
+
 TEST(GridSize, AlignFitsTheFrameToWholeColumnsAndRows) {
     GridBench bench(731, 611);
     FillList(200);
@@ -512,19 +538,37 @@ TEST(GridSize, AlignFitsTheFrameToWholeColumnsAndRows) {
     EXPECT_EQ(view.GetColumns(), (client.right + 5) / pitch);
 }
 
-TEST(GridKeys, EscapeCancelsTabGoesToTheTree) {
+TEST(GridKeys, EscapeCancelsTabGoesToTheAcceptAndCancelButtons) {
     GridBench bench(700, 600);
     FillList(20);
     bench.view().Rebuild();
     Pump();
     bench.view().SetFocus();
     PressKey(VK_TAB);
-    EXPECT_EQ(Frame().treeFocusRequests, 1);
+    EXPECT_EQ(Frame().pickFocusRequests, 1);
+    EXPECT_EQ(Frame().treeFocusRequests, 0);
     bench.view().SetFocus();
     PressKey(VK_ESCAPE);
     Pump();
     ASSERT_EQ(Main().results.size(), 1u);
     EXPECT_EQ(Main().results[0], 2u);
+}
+
+TEST(GridKeys, EnterTakesTheChosenDrawingOnly) {
+    GridBench bench(700, 600);
+    FillList(20);
+    bench.view().Rebuild();
+    Pump();
+    bench.view().SetFocus();
+    PressKey(VK_RETURN);
+    Pump();
+    EXPECT_TRUE(Main().results.empty()) << "nothing chosen: Enter takes nothing";
+    Drawings().Choose(3);
+    bench.view().SetFocus();
+    PressKey(VK_RETURN);
+    Pump();
+    ASSERT_EQ(Main().results.size(), 1u);
+    EXPECT_EQ(Main().results[0], 1u);
 }
 
 TEST(GridKeys, KeysOnAThumbnailReachTheGrid) {
