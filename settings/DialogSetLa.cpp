@@ -1,6 +1,7 @@
 #include "settings/DialogSetLa.h"
 
 #include "hostapi/HostApi.h"
+#include "hostapi/NarrowText.h"
 #include "hostapi/TextConv.h"
 #include "settings/SettingsReport.h"
 #include "res/resource.h"
@@ -31,9 +32,9 @@ std::string FolderCaptionName(const std::string& folder) {
     // The folder's own name, as the tree shows it: a whole path would not fit the caption and would cut
     // off just that name. A drive's root has no name of its own: the path it is.
     std::string path = folder;
-    while (path.size() > 1 && (path.back() == '\\' || path.back() == '/'))
-        path.pop_back();
-    const auto separator = path.find_last_of("\\/");
+    while (path.size() > 1 && EndsWithSeparator(path))
+        path.pop_back(); // a separator is one byte
+    const auto separator = LastSeparator(path);
     if (separator == std::string::npos || separator + 1 >= path.size() || path.back() == ':')
         return folder;
     return path.substr(separator + 1);
