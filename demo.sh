@@ -117,7 +117,7 @@ echo "Screenshots in $PWD/$shots/: explorer-tree.png, explorer.png, explorer-too
 # and shown, then cancelled, so the sample folder keeps what it had. The tree opens on the root again,
 # the folder the first call picked in among its children.
 label=$(tr -d '\r' <"$settings" | sed -n 's/^ShellPath=//p')
-dialog='class=#32770 text="Folder settings"'
+dialog='class=#32770 contains="Folder settings"'
 if [ -n "$label" ] && [ ! -e "$samples/datains.ini" ]; then
   cat >"$script" <<SCRIPT
 wait $root_frame timeout=30000

@@ -96,7 +96,7 @@ expect_line "936: the pick returns the drawing of 運 with 運's settings" \
 # in the code page (not 運datains.ini beside it), the toolbar and the pick follow.
 shell936=$(ini_value ShellPath | iconv -f CP936 -t UTF-8)
 expect_true "936: the tree's label path ends in 運 (got $shell936)" [ "${shell936##*\\}" == "運" ]
-dialog='class=#32770 text="Folder settings"'
+dialog='class=#32770 contains="Folder settings"'
 erase7=('key backspace' 'key backspace' 'key backspace' 'key backspace' 'key backspace' 'key backspace' 'key backspace')
 script 'wait contains=".dwg" timeout=30000' "tree-right-click $tree path=\"$shell936\"" 'wait class=#32768 timeout=5000' \
        'click class=#32768 at=30,10' "wait $dialog timeout=5000" "text $dialog > id=1017" \
