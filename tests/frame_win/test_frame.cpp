@@ -165,6 +165,18 @@ protected:
         EXPECT_EQ(g_app.ExplorerFrame(), nullptr) << "the frame goes with the dialog";
         return result;
     }
+
+    // Opens the explorer, reads one text of it, closes it (the run ends cancelled) and gives the text.
+    std::string TextWhileOpen(const std::function<std::string(CMainFrame&)>& read) {
+        RunDialog dialog;
+        std::string text;
+        dialog.steps.push_back([&](CMainFrame& frame) {
+            text = read(frame);
+            frame.PostMessage(WM_CLOSE);
+        });
+        EXPECT_EQ(Run(dialog), 2);
+        return text;
+    }
 };
 
 } // namespace
@@ -452,14 +464,8 @@ TEST_F(ExplorerFrame, LayerLabelShowsTheStartFolderLayer) {
     std::ofstream(folder + "\\datains.ini", std::ios::binary)
         << "[Default Parameters]\r\nLayer=Walls\r\nColor=3\r\nLisp command=\r\n";
     g_call.startPath = folder + "\\plan.dwg";
-    RunDialog dialog;
-    std::string label;
-    dialog.steps.push_back([&](CMainFrame& frame) {
-        label = frame.GetLayerLabel().GetWindowText();
-        frame.PostMessage(WM_CLOSE);
-    });
-    EXPECT_EQ(Run(dialog), 2);
-    EXPECT_EQ(label, " Layer name: Walls");
+    EXPECT_EQ(TextWhileOpen([](CMainFrame& frame) { return frame.GetLayerLabel().GetWindowText(); }),
+              " Layer name: Walls");
     ASSERT_NE(g_pTessel3Doc, nullptr);
     EXPECT_EQ(g_pTessel3Doc->m_strPath, folder);
     std::remove((folder + "\\datains.ini").c_str());
@@ -469,14 +475,8 @@ TEST_F(ExplorerFrame, LayerLabelShowsTheStartFolderLayer) {
 TEST_F(ExplorerFrame, LayerLabelSaysCurrentWithoutDatainsIni) {
     const std::string folder = TempFolder("orvex-frame-nolayer");
     WriteSettings("[CurrentPath]\r\nPath=" + folder + "\r\n");
-    RunDialog dialog;
-    std::string label;
-    dialog.steps.push_back([&](CMainFrame& frame) {
-        label = frame.GetLayerLabel().GetWindowText();
-        frame.PostMessage(WM_CLOSE);
-    });
-    EXPECT_EQ(Run(dialog), 2);
-    EXPECT_EQ(label, " Layer name: Current");
+    EXPECT_EQ(TextWhileOpen([](CMainFrame& frame) { return frame.GetLayerLabel().GetWindowText(); }),
+              " Layer name: Current");
     ::RemoveDirectoryA(folder.c_str());
 }
 
@@ -505,28 +505,15 @@ TEST_F(ExplorerFrame, AcceptNeedsAChosenDrawing) {
 TEST_F(ExplorerFrame, SavedDrawingNameStartsTheSearch) {
     // In the folder it was chosen in, which the explorer opens on.
     WriteSettings("[CurrentPath]\r\nPath=" + TempFolder("orvex-frame-saved") + "\r\nName=plan-b.dwg\r\n");
-    RunDialog dialog;
-    std::string text;
-    dialog.steps.push_back([&](CMainFrame& frame) {
-        text = frame.GetSearchEdit().GetWindowText();
-        frame.PostMessage(WM_CLOSE);
-    });
-    EXPECT_EQ(Run(dialog), 2);
-    EXPECT_EQ(text, "plan-b");
+    EXPECT_EQ(TextWhileOpen([](CMainFrame& frame) { return frame.GetSearchEdit().GetWindowText(); }),
+              "plan-b");
 }
 
 TEST_F(ExplorerFrame, SavedDrawingNameOfAnyLengthStartsTheSearch) {
     const std::string stem(1500, 'p'); // far beyond a file-name buffer, within an ini line
     WriteSettings("[CurrentPath]\r\nPath=" + TempFolder("orvex-frame-saved-long") + "\r\nName=C:\\x\\" +
                   stem + ".dwg\r\n");
-    RunDialog dialog;
-    std::string text;
-    dialog.steps.push_back([&](CMainFrame& frame) {
-        text = frame.GetSearchEdit().GetWindowText();
-        frame.PostMessage(WM_CLOSE);
-    });
-    EXPECT_EQ(Run(dialog), 2);
-    EXPECT_EQ(text, stem);
+    EXPECT_EQ(TextWhileOpen([](CMainFrame& frame) { return frame.GetSearchEdit().GetWindowText(); }), stem);
 }
 
 TEST_F(ExplorerFrame, TheDrawingOfTheLastRunIsChosenOnlyInItsOwnFolder) {
@@ -956,14 +943,8 @@ TEST_F(ExplorerFrame, NextAndPreviousPaneMoveTheFocusBetweenTreeAndGrid) {
 
 // A first run: no settings, no start folder. The layer label already says where a pick goes.
 TEST_F(ExplorerFrame, FirstRunLayerLabelSaysCurrent) {
-    RunDialog dialog;
-    std::string label;
-    dialog.steps.push_back([&](CMainFrame& frame) {
-        label = frame.GetLayerLabel().GetWindowText();
-        frame.PostMessage(WM_CLOSE);
-    });
-    EXPECT_EQ(Run(dialog), 2);
-    EXPECT_EQ(label, " Layer name: Current");
+    EXPECT_EQ(TextWhileOpen([](CMainFrame& frame) { return frame.GetLayerLabel().GetWindowText(); }),
+              " Layer name: Current");
 }
 
 // The status bar says how many drawings the folder holds, and comes back to it after a prompt.
