@@ -10,7 +10,7 @@ const wchar_t* const kUsage =
     L"                   [--load FILE]... [--eval EXPR]... [--script FILE] [--verbose] [--timing] "
     L"[--timing-sent]\n"
     L"                   [--preview real|flat] [--file-latency MS] [--file-hang NAME]\n"
-    L"                   [--check-heaps] [--refuse-window CLASS-PREFIX]\n";
+    L"                   [--check-heaps] [--resources] [--refuse-window CLASS-PREFIX]\n";
 
 namespace {
 
@@ -152,6 +152,8 @@ bool ParseOptions(const std::vector<std::wstring>& args, Options& options, std::
             }
         } else if (option == L"--check-heaps") {
             options.checkHeaps = true;
+        } else if (option == L"--resources") {
+            options.resources = true;
         } else if (option == L"--refuse-window") {
             if (!value(options.refuseWindow))
                 return false;

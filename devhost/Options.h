@@ -31,8 +31,9 @@ struct Options {
     enum class Preview { Real, Flat };
     Preview preview = Preview::Real; // flat: the preview operation fills the window, reads no file
     bool checkHeaps = false;         // validate every heap of the process after each call
-    int fileLatencyMs = 0;           // added to every read of a drawing file, on the thread that reads
-    std::wstring fileHang;           // reads of the drawing file of this name wait until the process ends
+    bool resources = false;    // print the process's GDI objects, windows, handles, threads after each call
+    int fileLatencyMs = 0;     // added to every read of a drawing file, on the thread that reads
+    std::wstring fileHang;     // reads of the drawing file of this name wait until the process ends
     std::wstring refuseWindow; // top-level windows whose class begins with this are refused (a test aid)
     bool help = false;
 };

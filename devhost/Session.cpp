@@ -5,6 +5,7 @@
 #include "devhost/HostWindows.h"
 #include "devhost/Lisp.h"
 #include "devhost/Output.h"
+#include "devhost/Resources.h"
 #include "devhost/ResultBuffers.h"
 #include "devhost/Script.h"
 #include "devhost/ScriptRunner.h"
@@ -135,6 +136,7 @@ private:
     OdRxModule* m_module = nullptr;
     std::unique_ptr<ScriptRunner> m_script;
     int m_exitCode = kExitOk;
+    bool m_resourcesCounted = false; // --resources: the counts before the first call are printed
 };
 
 // The bytes of a file of the user's (a script, a LISP program), up to 16 MiB; false with the system's
@@ -404,12 +406,18 @@ void Session::Evaluate(const std::wstring& expression) {
         timer = SetTimer(nullptr, 0, static_cast<UINT>(m_options.afterMs), &PostTimer);
     }
     if (!nested) {
+        if (m_options.resources && !m_resourcesCounted) {
+            WriteLine(ResourcesLine(CountProcessResources(), L"before the first call"));
+            m_resourcesCounted = true;
+        }
         StartScript();
         TimingCallBegins();
         m_entryPoint(AcRx::kInvkSubrMsg, host.appId);
         TimingCallEnded();
         if (m_options.checkHeaps)
             CheckHeaps();
+        if (m_options.resources)
+            WriteLine(ResourcesLine(CountProcessResources(), L"after the call"));
     }
 
     if (timer)
