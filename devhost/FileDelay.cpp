@@ -35,6 +35,7 @@ Originals g_system;
 // The drawing files open now: the key is the FILE* or the HANDLE, the value whether reads of it hang.
 SRWLOCK g_lock = SRWLOCK_INIT;
 std::map<const void*, bool> g_open;
+volatile LONG g_drawingsOpened = 0;
 
 bool EndsWithDwg(const std::wstring& name) {
     return name.size() >= 4 &&
@@ -61,6 +62,7 @@ std::wstring WidenAnsiPath(const char* name) {
 void Opened(const void* key, const std::wstring& path) {
     if (!key || !EndsWithDwg(path))
         return;
+    InterlockedIncrement(&g_drawingsOpened);
     const std::wstring& hang = Host().options.fileHang;
     const std::wstring name = LastComponent(path);
     const bool hangs =
@@ -156,9 +158,13 @@ void FindSystemFunctions() {
 
 } // namespace
 
+long DrawingFilesOpened() {
+    return InterlockedCompareExchange(&g_drawingsOpened, 0, 0);
+}
+
 void FileDelayWatch(HMODULE module) {
     const Options& options = Host().options;
-    if (!module || (options.fileLatencyMs <= 0 && options.fileHang.empty()))
+    if (!module || (options.fileLatencyMs <= 0 && options.fileHang.empty() && !options.timing))
         return;
     FindSystemFunctions();
     if (!g_system.fread || !g_system.wfopen || !g_system.fopen || !g_system.fclose || !g_system.readFile ||

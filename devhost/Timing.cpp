@@ -1,5 +1,6 @@
 #include "devhost/Timing.h"
 
+#include "devhost/FileDelay.h"
 #include "devhost/HostObjects.h"
 #include "devhost/ImportPatch.h"
 #include "devhost/Output.h"
@@ -104,6 +105,7 @@ LRESULT CALLBACK GetMessageHook(int code, WPARAM removal, LPARAM data) {
             if (message->message == WM_PAINT)
                 FirstPaint(message->hwnd, L"");
             if (message->message == WM_KEYDOWN) {
+                Line(Elapsed(), L"opened " + std::to_wstring(DrawingFilesOpened()));
                 Line(Elapsed(), L"key " + std::to_wstring(message->wParam));
                 g_afterKey = true;
             }
@@ -431,6 +433,7 @@ void TimingCallEnded() {
         std::swprintf(number, sizeof number / sizeof number[0], L"%.3f", longest / 1000.0);
         Line(end, L"longest-unanswered " + std::wstring(number));
     }
+    Line(end, L"opened " + std::to_wstring(DrawingFilesOpened()));
     Line(end, L"call-end");
     if (g_hook)
         UnhookWindowsHookEx(g_hook);

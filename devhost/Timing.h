@@ -10,6 +10,9 @@
 //                                          are shown inside their parent's client area (the thumbnails one
 //                                          can see), DRAWN of them have had a preview drawn since they were
 //                                          created
+//   [timing] MS opened N                  printed before each key line and at the call's end: N drawing
+//                                          files opened in the process so far, on any thread (the
+//                                          library's reads, the host's preview operation's)
 //   [timing] MS key VK                    the user-interface thread took a key press (WM_KEYDOWN) from its
 //                                          queue; VK is the virtual-key code in decimal
 //   [timing] MS key-handled               the next message it took after that key: the key's handling

@@ -35,6 +35,8 @@ run_at() { # LATENCY
   steps+=('key pagedown' 'key pagedown' 'key pagedown' 'sleep 2500') ; steps+=("$(look pagedown-$1)")
   steps+=('key end' 'sleep 2500') ; steps+=("$(look end-$1)")
   steps+=('key home' 'sleep 1500') ; steps+=("$(look home-$1)")
+  # Back over rows already seen: a page down and a page up read no file (devhost counts the opens).
+  steps+=('key pagedown' 'sleep 1500' 'key pageup' 'sleep 1500' 'key home' 'sleep 500')
   steps+=('key alt+v i' 'sleep 3000') ; steps+=("$(look bigger-$1)")
   steps+=('key alt+s d' 'sleep 3000') ; steps+=("$(look sorted-$1)")
   # Back to the first size and the name order, which the settings file keeps for the next call.
@@ -49,6 +51,20 @@ run_at() { # LATENCY
     expect_true "at $1 ms, after '$step' every thumbnail in the grid shows its picture ($shown shown, ${loading:-?} loading)" \
       test "${shown:-0}" -gt 0 -a "${loading:-1}" -eq 0
   done
+  # "opened N" comes before each key: the drawings opened in the process so far.
+  local reads
+  reads=$(printf '%s\n' "$OUT" | awk '$1 == "[timing]" && $3 == "opened" { opened = $4 }
+    $1 == "[timing]" && $3 == "key" { if (up != "" && after == "") after = opened
+                                       if ($4 == 34 && first == "") first = opened; if ($4 == 35 && atEnd == "") atEnd = opened
+                                       if ($4 == 34) down = opened; if ($4 == 33 && up == "") up = opened }
+    END { if (down != "" && up != "" && after != "") print up - down, after - up, atEnd - first }')
+  read -r down_reads up_reads new_reads <<<"$reads"
+  expect_true "at $1 ms, the first page downs into rows not seen open drawings (${new_reads:-?})" \
+    test "${new_reads:-0}" -gt 0
+  expect_true "at $1 ms, a page down over rows seen before opens no drawing (${down_reads:-?})" \
+    test "${down_reads:-x}" == 0
+  expect_true "at $1 ms, a page up back to the first rows opens no drawing (${up_reads:-?})" \
+    test "${up_reads:-x}" == 0
   wait_ms=$(printf '%s\n' "$OUT" | awk '$1 == "[timing]" && $3 == "longest-unanswered" { print $4 }')
   echo "at $1 ms a read: the host's thread left a message unanswered for at most $wait_ms ms"
   expect_true "the longest wait of the host's thread is measured at $1 ms" test -n "$wait_ms"
