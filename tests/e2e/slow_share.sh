@@ -89,4 +89,36 @@ expect_true "a hung read does not hold the call's end (Escape to return: ${closi
   test -n "$closing" -a "${closing:-99999}" -lt 2000
 expect_true "devhost ended on its own after the call (exit $RC)" test "$RC" -eq 0
 
+# A drawing another program changes while it is shown: its picture is kept under the size and write time
+# the scan saw, so it stays until the folder is read again; after F5 the new picture is shown.
+changed="$WORK/orvexchanged"
+gen_dwg "$changed" 6 --variant 21
+gen_dwg "$WORK/replacement" 1 --variant 58
+first=$(ls "$changed" | LC_ALL=C sort -f | head -1)
+thumb='class=Orvex1Wnd nth=0'
+script_with_host_checks 'wait contains=".dwg" timeout=30000' 'sleep 2000' \
+  "screenshot $thumb $(winpath "$WORK/changed-before.bmp")" 'echo changing' 'sleep 2000' 'key f5' 'sleep 2000' \
+  "screenshot $thumb $(winpath "$WORK/changed-after.bmp")" \
+  "screenshot contains=\"orvexchanged\" nth=0 $(winpath "$WORK/slow-share-changed-after-f5.png")" 'key escape'
+( for _ in $(seq 1 300); do
+    if grep -q 'changing' "$WORK/script.log" 2>/dev/null; then
+      cp "$WORK/replacement/$(ls "$WORK/replacement" | head -1)" "$changed/$first.new"
+      touch -d '2030-01-02 03:04:05' "$changed/$first.new" && mv "$changed/$first.new" "$changed/$first"
+      break
+    fi
+    sleep 0.1
+  done ) &
+watcher=$!
+OUT=$("$WINE_RUN" "$DEVHOST" --arx "$(winpath "$ARX")" --script "$(winpath "$WORK/script.txt")" \
+      --eval "(Orvex 1 2 \"$(lisppath "$changed")\\\\\" \"Insert\" \"Close\")" 2>"$WORK/stderr" |
+      tee "$WORK/script.log" | tr -d '\r')
+RC=${PIPESTATUS[0]}
+wait "$watcher" 2>/dev/null
+expect_host_usable "a drawing changed while shown"
+expect_true "the first drawing ($first) was replaced while shown" cmp -s "$changed/$first" "$WORK/replacement/$(ls "$WORK/replacement" | head -1)"
+expect_true "the first thumbnail's picture was taken before and after" \
+  test -s "$WORK/changed-before.bmp" -a -s "$WORK/changed-after.bmp"
+expect_true "after F5 the changed drawing shows its new picture" \
+  bash -c '! cmp -s "$1" "$2"' _ "$WORK/changed-before.bmp" "$WORK/changed-after.bmp"
+
 finish
