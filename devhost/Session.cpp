@@ -5,7 +5,6 @@
 #include "devhost/HostWindows.h"
 #include "devhost/Lisp.h"
 #include "devhost/Output.h"
-#include "devhost/Resources.h"
 #include "devhost/ResultBuffers.h"
 #include "devhost/Script.h"
 #include "devhost/ScriptRunner.h"
@@ -13,6 +12,7 @@
 #include "devhost/FileDelay.h"
 #include "devhost/Timing.h"
 #include "tests/support/MessagePump.h" // pumped wide: devhost's windows are Unicode
+#include "tests/support/ProcessResources.h"
 #include "thumbs/AppMessages.h"
 
 #include <windows.h>
@@ -201,6 +201,14 @@ LRESULT CALLBACK RefuseWindowHook(int code, WPARAM wParam, LPARAM lParam) {
 
 // Validates every heap of the process; with Wine's heap checks on (WINEDEBUG=warn+heap) that includes the
 // fill of freed blocks, so a write into a freed object shows here.
+// --resources: "[host] resources WHEN: gdi=G windows=W handles=H threads=T".
+static void PrintResources(const wchar_t* when) {
+    const testsupport::ProcessResources counted = testsupport::CountProcessResources();
+    WriteLine(L"[host] resources " + std::wstring(when) + L": gdi=" + std::to_wstring(counted.gdiObjects) +
+              L" windows=" + std::to_wstring(counted.windows) + L" handles=" +
+              std::to_wstring(counted.handles) + L" threads=" + std::to_wstring(counted.threads));
+}
+
 static void CheckHeaps() {
     std::vector<HANDLE> heaps(64);
     DWORD count = GetProcessHeaps(static_cast<DWORD>(heaps.size()), heaps.data());
@@ -407,7 +415,7 @@ void Session::Evaluate(const std::wstring& expression) {
     }
     if (!nested) {
         if (m_options.resources && !m_resourcesCounted) {
-            WriteLine(ResourcesLine(CountProcessResources(), L"before the first call"));
+            PrintResources(L"before the first call");
             m_resourcesCounted = true;
         }
         StartScript();
@@ -417,7 +425,7 @@ void Session::Evaluate(const std::wstring& expression) {
         if (m_options.checkHeaps)
             CheckHeaps();
         if (m_options.resources)
-            WriteLine(ResourcesLine(CountProcessResources(), L"after the call"));
+            PrintResources(L"after the call");
     }
 
     if (timer)

@@ -7,11 +7,10 @@
 
 #include "SyntheticDwg.h"
 #include "tests/support/MessagePump.h"
+#include "tests/support/ProcessResources.h"
 #include "tests/support/TempFolder.h"
 
 #include <gtest/gtest.h>
-
-#include <tlhelp32.h>
 
 #include <cstdint>
 #include <cstdio>
@@ -68,30 +67,6 @@ std::vector<std::uint32_t> HostDrawing(const PictureKey& key) {
     return copy;
 }
 
-int ThreadCount() {
-    HANDLE snapshot = CreateToolhelp32Snapshot(TH32CS_SNAPTHREAD, 0);
-    THREADENTRY32 entry{};
-    entry.dwSize = sizeof entry;
-    int count = 0;
-    for (BOOL more = Thread32First(snapshot, &entry); more; more = Thread32Next(snapshot, &entry))
-        if (entry.th32OwnerProcessID == GetCurrentProcessId())
-            ++count;
-    CloseHandle(snapshot);
-    return count;
-}
-
-// The handles the process holds, counted by asking the system about each possible value (Wine's
-// GetProcessHandleCount answers 0).
-DWORD HandleCount() {
-    DWORD count = 0;
-    for (std::uintptr_t value = 4; value < 0x20000; value += 4) {
-        DWORD flags = 0;
-        if (GetHandleInformation(reinterpret_cast<HANDLE>(value), &flags))
-            ++count;
-    }
-    return count;
-}
-
 bool AllArrived(PictureLoader& loader, const std::vector<PictureKey>& keys) {
     for (const PictureKey& key : keys)
         if (!loader.Find(key))
@@ -132,13 +107,14 @@ TEST(PictureLoader, PicturesArriveThroughItsWindowAndAreReadOnce) {
     std::vector<PictureKey> keys;
     for (int i = 0; i < 12; ++i)
         keys.push_back(KeyOf(WriteDrawing(folder, "p" + std::to_string(i) + ".dwg", i + 1)));
-    const int threadsBefore = ThreadCount();
+    const long threadsBefore = testsupport::CountThreads();
     PictureLoader loader(kDefaultPictureCacheBytes);
     std::vector<std::string> ready;
     loader.onPictureReady = [&](const PictureKey& key) { ready.push_back(key.path); };
     loader.Want(keys);
     EXPECT_EQ(loader.WorkersStarted(), PictureLoader::kWorkers);
-    EXPECT_EQ(ThreadCount(), threadsBefore + PictureLoader::kWorkers) << "the workers are counted";
+    EXPECT_EQ(testsupport::CountThreads(), threadsBefore + PictureLoader::kWorkers)
+        << "the workers are counted";
     ASSERT_TRUE(testsupport::PumpUntil([&] { return AllArrived(loader, keys); }, 10000));
     EXPECT_EQ(ready.size(), keys.size());
     EXPECT_EQ(loader.ReadsBegun(), keys.size());
@@ -157,7 +133,7 @@ Picture HangingDecode(const PictureKey& key) {
 
 TEST(PictureLoader, ItsEndDoesNotWaitForAReadThatHangs) {
     g_release = CreateEventW(nullptr, TRUE, FALSE, nullptr);
-    const int threadsBefore = ThreadCount();
+    const long threadsBefore = testsupport::CountThreads();
     ULONGLONG took = 0;
     {
         auto loader = std::make_unique<PictureLoader>(kDefaultPictureCacheBytes, &HangingDecode);
@@ -172,7 +148,7 @@ TEST(PictureLoader, ItsEndDoesNotWaitForAReadThatHangs) {
     EXPECT_LT(took, 2000u) << "the end waits a bounded time, not for the reads";
     // The hanging workers still stand, holding their own references; let go, they end by themselves.
     SetEvent(g_release);
-    EXPECT_TRUE(testsupport::PumpUntil([&] { return ThreadCount() <= threadsBefore; }, 5000));
+    EXPECT_TRUE(testsupport::PumpUntil([&] { return testsupport::CountThreads() <= threadsBefore; }, 5000));
     CloseHandle(g_release);
 }
 
@@ -188,25 +164,25 @@ TEST(PictureLoader, FiftyLoadersInARowLeaveNoThreadHandleOrGdiObject) {
         testsupport::PumpUntil([&] { return AllArrived(loader, keys); }, 10000);
     }
     Sleep(50);
-    const int threads = ThreadCount();
-    const DWORD handles = HandleCount();
-    const DWORD gdi = GetGuiResources(GetCurrentProcess(), GR_GDIOBJECTS);
+    const long threads = testsupport::CountThreads();
+    const long handles = testsupport::CountHandles();
+    const long gdi = testsupport::CountGdiObjects();
     for (int call = 0; call < 50; ++call) {
         PictureLoader loader(kDefaultPictureCacheBytes);
         loader.Want(keys);
         if (call % 2 == 0) // every other one ends with reads in flight
             testsupport::PumpUntil([&] { return AllArrived(loader, keys); }, 10000);
     }
-    EXPECT_TRUE(testsupport::PumpUntil([&] { return ThreadCount() <= threads; }, 5000))
-        << ThreadCount() << " threads, " << threads << " before";
-    std::printf("threads %d, handles %lu, GDI objects %lu before; %d, %lu, %lu after 50 loaders\n", threads,
-                static_cast<unsigned long>(handles), static_cast<unsigned long>(gdi), ThreadCount(),
-                static_cast<unsigned long>(HandleCount()),
-                static_cast<unsigned long>(GetGuiResources(GetCurrentProcess(), GR_GDIOBJECTS)));
-    EXPECT_GT(handles, 0u) << "the handles are counted";
-    EXPECT_LE(HandleCount(), handles);
-    // Wine answers 0 here; on Windows this counts the bitmaps and DCs the decoding makes.
-    EXPECT_LE(GetGuiResources(GetCurrentProcess(), GR_GDIOBJECTS), gdi);
+    EXPECT_TRUE(testsupport::PumpUntil([&] { return testsupport::CountThreads() <= threads; }, 5000))
+        << testsupport::CountThreads() << " threads, " << threads << " before";
+    std::printf("threads %ld, handles %ld, GDI objects %ld before; %ld, %ld, %ld after 50 loaders\n", threads,
+                handles, gdi, testsupport::CountThreads(), testsupport::CountHandles(),
+                testsupport::CountGdiObjects());
+    EXPECT_GT(handles, 0) << "the handles are counted";
+    EXPECT_GT(gdi, 0) << "the GDI objects are counted";
+    EXPECT_LE(testsupport::CountHandles(), handles);
+    // The bitmaps and DCs the decoding makes are all deleted.
+    EXPECT_LE(testsupport::CountGdiObjects(), gdi);
     // No file handle stays open: every drawing can be deleted at once.
     for (const PictureKey& key : keys)
         EXPECT_TRUE(DeleteFileA(key.path.c_str())) << key.path;

@@ -1,4 +1,4 @@
-#include "devhost/Resources.h"
+#include "tests/support/ProcessResources.h"
 
 #include <windows.h>
 
@@ -7,7 +7,7 @@
 
 #include <cstdint>
 
-namespace devhost {
+namespace testsupport {
 
 namespace {
 
@@ -40,6 +40,8 @@ const unsigned char* ProcessBlock() {
         return nullptr;
     return reinterpret_cast<const unsigned char*>(basic.PebBaseAddress);
 }
+
+} // namespace
 
 // GetGuiResources answers 0 under Wine; the handle table the process block points to holds them all.
 long CountGdiObjects() {
@@ -87,6 +89,8 @@ long CountThreads() {
     return count;
 }
 
+namespace {
+
 BOOL CALLBACK CountChild(HWND, LPARAM counter) {
     ++*reinterpret_cast<long*>(counter);
     return TRUE;
@@ -108,10 +112,6 @@ long CountWindows() {
     return count;
 }
 
-} // namespace
-
-namespace {
-
 ProcessResources CountOnce() {
     ProcessResources resources;
     resources.gdiObjects = CountGdiObjects();
@@ -121,12 +121,12 @@ ProcessResources CountOnce() {
     return resources;
 }
 
+} // namespace
+
 bool operator==(const ProcessResources& a, const ProcessResources& b) {
     return a.gdiObjects == b.gdiObjects && a.windows == b.windows && a.handles == b.handles &&
            a.threads == b.threads;
 }
-
-} // namespace
 
 ProcessResources CountProcessResources() {
     // A thread that was ending as the call returned (the system's or the library's) still holds its
@@ -144,10 +144,4 @@ ProcessResources CountProcessResources() {
     return last;
 }
 
-std::wstring ResourcesLine(const ProcessResources& resources, const std::wstring& when) {
-    return L"[host] resources " + when + L": gdi=" + std::to_wstring(resources.gdiObjects) + L" windows=" +
-           std::to_wstring(resources.windows) + L" handles=" + std::to_wstring(resources.handles) +
-           L" threads=" + std::to_wstring(resources.threads);
-}
-
-} // namespace devhost
+} // namespace testsupport
