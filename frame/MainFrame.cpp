@@ -429,7 +429,9 @@ bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {
 }
 
 void CMainFrame::TellUser(const std::string& text) {
-    ::MessageBoxA(m_hWnd, text.c_str(), kExplorerMessageCaption, MB_OK | MB_ICONWARNING);
+    // A name too long for a line (a path, a name of 300 characters) is broken: the box stays on the screen.
+    const std::string fitted = BreakLongWords(text, kMessageWordChars);
+    ::MessageBoxA(m_hWnd, fitted.c_str(), kExplorerMessageCaption, MB_OK | MB_ICONWARNING);
 }
 
 void CMainFrame::OnDestroy() {
