@@ -8,10 +8,22 @@
 #include "thumbs/GridMath.h"
 #include "thumbs/TooltipText.h"
 
+#include <algorithm>
+
 namespace {
 
 // Every redraw of the control and its label repaints at once, background included.
 constexpr UINT kRedrawNow = RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW;
+
+// The widest text a tooltip over the window may hold: its monitor's work area less the tooltip's margins
+// and border, with room to spare (64 pixels).
+int ScreenTextWidth(HWND window) {
+    MONITORINFO monitor{};
+    monitor.cbSize = sizeof monitor;
+    if (!::GetMonitorInfoW(::MonitorFromWindow(window, MONITOR_DEFAULTTONEAREST), &monitor))
+        return ::GetSystemMetrics(SM_CXSCREEN) - 64;
+    return static_cast<int>(monitor.rcWork.right - monitor.rcWork.left) - 64;
+}
 
 } // namespace
 
@@ -307,9 +319,9 @@ bool exCDwgThumbnail::Rebind(const std::string& name, int listIndex, const RECT&
 void exCDwgThumbnail::CreateToolTip() {
     if (m_wndToolTip.m_hWnd || !m_wndToolTip.Create(this, 0))
         return;
-    // As wide as its widest line in its own font: the text breaks at the blanks between name, size and
-    // date, and never inside the name (a line may break between any two Japanese or Chinese characters).
-    m_wndToolTip.SetMaxTipWidth(TooltipPixelWidth(m_toolTip, [this](const std::string& text) {
+    // As wide as its widest line in its own font, and no wider than the screen it shows on: a name wider
+    // than that (255 wide letters) is cut into lines.
+    const auto measure = [this](const std::string& text) {
         CClientDC dc(m_wndToolTip.m_hWnd);
         const CSelectObject font(dc.GetSafeHdc(),
                                  reinterpret_cast<HGDIOBJ>(m_wndToolTip.SendMessage(WM_GETFONT)));
@@ -319,8 +331,10 @@ void exCDwgThumbnail::CreateToolTip() {
         SIZE size{};
         ::GetTextExtentPoint32W(dc.GetSafeHdc(), wide.c_str(), static_cast<int>(wide.size()), &size);
         return static_cast<int>(size.cx);
-    }));
-    m_wndToolTip.AddTool(this, m_strToolTip);
+    };
+    const int width = TooltipWidthFor(m_toolTip, ScreenTextWidth(m_hWnd), measure);
+    m_wndToolTip.SetMaxTipWidth(width);
+    m_wndToolTip.AddTool(this, TooltipShownText(m_toolTip, width, measure));
     m_wndToolTip.Activate(false);
 }
 

@@ -176,14 +176,15 @@ TEST(ThumbnailTooltip, NameSizeAndLocalDateInOneNarrowTip) {
     Pump();
     ASSERT_NE(tip.m_hWnd, nullptr);
     EXPECT_EQ(tip.GetToolCount(), 1);
-    // As wide as the widest line, the date (the other lines are shorter with their blanks), in the
-    // tooltip's font: three lines, none broken inside.
+    // As wide as the widest line, the date, and a blank, in the tooltip's font: three lines, none broken
+    // inside.
     {
         CClientDC dc(tip.m_hWnd);
         const CSelectObject font(dc.GetSafeHdc(), reinterpret_cast<HGDIOBJ>(tip.SendMessage(WM_GETFONT)));
-        SIZE date{};
+        SIZE date{}, blank{};
         ::GetTextExtentPoint32A(dc.GetSafeHdc(), "05/03/2021;14.07.09", 19, &date);
-        EXPECT_EQ(tip.SendMessage(TTM_GETMAXTIPWIDTH), date.cx);
+        ::GetTextExtentPoint32A(dc.GetSafeHdc(), " ", 1, &blank);
+        EXPECT_EQ(tip.SendMessage(TTM_GETMAXTIPWIDTH), date.cx + blank.cx);
     }
     char text[256] = {};
     TTTOOLINFOA ti{};
@@ -192,7 +193,8 @@ TEST(ThumbnailTooltip, NameSizeAndLocalDateInOneNarrowTip) {
     ti.uId = reinterpret_cast<UINT_PTR>(control->m_hWnd);
     ti.lpszText = text;
     tip.SendMessage(TTM_GETTEXTA, sizeof text, reinterpret_cast<LPARAM>(&ti));
-    EXPECT_EQ(std::string(text), expected);
+    // Shown on lines of their own, whatever the widths of the characters.
+    EXPECT_EQ(std::string(text), "a.dwg\r\nSize=1234\r\n05/03/2021;14.07.09");
 }
 
 // ---- rename -------------------------------------------------------------------------------------------
