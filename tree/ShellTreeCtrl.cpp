@@ -404,8 +404,10 @@ std::string CShellTreeCtrl::FolderPathOf(HTREEITEM item) const {
     std::string path;
     // The Desktop, the namespace's root, is not a folder of files here even where the shell gives it the
     // user's desktop directory: it holds My Computer, the network and the rest.
+    // Whole however long: a folder too long for the runtime is named by its own path and refused as such,
+    // not by a cut path that names another.
     if (node && ItemIdListSize(node->AbsoluteId()) > 0)
-        ShellFileSystemPath(node->AbsoluteId(), path);
+        ShellFileSystemPath(node->AbsoluteId(), path, kLongestPathChars + 1);
     return path;
 }
 
