@@ -70,8 +70,8 @@ std::string CharactersAndBytes(const std::string& text, const LeadByteTable& lea
 // maxChars characters: after its last "\" or "/" that leaves at least half a line, else after maxChars
 // characters. A message box wraps lines only at blanks, so one long name (a path, a file name of 300
 // characters) would make it wider than the screen.
-// The longest word a message of the library puts on one line: a third of a small screen's width.
-constexpr std::size_t kMessageWordChars = 64;
+// The longest word a message of the library puts on one line: about half of a small screen's width.
+constexpr std::size_t kMessageWordChars = 80;
 std::string BreakLongWords(const std::string& text, std::size_t maxChars,
                            const LeadByteTable& lead = ActiveLeadBytes());
 // The same for text in Unicode (UTF-16; a character is one code unit here).
