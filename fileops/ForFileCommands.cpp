@@ -164,7 +164,8 @@ void ForFileCommands::TellRefused(HWND owner, const std::vector<std::u16string>&
     if (tellUser)
         tellUser(text);
     else
-        ::MessageBoxW(owner, text.c_str(), L"Paste", MB_OK | MB_ICONWARNING);
+        ::MessageBoxW(owner, BreakLongWords(text, kMessageWordChars).c_str(), L"Paste",
+                      MB_OK | MB_ICONWARNING);
 }
 
 int ForFileCommands::PasteInto(const std::string& folder, HWND owner) const {
@@ -257,7 +258,7 @@ int ForFileCommands::CopyToFile(const std::string& source, HWND owner) const {
             return 1;
     }
     if (!::CopyFileA(source.c_str(), target.c_str(), FALSE))
-        AfxMessageBox(std::string(kCannotCopy) + source, MB_OK);
+        AfxMessageBox(BreakLongWords(std::string(kCannotCopy) + source, kMessageWordChars), MB_OK);
     return 1;
 }
 

@@ -268,7 +268,7 @@ void CMainFrame::WireFolderTree() {
     tree->SetDrawingFolder(&m_folder);
     // A folder without a file-system path shows its name; the grid is empty.
     tree->onNoFolderShown = [this](const std::string& label) { SetTitleText(label); };
-    tree->onFolderMenu = [this](HTREEITEM item, CPoint) { ShowFolderMenu(item); };
+    tree->onFolderMenu = [this](HTREEITEM item, CPoint at) { return ShowFolderMenu(item, at); };
     tree->onFocusGrid = [this] {
         if (m_pGridView && m_pGridView->m_hWnd)
             m_pGridView->SetFocus();
@@ -319,35 +319,32 @@ void CMainFrame::OnDrawingChosen() {
     EnablePick(chosen);
 }
 
-void CMainFrame::ShowFolderMenu(HTREEITEM item) {
+bool CMainFrame::ShowFolderMenu(HTREEITEM item, CPoint at) {
     CChildView* tree = GetFolderTree();
     if (!tree || !item)
-        return;
+        return false;
     // Virtual folders (Desktop, My Computer) keep no settings: no menu.
     const std::string folder = tree->FolderPathOf(item);
     if (folder.empty())
-        return;
+        return false;
     CMenu menu;
     if (!menu.CreatePopupMenu() || !menu.AppendMenu(MF_STRING, kFolderMenuSettings, "&Folder settings"))
-        return;
-    CRect text;
-    if (!tree->GetItemRect(item, &text, true))
-        return;
-    tree->ClientToScreen(&text);
-    const int chosen = menu.TrackPopupMenu(TPM_RETURNCMD | TPM_RIGHTBUTTON | TPM_NONOTIFY, text.right,
-                                           text.bottom, tree->m_hWnd);
+        return false;
+    const int chosen =
+        menu.TrackPopupMenu(TPM_RETURNCMD | TPM_RIGHTBUTTON | TPM_NONOTIFY, at.x, at.y, tree->m_hWnd);
     if (chosen != kFolderMenuSettings)
-        return;
+        return true;
     CDialogSetLa dialog(this);
     if (!dialog.SetFolder(folder)) {
         TellUser(FolderPathTooLongMessage(folder));
-        return;
+        return true;
     }
     // The label shows the current folder's layer, which a write or a delete may have changed.
     dialog.onChanged = [this] { UpdateLayerLabel(); };
     dialog.DoModal();
     if (CChildView* again = GetFolderTree())
         again->SetFocus();
+    return true;
 }
 
 CView* CMainFrame::MakeGridView() {
@@ -432,7 +429,9 @@ bool CMainFrame::OnCreateClient(LPCREATESTRUCTA, CCreateContext* context) {
 }
 
 void CMainFrame::TellUser(const std::string& text) {
-    ::MessageBoxA(m_hWnd, text.c_str(), kExplorerMessageCaption, MB_OK | MB_ICONWARNING);
+    // A name too long for a line (a path, a name of 300 characters) is broken: the box stays on the screen.
+    const std::string fitted = BreakLongWords(text, kMessageWordChars);
+    ::MessageBoxA(m_hWnd, fitted.c_str(), kExplorerMessageCaption, MB_OK | MB_ICONWARNING);
 }
 
 void CMainFrame::OnDestroy() {

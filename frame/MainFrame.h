@@ -131,8 +131,9 @@ private:
     // The title for the folder shown: its path, or the explorer's name when it does not exist or cannot
     // be reached.
     std::string FolderTitle() const;
-    // The folder tree's right-click menu, "&Folder settings", and the dialog it opens.
-    void ShowFolderMenu(HTREEITEM item);
+    // The folder tree's right-click menu, "&Folder settings", at a point of the screen, and the dialog it
+    // opens. False when the node has no menu (a virtual folder).
+    bool ShowFolderMenu(HTREEITEM item, CPoint at);
     bool ForwardToGrid(UINT id);
     void SetSortMode(int mode);
     void ShowHelp();

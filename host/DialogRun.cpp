@@ -2,6 +2,7 @@
 
 #include "frame/MdiMixin.h"
 #include "hostapi/HostApi.h"
+#include "hostapi/NarrowText.h"
 #include "thumbs/AppMessages.h"
 #include "thumbs/DrawingFolder.h"
 
@@ -81,7 +82,8 @@ bool CDialogRun::PreTranslateMessage(MSG* pMsg) {
             const std::string refused = PickRefusal(*folder);
             if (!refused.empty()) {
                 HWND owner = ::GetActiveWindow();
-                ::MessageBoxA(owner ? owner : m_hWnd, refused.c_str(), "Orvex1", MB_OK | MB_ICONWARNING);
+                const std::string fitted = BreakLongWords(refused, kMessageWordChars);
+                ::MessageBoxA(owner ? owner : m_hWnd, fitted.c_str(), "Orvex1", MB_OK | MB_ICONWARNING);
                 return true;
             }
         }

@@ -121,3 +121,56 @@ std::string CharactersAndBytes(const std::string& text, const LeadByteTable& lea
         length += ", " + std::to_string(text.size()) + " bytes";
     return length;
 }
+
+namespace {
+
+// BreakLongWords for either text; next(i) is the position of the character after the one at i.
+template <typename Text, typename Next> Text BreakWords(const Text& text, std::size_t maxChars, Next next) {
+    using Char = typename Text::value_type;
+    if (maxChars < 2)
+        return text;
+    Text out;
+    out.reserve(text.size() + text.size() / maxChars + 1);
+    std::vector<std::size_t> word; // where each character of the word being copied starts in out
+    for (std::size_t i = 0; i < text.size();) {
+        const std::size_t after = next(i);
+        const Char c = text[i];
+        if (c == Char(' ') || c == Char('\t') || c == Char('\n') || c == Char('\r')) {
+            word.clear();
+        } else {
+            if (word.size() == maxChars) {
+                // A line break after the last separator of the word's second half, else here. A lead byte
+                // is never a separator, so only a character's first byte is looked at.
+                std::size_t cut = word.size();
+                for (std::size_t k = word.size(); k > maxChars / 2; --k) {
+                    const Char d = out[word[k - 1]];
+                    if (d == Char('\\') || d == Char('/')) {
+                        cut = k;
+                        break;
+                    }
+                }
+                out.insert(out.begin() +
+                               static_cast<std::ptrdiff_t>(cut < word.size() ? word[cut] : out.size()),
+                           Char('\n'));
+                std::vector<std::size_t> rest;
+                for (std::size_t k = cut; k < word.size(); ++k)
+                    rest.push_back(word[k] + 1);
+                word.swap(rest);
+            }
+            word.push_back(out.size());
+        }
+        out.append(text, i, after - i);
+        i = after;
+    }
+    return out;
+}
+
+} // namespace
+
+std::string BreakLongWords(const std::string& text, std::size_t maxChars, const LeadByteTable& lead) {
+    return BreakWords(text, maxChars, [&](std::size_t i) { return NextCharacter(text, i, lead); });
+}
+
+std::wstring BreakLongWords(const std::wstring& text, std::size_t maxChars) {
+    return BreakWords(text, maxChars, [](std::size_t i) { return i + 1; });
+}

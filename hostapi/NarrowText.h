@@ -65,3 +65,14 @@ bool ContainsForbiddenCharacter(const std::string& name, const LeadByteTable& le
 // A length for a message about a buffer of bytes: "12 characters" when each character is one byte, else
 // "161 characters, 301 bytes" (the limit is then to be said in bytes too).
 std::string CharactersAndBytes(const std::string& text, const LeadByteTable& lead = ActiveLeadBytes());
+
+// The text with a line break put into every word (a run without blanks or line breaks) longer than
+// maxChars characters: after its last "\" or "/" that leaves at least half a line, else after maxChars
+// characters. A message box wraps lines only at blanks, so one long name (a path, a file name of 300
+// characters) would make it wider than the screen.
+// The longest word a message of the library puts on one line: about half of a small screen's width.
+constexpr std::size_t kMessageWordChars = 80;
+std::string BreakLongWords(const std::string& text, std::size_t maxChars,
+                           const LeadByteTable& lead = ActiveLeadBytes());
+// The same for text in Unicode (UTF-16; a character is one code unit here).
+std::wstring BreakLongWords(const std::wstring& text, std::size_t maxChars);

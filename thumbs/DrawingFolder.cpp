@@ -71,7 +71,11 @@ bool DrawingFolder::SameFolder(const std::string& a, const std::string& b) {
 // ---- the folder shown ----------------------------------------------------------------------------------
 
 bool DrawingFolder::Show(const std::string& folder) {
+    // The same folder read again (F5, a file command): the drawing chosen stays chosen while it is there.
+    const std::string previous = m_strFolder;
+    const std::string chosen = ChosenName();
     m_strFolder = Spelling(folder);
+    const std::string keep = SameFolder(previous, m_strFolder) ? chosen : std::string();
     m_strProblem.clear();
     std::vector<DwgData> drawings;
     bool read = false;
@@ -84,7 +88,7 @@ bool DrawingFolder::Show(const std::string& folder) {
     if (m_pDocument)
         m_pDocument->m_strPath = m_strFolder;
     m_bRead = read;
-    Fill(std::move(drawings));
+    Fill(std::move(drawings), keep);
     return read;
 }
 
@@ -101,14 +105,26 @@ void DrawingFolder::ShowNoFolder() {
     Fill({});
 }
 
-void DrawingFolder::Fill(std::vector<DwgData>&& drawings) {
+void DrawingFolder::Fill(std::vector<DwgData>&& drawings, const std::string& keepChosen) {
     m_nChosen = -1;
     if (m_pDocument)
         m_pDocument->m_strName.clear();
     BeginScan();
     AppendScanRecords(std::move(drawings));
     EndScan();
+    if (!keepChosen.empty()) {
+        for (int i = 0; i < Count() && m_nChosen < 0; ++i) {
+            if (Drawing(i).m_strName == keepChosen) {
+                DwgList[i].Select();
+                m_nChosen = i;
+                if (m_pDocument)
+                    m_pDocument->m_strName = keepChosen;
+            }
+        }
+    }
     TellShown();
+    if (m_nChosen >= 0)
+        TellChosen();
 }
 
 void DrawingFolder::TellShown() {

@@ -113,7 +113,8 @@ public:
     static bool SameFolder(const std::string& a, const std::string& b);
 
 private:
-    void Fill(std::vector<DwgData>&& drawings);
+    // keepChosen: the name of a drawing that stays chosen (and selected) if it is still there.
+    void Fill(std::vector<DwgData>&& drawings, const std::string& keepChosen = std::string());
     void TellShown();
     void TellChosen();
 

@@ -8,10 +8,22 @@
 #include "thumbs/GridMath.h"
 #include "thumbs/TooltipText.h"
 
+#include <algorithm>
+
 namespace {
 
 // Every redraw of the control and its label repaints at once, background included.
 constexpr UINT kRedrawNow = RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW;
+
+// The widest text a tooltip over the window may hold: its monitor's work area less the tooltip's margins
+// and border, with room to spare (64 pixels).
+int ScreenTextWidth(HWND window) {
+    MONITORINFO monitor{};
+    monitor.cbSize = sizeof monitor;
+    if (!::GetMonitorInfoW(::MonitorFromWindow(window, MONITOR_DEFAULTTONEAREST), &monitor))
+        return ::GetSystemMetrics(SM_CXSCREEN) - 64;
+    return static_cast<int>(monitor.rcWork.right - monitor.rcWork.left) - 64;
+}
 
 } // namespace
 
@@ -129,6 +141,101 @@ bool CThumbLabel::Commit() {
     return alive;
 }
 
+LRESULT CThumbLabel::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+    if (m_bRenaming)
+        return CEdit::WindowProc(message, wParam, lParam); // the edit's own drawing, caret and scrolling
+    switch (message) {
+    case WM_PAINT: {
+        PAINTSTRUCT paint{};
+        HDC dc = ::BeginPaint(m_hWnd, &paint);
+        if (dc)
+            Draw(dc);
+        ::EndPaint(m_hWnd, &paint);
+        return 0;
+    }
+    case WM_PRINTCLIENT:
+        Draw(reinterpret_cast<HDC>(wParam));
+        return 0;
+    case WM_ERASEBKGND:
+        return 1; // Draw fills the whole label
+    default:
+        return CEdit::WindowProc(message, wParam, lParam);
+    }
+}
+
+namespace {
+
+// The label's font (none: the DC keeps its own).
+HGDIOBJ LabelFontOf(HWND label) {
+    return reinterpret_cast<HGDIOBJ>(::SendMessageW(label, WM_GETFONT, 0, 0));
+}
+
+int TextWidth(HDC dc, const std::wstring& text) {
+    SIZE size{};
+    ::GetTextExtentPoint32W(dc, text.c_str(), static_cast<int>(text.size()), &size);
+    return static_cast<int>(size.cx);
+}
+
+} // namespace
+
+CRect CThumbLabel::TextRect() const {
+    const DWORD margins = static_cast<DWORD>(::SendMessageW(m_hWnd, EM_GETMARGINS, 0, 0));
+    CRect area = GetClientRect();
+    area.left += LOWORD(margins);
+    area.right -= HIWORD(margins);
+    return area;
+}
+
+std::wstring CThumbLabel::ShownText(HDC dc) const {
+    const int length = ::GetWindowTextLengthW(m_hWnd);
+    std::wstring text(static_cast<std::size_t>(length) + 1, L'\0');
+    text.resize(static_cast<std::size_t>(::GetWindowTextW(m_hWnd, text.data(), length + 1)));
+    const int room = TextRect().Width();
+    const CSelectObject font(dc, LabelFontOf(m_hWnd));
+    if (TextWidth(dc, text) <= room)
+        return text;
+    // The longest start of the name that fits with the ellipsis after it.
+    static const std::wstring kEllipsis = L"...";
+    std::size_t low = 0, high = text.size();
+    while (low < high) {
+        const std::size_t mid = (low + high + 1) / 2;
+        if (TextWidth(dc, text.substr(0, mid) + kEllipsis) <= room)
+            low = mid;
+        else
+            high = mid - 1;
+    }
+    if (low > 0 && low < text.size() && IS_HIGH_SURROGATE(text[low - 1]))
+        --low; // never half a character
+    return text.substr(0, low) + kEllipsis;
+}
+
+void CThumbLabel::Draw(HDC dc) {
+    const CRect client = GetClientRect();
+    HWND parent = ::GetParent(m_hWnd);
+    // The colours of a read-only edit: its parent's answer to WM_CTLCOLORSTATIC, as the edit asks.
+    auto brush = reinterpret_cast<HBRUSH>(::SendMessageW(
+        parent, WM_CTLCOLORSTATIC, reinterpret_cast<WPARAM>(dc), reinterpret_cast<LPARAM>(m_hWnd)));
+    if (!brush)
+        brush = ::GetSysColorBrush(COLOR_3DFACE);
+    ::FillRect(dc, &client, brush);
+    const std::wstring shown = ShownText(dc);
+    CRect text = TextRect();
+    const CSelectObject font(dc, LabelFontOf(m_hWnd));
+    int start = 0, end = 0;
+    GetSel(start, end);
+    const bool selected = start == 0 && end > 0 && end >= ::GetWindowTextLengthW(m_hWnd);
+    if (selected) {
+        // The highlight covers the text shown, as an edit's selection does.
+        const CRect marked(text.left, client.top,
+                           std::min<LONG>(text.left + TextWidth(dc, shown), text.right), client.bottom);
+        ::FillRect(dc, &marked, ::GetSysColorBrush(COLOR_HIGHLIGHT));
+        ::SetTextColor(dc, ::GetSysColor(COLOR_HIGHLIGHTTEXT));
+    }
+    ::SetBkMode(dc, TRANSPARENT);
+    ::DrawTextW(dc, shown.c_str(), static_cast<int>(shown.size()), &text,
+                DT_SINGLELINE | DT_NOPREFIX | DT_LEFT);
+}
+
 void CThumbLabel::OnLButtonDblClk(UINT, CPoint) {
     BeginRename();
 }
@@ -212,9 +319,9 @@ bool exCDwgThumbnail::Rebind(const std::string& name, int listIndex, const RECT&
 void exCDwgThumbnail::CreateToolTip() {
     if (m_wndToolTip.m_hWnd || !m_wndToolTip.Create(this, 0))
         return;
-    // As wide as its widest line in its own font: the text breaks at the blanks between name, size and
-    // date, and never inside the name (a line may break between any two Japanese or Chinese characters).
-    m_wndToolTip.SetMaxTipWidth(TooltipPixelWidth(m_toolTip, [this](const std::string& text) {
+    // As wide as its widest line in its own font, and no wider than the screen it shows on: a name wider
+    // than that (255 wide letters) is cut into lines.
+    const auto measure = [this](const std::string& text) {
         CClientDC dc(m_wndToolTip.m_hWnd);
         const CSelectObject font(dc.GetSafeHdc(),
                                  reinterpret_cast<HGDIOBJ>(m_wndToolTip.SendMessage(WM_GETFONT)));
@@ -224,8 +331,10 @@ void exCDwgThumbnail::CreateToolTip() {
         SIZE size{};
         ::GetTextExtentPoint32W(dc.GetSafeHdc(), wide.c_str(), static_cast<int>(wide.size()), &size);
         return static_cast<int>(size.cx);
-    }));
-    m_wndToolTip.AddTool(this, m_strToolTip);
+    };
+    const int width = TooltipWidthFor(m_toolTip, ScreenTextWidth(m_hWnd), measure);
+    m_wndToolTip.SetMaxTipWidth(width);
+    m_wndToolTip.AddTool(this, TooltipShownText(m_toolTip, width, measure));
     m_wndToolTip.Activate(false);
 }
 

@@ -66,10 +66,13 @@ public:
     void BeginRename();
     // The rectangle of the sunken edge shown while renaming, in the grid view's client coordinates.
     CRect EdgeRect() const;
+    // The name as the label shows it while not renaming: whole when it fits, else its start and "...".
+    std::wstring ShownText(HDC dc) const;
 
     bool PreTranslateMessage(MSG* pMsg) override;
 
 protected:
+    LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
     void OnLButtonDblClk(UINT flags, CPoint pt) override;
     void OnKeyDown(UINT nChar, UINT repeat, UINT flags) override;
     void OnChar(UINT nChar, UINT repeat, UINT flags) override;
@@ -83,6 +86,12 @@ private:
     // False when the label went while the file was renamed (the grid re-created its controls).
     bool Commit();
     void RedrawEdge();
+    // Draws the label while it is not renaming: the start of the name (an edit would scroll a selected
+    // one to its end, and two long names that differ at their start would look the same), cut with an
+    // ellipsis when it does not fit, highlighted as a selection when the drawing is selected.
+    void Draw(HDC dc);
+    // The client area less the edit's margins: where the text goes.
+    CRect TextRect() const;
 
     bool m_bRenaming = false;
     std::string m_strSaved; // the name before the rename began

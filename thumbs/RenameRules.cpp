@@ -22,18 +22,20 @@ bool IsDeviceName(const std::string& name) {
            upper[3] >= '1' && upper[3] <= '9';
 }
 
-bool IsDrawingName(const std::string& name) {
-    static const std::string extension = ".dwg";
-    if (name.size() <= extension.size())
+const std::string kDrawingExtension = ".dwg";
+
+bool EndsInDrawingExtension(const std::string& name) {
+    if (name.size() < kDrawingExtension.size())
         return false;
-    return CompareNamesNoCase(name.substr(name.size() - extension.size()), extension) == 0;
+    return CompareNamesNoCase(name.substr(name.size() - kDrawingExtension.size()), kDrawingExtension) == 0;
 }
 
 } // namespace
 
 RenameVerdict CheckRename(const std::string& folder, const std::string& oldName, const std::string& newName,
                           const std::function<bool(const std::string&)>& exists) {
-    if (newName.empty())
+    // ".dwg" alone is a drawing without a name.
+    if (newName.empty() || CompareNamesNoCase(newName, kDrawingExtension) == 0)
         return RenameVerdict::Empty;
     if (newName == oldName)
         return RenameVerdict::Unchanged;
@@ -41,7 +43,7 @@ RenameVerdict CheckRename(const std::string& folder, const std::string& oldName,
     const bool caseOnly = CompareNamesNoCase(newName, oldName) == 0;
     if (ContainsForbiddenCharacter(newName))
         return RenameVerdict::BadCharacter;
-    if (!IsDrawingName(newName))
+    if (!EndsInDrawingExtension(newName))
         return RenameVerdict::NotDrawing;
     if (IsDeviceName(newName))
         return RenameVerdict::DeviceName;
@@ -57,7 +59,9 @@ std::string RenameRefusalText(RenameVerdict verdict, const std::string& newName)
     const std::string quoted = "\"" + newName + "\"";
     switch (verdict) {
     case RenameVerdict::Empty:
-        return "A drawing needs a name.";
+        if (newName.empty())
+            return "A drawing needs a name.";
+        return "Cannot rename to " + quoted + ": the name before .dwg is empty.";
     case RenameVerdict::BadCharacter:
         return "Cannot rename to " + quoted +
                ": a name cannot contain \\ / : * ? \" < > | or control characters.";

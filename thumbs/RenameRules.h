@@ -9,10 +9,10 @@
 enum class RenameVerdict {
     Rename,       // go ahead
     Unchanged,    // the very same name: nothing to do, nothing to say (a change of case alone is a rename)
-    Empty,        // no name at all
+    Empty,        // no name at all, or nothing before ".dwg"
     BadCharacter, // \ / : * ? " < > | or a control character
     DeviceName,   // CON, PRN, AUX, NUL, COM1-9, LPT1-9, with or without extension
-    NotDrawing,   // does not end in ".dwg", or is nothing but the extension
+    NotDrawing,   // does not end in ".dwg"
     TooLong,      // folder, "\" and name do not fit the path buffers
     Exists,       // another file of the folder has that name
 };

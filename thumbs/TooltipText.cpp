@@ -64,3 +64,56 @@ int TooltipPixelWidth(const ThumbTooltip& tip, const std::function<int(const std
     // Chinese), the system breaks there rather than at blanks that do not fit.
     return std::max({measure(tip.lines[0]), measure(tip.lines[1]), measure(tip.lines[2])});
 }
+
+namespace {
+
+// A line without the blanks that pad it.
+std::string Unpadded(const std::string& line) {
+    const std::size_t end = line.find_last_not_of(' ');
+    return end == std::string::npos ? std::string() : line.substr(0, end + 1);
+}
+
+} // namespace
+
+int TooltipWidthFor(const ThumbTooltip& tip, int maxWidth,
+                    const std::function<int(const std::string&)>& measure) {
+    if (!measure)
+        return 0;
+    // One blank more than the widest line: the system breaks a line that is exactly as wide as the
+    // tooltip (after "-" in a name, or at any character), as it would not one with room to spare.
+    int widest = 0;
+    for (const std::string& line : tip.lines)
+        widest = std::max(widest, measure(Unpadded(line)));
+    return std::min(widest + measure(" "), maxWidth);
+}
+
+std::string TooltipShownText(const ThumbTooltip& tip, int width,
+                             const std::function<int(const std::string&)>& measure,
+                             const LeadByteTable& lead) {
+    // The room of a line: one blank less than the tooltip's width (see TooltipWidthFor).
+    const int room = measure ? width - std::max(1, measure(" ")) : 0;
+    std::string text;
+    for (int i = 0; i < 3; ++i) {
+        const std::string line = Unpadded(tip.lines[i]);
+        if (i > 0)
+            text += "\r\n";
+        if (!measure || measure(line) <= room) {
+            text += line;
+            continue;
+        }
+        // The longest pieces that fit, at least one character each.
+        std::vector<std::size_t> starts = CharacterStarts(line, lead);
+        starts.push_back(line.size());
+        for (std::size_t from = 0; from + 1 < starts.size();) {
+            std::size_t to = from + 1;
+            while (to + 1 < starts.size() &&
+                   measure(line.substr(starts[from], starts[to + 1] - starts[from])) <= room)
+                ++to;
+            if (from > 0)
+                text += "\r\n";
+            text += line.substr(starts[from], starts[to] - starts[from]);
+            from = to;
+        }
+    }
+    return text;
+}

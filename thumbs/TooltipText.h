@@ -36,3 +36,18 @@ ThumbTooltip BuildTooltipForTime(const std::string& name, std::uint64_t size, st
 // blanks that pad it) as measure gives them in the tooltip's font. Narrower, a line would break inside
 // itself (between two Japanese or Chinese characters of a name); the blanks between the lines still break.
 int TooltipPixelWidth(const ThumbTooltip& tip, const std::function<int(const std::string&)>& measure);
+
+// The tooltip's width in pixels: its widest line (name, size text, date text, without the blanks that pad
+// them) as measure gives it in the tooltip's font and one blank, at most maxWidth (the screen's).
+int TooltipWidthFor(const ThumbTooltip& tip, int maxWidth,
+                    const std::function<int(const std::string&)>& measure);
+// The text the tooltip shows: the name, the size text and the date text, each on a line of its own
+// ("\r\n" between them). Padded with blanks, as `text` is, a tooltip would break the lines by the width
+// of the characters: a name of wide letters is wider than the blanks that pad the size text to its length,
+// and the size and the date ran into one line; a name wider than the screen needs a tooltip width that
+// no padding can hold (the system keeps at most 1024 characters of a tooltip's text).
+// A line wider than width (a name wider than the screen) is cut into lines that fit, between characters:
+// the system breaks lines at blanks and hyphens only.
+std::string TooltipShownText(const ThumbTooltip& tip, int width,
+                             const std::function<int(const std::string&)>& measure,
+                             const LeadByteTable& lead = ActiveLeadBytes());

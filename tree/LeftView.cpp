@@ -36,7 +36,8 @@ bool CChildView::PreTranslateMessage(MSG* pMsg) {
         return false;
     switch (pMsg->wParam) {
     case VK_ESCAPE:
-        PostAppResult(kAppCancel);
+        if (!TakeEscapeForMissingMenu())
+            PostAppResult(kAppCancel);
         return true;
     case VK_TAB:
         if (onFocusGrid)

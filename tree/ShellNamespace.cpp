@@ -15,15 +15,59 @@ std::string ShellDisplayName(IShellFolder* parentFolder, LPCITEMIDLIST relativeI
     return CShellString(name, relativeId).Text();
 }
 
+namespace {
+
+// The path the system gives for an absolute id, or empty. It may be cut: the system's functions hold
+// MAX_PATH characters (Wine cuts a longer path, Windows fails).
+std::string SystemPathOf(LPCITEMIDLIST absoluteId) {
+    char buffer[MAX_PATH] = "";
+    if (!SHGetPathFromIDListA(absoluteId, buffer))
+        return {};
+    return buffer;
+}
+
+// A path longer than the system's functions hold, put together from the parent's path and the item's
+// name in its folder as the file system knows it. Empty when the parent has no path (a virtual folder).
+std::string LongPathOf(LPCITEMIDLIST absoluteId, std::size_t capacity) {
+    LPCITEMIDLIST last = LastItemId(absoluteId);
+    const auto offset = static_cast<std::size_t>(reinterpret_cast<const BYTE*>(last) -
+                                                 reinterpret_cast<const BYTE*>(absoluteId));
+    if (!last || offset == 0)
+        return {};
+    CShellPidl parentId = CShellPidl::CopyOf(absoluteId);
+    if (!parentId)
+        return {};
+    reinterpret_cast<SHITEMID*>(reinterpret_cast<BYTE*>(parentId.get()) + offset)->cb = 0; // cut the last id
+    std::string parentPath;
+    if (!ShellFileSystemPath(parentId.get(), parentPath, capacity))
+        return {};
+    CDesktopFolderRef desktop;
+    IShellFolder* parent = BindShellFolder(desktop.get(), parentId.get());
+    if (!parent)
+        return {};
+    const std::string name = ShellDisplayName(parent, last, SHGDN_INFOLDER | SHGDN_FORPARSING);
+    parent->Release();
+    if (name.empty() || FindCharacter(name, '\\') != std::string::npos)
+        return {};
+    return WithSeparator(parentPath) + name;
+}
+
+} // namespace
+
 bool ShellFileSystemPath(LPCITEMIDLIST absoluteId, std::string& path, std::size_t capacity) {
     path.clear();
     if (!absoluteId)
         return false;
-    char buffer[MAX_PATH] = "";
-    if (!SHGetPathFromIDListA(absoluteId, buffer) || !buffer[0])
-        return false;
-    const std::string found(buffer);
-    if (found.size() + 1 > capacity)
+    std::string found = SystemPathOf(absoluteId);
+    // A path as long as the system's buffer holds may have been cut (it would name another folder), and
+    // one longer is not given at all (asked for by a caller that takes long paths): it is put together
+    // from its parent's.
+    if (found.empty() ? capacity > MAX_PATH : CharacterCount(found) >= MAX_PATH - 1) {
+        std::string whole = LongPathOf(absoluteId, kLongestPathChars + 1);
+        if (!whole.empty())
+            found = whole;
+    }
+    if (found.empty() || found.size() + 1 > capacity)
         return false;
     path = found;
     return true;

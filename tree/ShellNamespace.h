@@ -20,6 +20,9 @@ std::string ShellDisplayName(IShellFolder* parentFolder, LPCITEMIDLIST relativeI
 // or when removable; otherwise whether the shell says it has sub-folders.
 bool ShellHasChildren(IShellFolder* parentFolder, LPCITEMIDLIST relativeId, std::uint32_t flags);
 
+// The longest path the system names (\\?\ paths), in characters.
+constexpr std::size_t kLongestPathChars = 32767;
+
 // The file-system path of an absolute id in `path`; false (and `path` empty) for virtual folders and
 // for paths that do not fit `capacity` characters with their terminator.
 bool ShellFileSystemPath(LPCITEMIDLIST absoluteId, std::string& path, std::size_t capacity = MAX_PATH);

@@ -374,7 +374,14 @@ LRESULT CShellTreeCtrl::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
             Expand(item, TVE_EXPAND);
         return 0;
     }
+    case WM_KEYDOWN:
+    case WM_RBUTTONDOWN:
+    case WM_MBUTTONDOWN:
+    case WM_KILLFOCUS:
+        m_bMenuMissing = false; // the person has moved on
+        return CWaitingTreeCtrl::WindowProc(message, wParam, lParam);
     case WM_LBUTTONDOWN: {
+        m_bMenuMissing = false;
         // A click on the folder already selected changes no selection: it reads that folder again, so a
         // drawing another program added meanwhile shows.
         UINT flags = 0;
@@ -397,8 +404,10 @@ std::string CShellTreeCtrl::FolderPathOf(HTREEITEM item) const {
     std::string path;
     // The Desktop, the namespace's root, is not a folder of files here even where the shell gives it the
     // user's desktop directory: it holds My Computer, the network and the rest.
+    // Whole however long: a folder too long for the runtime is named by its own path and refused as such,
+    // not by a cut path that names another.
     if (node && ItemIdListSize(node->AbsoluteId()) > 0)
-        ShellFileSystemPath(node->AbsoluteId(), path);
+        ShellFileSystemPath(node->AbsoluteId(), path, kLongestPathChars + 1);
     return path;
 }
 
@@ -442,6 +451,39 @@ void CShellTreeCtrl::HighlightSelected(HTREEITEM item) {
     }
 }
 
+void CShellTreeCtrl::OnRightClick() {
+    CPoint screen;
+    ::GetCursorPos(&screen);
+    CPoint client = screen;
+    ::ScreenToClient(m_hWnd, &client);
+    UINT flags = 0;
+    HTREEITEM item = HitTest(client, &flags);
+    CPoint at = screen;
+    if (item && (flags & TVHT_ONITEM)) {
+        // Beside the folder it is for.
+        CRect text;
+        if (GetItemRect(item, &text, true)) {
+            ClientToScreen(&text);
+            at = CPoint(text.right, text.bottom);
+        }
+    } else {
+        // Beside an item's row, or below the items: the folder shown, the one highlighted.
+        item = GetDropHilightItem();
+        if (!item)
+            item = GetSelectedItem();
+    }
+    const HWND self = m_hWnd;
+    const bool shown = item && onFolderMenu && onFolderMenu(item, at);
+    if (::IsWindow(self))
+        m_bMenuMissing = !shown;
+}
+
+bool CShellTreeCtrl::TakeEscapeForMissingMenu() {
+    const bool missing = m_bMenuMissing;
+    m_bMenuMissing = false;
+    return missing;
+}
+
 bool CShellTreeCtrl::OnNotifyReflect(NMHDR* hdr, LRESULT* result) {
     const UINT code = AfxTreeNotifyCode(hdr->code);
     switch (code) {
@@ -473,17 +515,10 @@ bool CShellTreeCtrl::OnNotifyReflect(NMHDR* hdr, LRESULT* result) {
     case NM_KILLFOCUS:
         *result = 0;
         return true;
-    case NM_RCLICK: {
-        CPoint screen;
-        ::GetCursorPos(&screen);
-        CPoint client = screen;
-        ::ScreenToClient(m_hWnd, &client);
-        HTREEITEM item = HitTest(client);
-        if (item && onFolderMenu)
-            onFolderMenu(item, screen);
+    case NM_RCLICK:
+        OnRightClick();
         *result = 1; // the control's own handling would send a context-menu message too
         return true;
-    }
     default:
         return CWaitingTreeCtrl::OnNotifyReflect(hdr, result);
     }

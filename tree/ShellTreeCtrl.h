@@ -36,7 +36,9 @@ public:
     // A node without a file-system path (Desktop, My Computer) was selected: the grid is empty, and the
     // node's label names what is shown.
     std::function<void(const std::string& label)> onNoFolderShown;
-    std::function<void(HTREEITEM, CPoint)> onFolderMenu; // right click on a node (screen point)
+    // A right click in the tree: on a node, or below the items, where it stands for the selected
+    // (highlighted) folder. at: where the menu goes, on the screen. True when a menu was shown.
+    std::function<bool(HTREEITEM, CPoint at)> onFolderMenu;
     // The walk to the start folder has ended (WalkToStartLater); reached: a node was selected.
     std::function<void(bool reached)> onWalkEnded;
     void SetDocument(CTessel3Doc* doc) { m_pDoc = doc; }
@@ -85,6 +87,9 @@ public:
     // it opens: a tree control that gets the focus without a selection selects its first visible item,
     // which would scan a folder the user never asked for.
     void FollowSelection(bool follow) { m_bFollowSelection = follow; }
+    // Whether an Escape now answers a right click that opened no menu (My Computer has none): the person
+    // pressed it to close the menu they expected, not the explorer. Asking ends it: one Escape at most.
+    bool TakeEscapeForMissingMenu();
 
 protected:
     void PreSubclassWindow() override;
@@ -100,6 +105,7 @@ private:
     int PlainFolderIcon(const std::string& path, bool open) const;
     bool PopulateNode(HTREEITEM item, LPCITEMIDLIST absoluteId, std::uint32_t flags);
     void OnSelChanged(HTREEITEM item);
+    void OnRightClick();
     void HighlightSelected(HTREEITEM item);
     void WalkToStart();
     void TakeShellIcons();
@@ -114,4 +120,5 @@ private:
     bool m_bClosing = false; // the window is going: selection changes are no longer folder changes
     bool m_bFollowSelection = true;
     HTREEITEM m_hOpenLater = nullptr; // the node OpenPathTargetLater will expand; cleared when it goes
+    bool m_bMenuMissing = false;      // the last right click opened no menu, and nothing came since
 };

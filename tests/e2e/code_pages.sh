@@ -207,7 +207,7 @@ in_locale ja_JP.UTF-8 run "$(call_at "$lib932/tips")"
 heights=$(printf '%s\n' "$OUT" | sed -n 's/^\[script\] rect [-0-9]* [-0-9]* [0-9]* \([0-9]*\)$/\1/p' | tr '\n' ' ' | sed 's/ $//')
 tips=$(printf '%s\n' "$OUT" | sed -n 's/^\[script\] tooltip //p')
 expect_true "932: the tooltips name their drawings (got $(tr '\n' '|' <<<"$tips"))" \
-  [ "$(sed -n 1p <<<"$tips" | cut -d' ' -f1)" == "ソフトウェア設計図.dwg" ]
+  [ "$(sed -n 1p <<<"$tips" | sed 's/\\r\\n.*//')" == "ソフトウェア設計図.dwg" ]
 expect_true "932: a Japanese name's tooltip is as high as an English one's (got heights $heights)" \
   bash -c '[ $# -eq 2 ] && [ "$1" -eq "$2" ]' _ $heights
 

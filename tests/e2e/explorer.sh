@@ -107,7 +107,7 @@ script 'wait contains=".dwg" timeout=20000' \
 devhost --script "$(winpath "$WORK/script.txt")" --eval "$call"
 size=$(stat -c %s "$folder/$(ls "$folder" | grep -ix "$first")")
 tip=$(printf '%s\n' "$OUT" | sed -n 's/^\[script\] tooltip //p')
-if grep -qE "^$first +Size=$size +[0-9]{2}/[0-9]{2}/[0-9]{4};[0-9]{2}\.[0-9]{2}\.[0-9]{2} *$" <<<"$tip"; then
+if grep -qE "^$first\\\\r\\\\nSize=$size\\\\r\\\\n[0-9]{2}/[0-9]{2}/[0-9]{4};[0-9]{2}\.[0-9]{2}\.[0-9]{2}$" <<<"$tip"; then
   pass "the tooltip reads name, size and date"
 else
   fail "tooltip: '$tip'"

@@ -136,9 +136,9 @@ got_size=$(grid_order "${hnames[@]}")
   fail "by size: got '$got_size', expected '$want_size'"
 tips=$(printf '%s\n' "$OUT" | sed -n 's/^\[script\] tooltip //p')
 printf '%s\n' "$tips"
-grep -qE '^three-gib\.dwg +Size=3221225472 +[0-9]{2}/' <<<"$tips" && pass "the 3 GiB drawing's tooltip reads Size=3221225472" ||
+grep -qE '^three-gib\.dwg\\r\\nSize=3221225472\\r\\n[0-9]{2}/' <<<"$tips" && pass "the 3 GiB drawing's tooltip reads Size=3221225472" ||
   fail "3 GiB tooltip: $(head -1 <<<"$tips")"
-grep -qE '^five-gib\.dwg +Size=5368709120 +[0-9]{2}/' <<<"$tips" && pass "the 5 GiB drawing's tooltip reads Size=5368709120" ||
+grep -qE '^five-gib\.dwg\\r\\nSize=5368709120\\r\\n[0-9]{2}/' <<<"$tips" && pass "the 5 GiB drawing's tooltip reads Size=5368709120" ||
   fail "5 GiB tooltip: $(tail -1 <<<"$tips")"
 most=$(awk '{print $2}' "$io_log" 2>/dev/null | sort -n | tail -1)
 echo "most bytes read by one host process: ${most:-none seen}"

@@ -4,6 +4,7 @@
 #include "frame/MainFrame.h"
 #include "frame/MdiMixin.h"
 #include "hostapi/HostApi.h"
+#include "hostapi/NarrowText.h"
 #include "host/DialogRun.h"
 #include "settings/SettingsPath.h"
 #include "settings/Tessel3Doc.h"
@@ -650,7 +651,10 @@ TEST_F(ExplorerFrame, AcceptOfADrawingDeletedMeanwhileIsRefusedAndTheExplorerSta
     });
     EXPECT_EQ(Run(dialog), 2);
     EXPECT_TRUE(stillOpen);
-    EXPECT_EQ(said, "The drawing\n" + folder + "\\abc.dwg\nno longer exists. Choose another one.");
+    // A path longer than a line of the box is broken in lines.
+    EXPECT_EQ(said,
+              BreakLongWords("The drawing\n" + folder + "\\abc.dwg\nno longer exists. Choose another one.",
+                             kMessageWordChars));
     RemoveFolder(folder, files);
 }
 

@@ -4,6 +4,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+
 namespace {
 
 // Japanese (932)
@@ -171,6 +173,61 @@ TEST(NarrowText, LengthsForMessages) {
     EXPECT_EQ(CharactersAndBytes("C:\\\x83\x5C\x83\x74\x83\x67", LeadBytesOfCodePage(932)),
               "6 characters, 9 bytes");
     EXPECT_EQ(CharactersAndBytes("C:\\\x83\x5C\x83\x74\x83\x67", LeadBytesOfCodePage(1252)), "9 characters");
+}
+
+// The longest word of text (a run without blanks or line breaks), in characters: a message box wraps at
+// blanks, not inside a word.
+std::size_t LongestWord(const std::string& text, const LeadByteTable& lead) {
+    std::size_t longest = 0, line = 0;
+    for (std::size_t i = 0; i < text.size(); i = NextCharacter(text, i, lead)) {
+        line = text[i] == '\n' || text[i] == ' ' ? 0 : line + 1;
+        longest = std::max(longest, line);
+    }
+    return longest;
+}
+
+TEST(NarrowText, ALongWordIsBrokenIntoLinesThatKeepEveryCharacter) {
+    const std::string name = std::string(296, 'n') + ".dwg";
+    const std::string text = "Cannot rename to \"" + name + "\": the full path would be too long.";
+    const std::string broken = BreakLongWords(text, 64, CodePage(1252));
+    EXPECT_LE(LongestWord(broken, CodePage(1252)), 64u);
+    std::string joined = broken;
+    joined.erase(std::remove(joined.begin(), joined.end(), '\n'), joined.end());
+    EXPECT_EQ(joined, text);
+    // Short words and the line breaks already there are left alone.
+    EXPECT_EQ(BreakLongWords("The drawing\nC:\\a.dwg\nno longer exists.", 64, CodePage(1252)),
+              "The drawing\nC:\\a.dwg\nno longer exists.");
+    EXPECT_EQ(BreakLongWords(std::string(64, 'x'), 64, CodePage(1252)), std::string(64, 'x'));
+    EXPECT_EQ(BreakLongWords(std::string(65, 'x'), 64, CodePage(1252)), std::string(64, 'x') + "\nx");
+}
+
+TEST(NarrowText, ALongPathIsBrokenAfterABackslash) {
+    std::string path = "C:";
+    for (int i = 0; i < 30; ++i)
+        path += "\\folder" + std::to_string(i);
+    const std::string broken = BreakLongWords(path, 40, CodePage(1252));
+    EXPECT_LE(LongestWord(broken, CodePage(1252)), 40u);
+    for (std::size_t at = broken.find('\n'); at != std::string::npos; at = broken.find('\n', at + 1))
+        EXPECT_EQ(broken[at - 1], '\\') << broken;
+}
+
+TEST(NarrowText, ALongWordOfDoubleByteCharactersIsBrokenBetweenCharacters) {
+    // 表 ends in the byte of "\": a break after it would be a break inside the character before.
+    std::string word;
+    for (int i = 0; i < 50; ++i)
+        word += kHyo932;
+    const std::string broken = BreakLongWords(word, 20, CodePage(932));
+    EXPECT_EQ(broken.size(), word.size() + 2);
+    for (std::size_t at = broken.find('\n'); at != std::string::npos; at = broken.find('\n', at + 1))
+        EXPECT_EQ(at % 41, 40u) << at; // 20 characters of two bytes, then the break
+}
+
+TEST(NarrowText, UnicodeTextIsBrokenTheSameWay) {
+    const std::wstring name(300, L'n');
+    const std::wstring broken = BreakLongWords(L"Cannot paste:\n" + name, 64);
+    EXPECT_EQ(broken, L"Cannot paste:\n" + std::wstring(64, L'n') + L"\n" + std::wstring(64, L'n') + L"\n" +
+                          std::wstring(64, L'n') + L"\n" + std::wstring(64, L'n') + L"\n" +
+                          std::wstring(44, L'n'));
 }
 
 } // namespace

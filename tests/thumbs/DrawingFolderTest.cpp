@@ -4,6 +4,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+
 #include <map>
 #include <string>
 #include <vector>
@@ -128,14 +130,33 @@ TEST_F(DrawingFolderTest, AFolderThatCannotBeReadIsShownEmptyAndTheCurrentDirect
     EXPECT_EQ(doc.m_strPath, "C:\\gone"); // title, settings and list name one folder
 }
 
-TEST_F(DrawingFolderTest, RefreshReadsTheSameFolderAgainAndDropsTheChoice) {
+TEST_F(DrawingFolderTest, RefreshReadsTheSameFolderAgainAndKeepsTheChoiceWhileItIsThere) {
     folder.Show("C:\\dwg");
     folder.Choose(1);
-    reader.folders["C:\\dwg"].push_back(Drawing("new.dwg"));
+    const int chosenBefore = chosen;
+    reader.folders["C:\\dwg"].insert(reader.folders["C:\\dwg"].begin(), Drawing("new.dwg"));
     EXPECT_TRUE(folder.Refresh());
     EXPECT_EQ(folder.Count(), 4);
-    EXPECT_EQ(folder.Chosen(), -1);
     EXPECT_EQ(reader.reads.size(), 2u);
+    // F5 or a file command: the drawing chosen (by a search, a click) is still the one chosen, selected.
+    ASSERT_GE(folder.Chosen(), 0);
+    EXPECT_EQ(folder.ChosenName(), "a.dwg");
+    EXPECT_TRUE(folder.IsSelected(folder.Chosen()));
+    EXPECT_EQ(doc.m_strName, "a.dwg");
+    EXPECT_EQ(chosen, chosenBefore + 1); // its owner heard it
+    // Gone meanwhile: nothing is chosen.
+    auto& files = reader.folders["C:\\dwg"];
+    files.erase(
+        std::remove_if(files.begin(), files.end(), [](const DwgData& d) { return d.m_strName == "a.dwg"; }),
+        files.end());
+    EXPECT_TRUE(folder.Refresh());
+    EXPECT_EQ(folder.Chosen(), -1);
+    EXPECT_EQ(doc.m_strName, "");
+    // Another folder: the choice does not follow.
+    folder.Show("C:\\dwg");
+    folder.Choose(0);
+    folder.Show("C:\\");
+    EXPECT_EQ(folder.Chosen(), -1);
 }
 
 TEST_F(DrawingFolderTest, NoFolderEmptiesTheListAndKeepsTheFolderAndTheCurrentDirectory) {

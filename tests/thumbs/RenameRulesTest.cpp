@@ -43,7 +43,7 @@ TEST(RenameRules, ForbiddenCharactersAreRefused) {
 }
 
 TEST(RenameRules, ANameMustEndInTheDrawingExtension) {
-    for (const char* bad : {"plan", "plan.dw", "plan.dwgx", "plan.dwg.bak", ".dwg", "plan.dwg ", "plan.dwg."})
+    for (const char* bad : {"plan", "plan.dw", "plan.dwgx", "plan.dwg.bak", "dwg", "plan.dwg ", "plan.dwg."})
         EXPECT_EQ(Check(bad), RenameVerdict::NotDrawing) << bad;
     EXPECT_EQ(RenameRefusalText(RenameVerdict::NotDrawing, "plan.txt"),
               "Cannot rename to \"plan.txt\": a drawing's name ends in .dwg.");
@@ -65,6 +65,14 @@ TEST(RenameRules, AnExistingNameIsRefused) {
     int asked = 0;
     CheckRename(kFolder, "plan.dwg", "a*.dwg", [&asked](const std::string&) { return ++asked, true; });
     EXPECT_EQ(asked, 0);
+}
+
+TEST(RenameRules, TheExtensionAloneIsAnEmptyName) {
+    EXPECT_EQ(Check(".dwg"), RenameVerdict::Empty);
+    EXPECT_EQ(Check(".DWG"), RenameVerdict::Empty);
+    EXPECT_EQ(RenameRefusalText(RenameVerdict::Empty, ".dwg"),
+              "Cannot rename to \".dwg\": the name before .dwg is empty.");
+    EXPECT_EQ(Check("a.dwg"), RenameVerdict::Rename);
 }
 
 TEST(RenameRules, EmptyAndTooLongNamesAreRefused) {

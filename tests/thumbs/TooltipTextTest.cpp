@@ -132,3 +132,70 @@ TEST(TooltipText, JapaneseNameCountsCharactersAndSetsTheWidth) {
     };
     EXPECT_EQ(TooltipPixelWidth(tip, japanese), 10 * 12 + 10 * 7);
 }
+
+namespace {
+
+// Every character 7 pixels wide, a W 11, a blank 3.
+int FakeWidth(const std::string& text) {
+    int width = 0;
+    for (const char c : text)
+        width += c == ' ' ? 3 : (c == 'W' || c == 'w') ? 11 : 7;
+    return width;
+}
+
+std::tm SomeTime() {
+    std::tm local{};
+    local.tm_year = 2021 - 1900;
+    local.tm_mon = 2;
+    local.tm_mday = 5;
+    return local;
+}
+
+} // namespace
+
+TEST(TooltipShownText, NameSizeAndDateOnLinesOfTheirOwnWhateverTheirWidths) {
+    // A name of wide letters is wider than the blanks that pad the size text to its length.
+    const std::tm local = SomeTime();
+    const ThumbTooltip tip = BuildTooltip(std::string(40, 'w') + ".dwg", 1234, &local);
+    const int width = TooltipWidthFor(tip, 1000, FakeWidth);
+    EXPECT_EQ(width, 41 * 11 + 3 * 7 + 3); // the name (".dwg" holds a w too) and a blank
+    EXPECT_EQ(TooltipShownText(tip, width, FakeWidth),
+              std::string(40, 'w') + ".dwg\r\nSize=1234\r\n05/03/2021;00.00.00");
+}
+
+TEST(TooltipShownText, ANameWiderThanTheScreenIsCutIntoLinesThatFit) {
+    const std::tm local = SomeTime();
+    const std::string name = std::string(200, 'W') + ".dwg";
+    const ThumbTooltip tip = BuildTooltip(name, 1, &local);
+    const int width = TooltipWidthFor(tip, 1000, FakeWidth);
+    EXPECT_EQ(width, 1000);
+    const std::string text = TooltipShownText(tip, width, FakeWidth);
+    std::string joined;
+    std::size_t lines = 0;
+    for (std::size_t from = 0;;) {
+        const std::size_t end = text.find("\r\n", from);
+        const std::string line = text.substr(from, end == std::string::npos ? std::string::npos : end - from);
+        EXPECT_LE(FakeWidth(line), width - 3) << line;
+        ++lines;
+        if (end == std::string::npos)
+            break;
+        if (lines <= 3)
+            joined += line;
+        from = end + 2;
+    }
+    EXPECT_EQ(lines, 5u); // 2,200 pixels of name in lines of 997: three, then the size and the date
+    EXPECT_EQ(joined, name);
+}
+
+TEST(TooltipShownText, ADoubleByteNameIsCutBetweenCharacters) {
+    const std::tm local = SomeTime();
+    std::string name;
+    for (int i = 0; i < 30; ++i)
+        name += "\x95\x5C"; // 表: its second byte is a backslash
+    const ThumbTooltip tip = BuildTooltip(name, 1, &local, LeadBytesOfCodePage(932));
+    const auto measure = [](const std::string& text) { return static_cast<int>(text.size()) * 5; };
+    const std::string text = TooltipShownText(tip, 100, measure, LeadBytesOfCodePage(932));
+    const std::string first = text.substr(0, text.find("\r\n"));
+    EXPECT_EQ(first.size() % 2, 0u) << "cut inside a character";
+    EXPECT_LE(static_cast<int>(first.size()) * 5, 100);
+}

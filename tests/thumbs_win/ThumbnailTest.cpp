@@ -2,13 +2,16 @@
 // context menu, rename in the label, and the search of the frame's search edit.
 #include "GridTestSupport.h"
 
+#include "hostapi/TextConv.h"
 #include "res/resource.h"
 #include "tests/support/TempFolder.h"
 #include "thumbs/ThumbSearch.h"
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <ctime>
+#include <vector>
 
 namespace {
 
@@ -173,14 +176,15 @@ TEST(ThumbnailTooltip, NameSizeAndLocalDateInOneNarrowTip) {
     Pump();
     ASSERT_NE(tip.m_hWnd, nullptr);
     EXPECT_EQ(tip.GetToolCount(), 1);
-    // As wide as the widest line, the date (the other lines are shorter with their blanks), in the
-    // tooltip's font: three lines, none broken inside.
+    // As wide as the widest line, the date, and a blank, in the tooltip's font: three lines, none broken
+    // inside.
     {
         CClientDC dc(tip.m_hWnd);
         const CSelectObject font(dc.GetSafeHdc(), reinterpret_cast<HGDIOBJ>(tip.SendMessage(WM_GETFONT)));
-        SIZE date{};
+        SIZE date{}, blank{};
         ::GetTextExtentPoint32A(dc.GetSafeHdc(), "05/03/2021;14.07.09", 19, &date);
-        EXPECT_EQ(tip.SendMessage(TTM_GETMAXTIPWIDTH), date.cx);
+        ::GetTextExtentPoint32A(dc.GetSafeHdc(), " ", 1, &blank);
+        EXPECT_EQ(tip.SendMessage(TTM_GETMAXTIPWIDTH), date.cx + blank.cx);
     }
     char text[256] = {};
     TTTOOLINFOA ti{};
@@ -189,7 +193,8 @@ TEST(ThumbnailTooltip, NameSizeAndLocalDateInOneNarrowTip) {
     ti.uId = reinterpret_cast<UINT_PTR>(control->m_hWnd);
     ti.lpszText = text;
     tip.SendMessage(TTM_GETTEXTA, sizeof text, reinterpret_cast<LPARAM>(&ti));
-    EXPECT_EQ(std::string(text), expected);
+    // Shown on lines of their own, whatever the widths of the characters.
+    EXPECT_EQ(std::string(text), "a.dwg\r\nSize=1234\r\n05/03/2021;14.07.09");
 }
 
 // ---- rename -------------------------------------------------------------------------------------------
@@ -562,6 +567,113 @@ TEST(ThumbnailRename, SunkenEdgeAroundTheLabelOnlyWhileRenaming) {
     Pump();
     ViewPicture after(bench.view());
     EXPECT_EQ(after.At(edge.left, edge.top + 3), background);
+}
+
+// What the screen shows of a window's client area, row by row.
+std::vector<COLORREF> ScreenPixels(HWND hwnd) {
+    const CRect client = CWnd::FromHandle(hwnd)->GetClientRect();
+    HDC screen = ::GetDC(hwnd);
+    HDC memory = ::CreateCompatibleDC(screen);
+    HBITMAP bitmap = ::CreateCompatibleBitmap(screen, client.Width(), client.Height());
+    HGDIOBJ old = ::SelectObject(memory, bitmap);
+    ::BitBlt(memory, 0, 0, client.Width(), client.Height(), screen, 0, 0, SRCCOPY);
+    std::vector<COLORREF> pixels;
+    for (int y = 0; y < client.Height(); ++y)
+        for (int x = 0; x < client.Width(); ++x)
+            pixels.push_back(::GetPixel(memory, x, y));
+    ::SelectObject(memory, old);
+    ::DeleteObject(bitmap);
+    ::DeleteDC(memory);
+    ::ReleaseDC(hwnd, screen);
+    return pixels;
+}
+
+// Two drawings whose long names differ only at their start, in a folder of their own.
+class LongNames : public ::testing::Test {
+protected:
+    void SetUp() override {
+        const std::string tail(90, 'x');
+        m_folder.Write("alpha-" + tail + ".dwg", "not a drawing");
+        m_folder.Write("bravo-" + tail + ".dwg", "not a drawing");
+    }
+    // Shows the folder in the bench's folder model.
+    void Show() {
+        ASSERT_TRUE(ShowFolder(m_folder.Dir()));
+        ASSERT_EQ(DwgList.GetSize(), 2);
+    }
+    TempFolder m_folder{"orvex-labels"};
+};
+
+TEST_F(LongNames, SelectedLabelsShowTheStartOfTheirNames) {
+    GridBench bench;
+    Show();
+    bench.view().Rebuild();
+    Pump();
+    Click(bench.view().ControlOf(0), MK_LBUTTON);
+    Click(bench.view().ControlOf(1), MK_LBUTTON | MK_CONTROL);
+    ASSERT_TRUE(LabelHighlighted(bench.view().ControlOf(0)));
+    ASSERT_TRUE(LabelHighlighted(bench.view().ControlOf(1)));
+    CThumbLabel& first = bench.view().ControlOf(0)->Label();
+    CThumbLabel& second = bench.view().ControlOf(1)->Label();
+    first.RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
+    second.RedrawWindow(nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
+    Pump();
+    // Shown from their ends, the two would be the same picture.
+    EXPECT_NE(ScreenPixels(first.m_hWnd), ScreenPixels(second.m_hWnd));
+    CClientDC dc(first.m_hWnd);
+    EXPECT_EQ(first.ShownText(dc.GetSafeHdc()).substr(0, 6), L"alpha-");
+    EXPECT_EQ(second.ShownText(dc.GetSafeHdc()).substr(0, 6), L"bravo-");
+    // The highlight is drawn: the label's first text pixels are in the selection's colour.
+    const std::vector<COLORREF> pixels = ScreenPixels(first.m_hWnd);
+    EXPECT_NE(std::find(pixels.begin(), pixels.end(), Nearest(bench.view(), ::GetSysColor(COLOR_HIGHLIGHT))),
+              pixels.end());
+}
+
+TEST_F(LongNames, ANameCutAtTheSmallestSizeEndsInAnEllipsis) {
+    GridBench bench;
+    Show();
+    bench.view().Rebuild();
+    Pump();
+    for (int i = 0; i < 20; ++i) // smaller and smaller, down to the smallest size
+        bench.view().SendMessage(WM_COMMAND, ID_VIEW_DECREASE);
+    Pump();
+    ASSERT_NE(bench.view().ControlOf(0), nullptr);
+    CThumbLabel& label = bench.view().ControlOf(0)->Label();
+    CClientDC dc(label.m_hWnd);
+    const std::wstring shown = label.ShownText(dc.GetSafeHdc());
+    ASSERT_GE(shown.size(), 4u);
+    EXPECT_EQ(shown.substr(shown.size() - 3), L"...");
+    EXPECT_EQ(shown.substr(0, 1), L"a");
+    // The text of the window is still the whole name.
+    EXPECT_EQ(label.GetWindowText(), DwgList[0].m_strName);
+    // What the screen shows is that text with its ellipsis, drawn in the label's font where an edit puts
+    // its text (not the name cut at the label's edge).
+    const std::vector<COLORREF> pixels = ScreenPixels(label.m_hWnd);
+    const CRect client = label.GetClientRect();
+    HDC memory = ::CreateCompatibleDC(dc.GetSafeHdc());
+    HBITMAP bitmap = ::CreateCompatibleBitmap(dc.GetSafeHdc(), client.Width(), client.Height());
+    HGDIOBJ oldBitmap = ::SelectObject(memory, bitmap);
+    HBRUSH background = ::CreateSolidBrush(pixels.front());
+    ::FillRect(memory, &client, background);
+    ::DeleteObject(background);
+    HGDIOBJ oldFont = ::SelectObject(memory, reinterpret_cast<HGDIOBJ>(label.SendMessage(WM_GETFONT)));
+    ::SetTextColor(memory, ::GetSysColor(COLOR_WINDOWTEXT));
+    ::SetBkMode(memory, TRANSPARENT);
+    const DWORD margins = static_cast<DWORD>(label.SendMessage(EM_GETMARGINS));
+    CRect text = client;
+    text.left += LOWORD(margins);
+    text.right -= HIWORD(margins);
+    ::DrawTextW(memory, shown.c_str(), static_cast<int>(shown.size()), &text, DT_SINGLELINE | DT_NOPREFIX);
+    std::vector<COLORREF> expected;
+    for (int y = 0; y < client.Height(); ++y)
+        for (int x = 0; x < client.Width(); ++x)
+            expected.push_back(::GetPixel(memory, x, y));
+    if (oldFont)
+        ::SelectObject(memory, oldFont);
+    ::SelectObject(memory, oldBitmap);
+    ::DeleteObject(bitmap);
+    ::DeleteDC(memory);
+    EXPECT_TRUE(pixels == expected) << "the label does not show " << NarrowAnsi(shown);
 }
 
 TEST(ThumbnailTooltip, ActiveOnceTheMouseMovesOverThePicture) {

@@ -2,6 +2,7 @@
 // folder's sub-folders, against Wine's shell.
 #include "ShellTestSupport.h"
 #include "tests/support/TempFolder.h"
+#include "hostapi/TextConv.h"
 #include "tree/ShellString.h"
 
 #include <cstring>
@@ -88,6 +89,41 @@ TEST_F(ShellTest, FileSystemPathRefusesWhatDoesNotFit) {
     CShellPidl desktopId;
     ASSERT_EQ(SHGetSpecialFolderLocation(nullptr, CSIDL_DRIVES, desktopId.Receive()), S_OK);
     EXPECT_FALSE(ShellFileSystemPath(desktopId.get(), path)); // a virtual folder has none
+}
+
+TEST_F(ShellTest, FileSystemPathOfAFolderLongerThanTheRuntimesLimitIsWhole) {
+    // A folder whose path is longer than MAX_PATH, reached as the tree reaches it: its parent's children.
+    testsupport::TempFolder folder("tree-long");
+    const std::string segment(60, 'd');
+    std::string parentPath = folder.Dir();
+    for (int i = 0; i < 3; ++i) {
+        parentPath += "\\" + segment;
+        ASSERT_TRUE(::CreateDirectoryA(parentPath.c_str(), nullptr)) << parentPath;
+    }
+    const std::string childName(60, 'e');
+    const std::string childPath = parentPath + "\\" + childName;
+    ASSERT_GT(childPath.size(), static_cast<std::size_t>(MAX_PATH));
+    ASSERT_TRUE(::CreateDirectoryW((L"\\\\?\\" + WidenAnsi(childPath)).c_str(), nullptr));
+    CDesktopFolderRef desktop;
+    ASSERT_TRUE(desktop);
+    const CShellPidl parentId = PidlOfPath(parentPath);
+    ASSERT_TRUE(parentId);
+    IShellFolder* parent = BindShellFolder(desktop.get(), parentId.get());
+    ASSERT_NE(parent, nullptr);
+    IEnumIDList* children = nullptr;
+    ASSERT_EQ(parent->EnumObjects(nullptr, SHCONTF_FOLDERS, &children), S_OK);
+    LPITEMIDLIST child = nullptr;
+    ASSERT_EQ(children->Next(1, &child, nullptr), S_OK);
+    const CShellPidl relative(child);
+    const CShellPidl childId = CShellPidl::Concat(parentId.get(), relative.get());
+    children->Release();
+    parent->Release();
+    std::string path;
+    ASSERT_TRUE(ShellFileSystemPath(childId.get(), path, kLongestPathChars + 1));
+    EXPECT_EQ(lstrcmpiA(path.c_str(), childPath.c_str()), 0) << path;
+    // Too long for the runtime's buffers: not given where those are meant.
+    EXPECT_FALSE(ShellFileSystemPath(childId.get(), path));
+    ::RemoveDirectoryW((L"\\\\?\\" + WidenAnsi(childPath)).c_str());
 }
 
 TEST_F(ShellTest, LabelsAndChildIndicators) {
