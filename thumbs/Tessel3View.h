@@ -231,6 +231,11 @@ private:
     int SheetMargin() const;
     void LineUp();
     void LineDown();
+    void PageUp();
+    void PageDown();
+    // The first row of the last page, and the scroll bar's largest position: the two ends the thumb maps.
+    int LastFirstRow() const;
+    int BarMaxPos() const;
     void ApplyLineStep(const grid::LineStep& step, const grid::ScrollState& before,
                        const grid::ScrollState& after, int direction);
     grid::ScrollState CurrentScrollState() const;
