@@ -961,8 +961,8 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
         Fact(DescribeScrollBar(WaitForWindow(command)));
         break;
     case Kind::Redraw: {
-        // As another window moving off it would: the whole window is to be painted again, background
-        // first, by its own thread when that thread takes its messages.
+        // As another window moving off it would: the whole window painted again, background first; the
+        // paint is sent to the window's own thread, and this waits until that thread has taken it.
         WaitForWindow(command);
         for (HWND hwnd : FindWindows(command.window))
             RedrawWindow(hwnd, nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_FRAME | RDW_UPDATENOW);
