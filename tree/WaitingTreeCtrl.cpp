@@ -263,7 +263,7 @@ void CWaitingTreeCtrl::Populate(HTREEITEM node) {
             tvi.hItem = node;
             tvi.cChildren = 1;
             SetItem(&tvi);
-            SetItemState(node, 0, TVIS_EXPANDED);
+            SetItemState(node, 0, TVIS_EXPANDED | TVIS_EXPANDEDONCE);
         }
     } else if (node != TVI_ROOT) {
         if (keepButtonOnlyWithChildren) {
