@@ -161,7 +161,20 @@ const CommandName kCommands[] = {
     {L"clipboard-text", ScriptCommand::Kind::ClipboardText, false, false},
     {L"post", ScriptCommand::Kind::Post, true, true},
     {L"call", ScriptCommand::Kind::Call, false, false},
+    {L"drag", ScriptCommand::Kind::Drag, true, true},
+    {L"scrollbar", ScriptCommand::Kind::ScrollBar, true, true},
+    {L"redraw", ScriptCommand::Kind::Redraw, true, true},
+    {L"windows", ScriptCommand::Kind::Windows, true, false},
 };
+
+// One coordinate of to=: a number of pixels (negative from the right or bottom with window-at) or a share
+// of the side in percent.
+bool ParseCoordinate(std::wstring_view text, int& value, bool& percent) {
+    percent = !text.empty() && text.back() == L'%';
+    if (percent)
+        text.remove_suffix(1);
+    return ParseInt(text, value, !percent) && (!percent || value <= 100);
+}
 
 bool TakesTreePath(ScriptCommand::Kind kind) {
     return kind == ScriptCommand::Kind::TreeSelect || kind == ScriptCommand::Kind::TreeExpand ||
@@ -252,6 +265,26 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
             command.hasPoint = true;
             continue;
         }
+        if (key == L"to" && command.kind == ScriptCommand::Kind::Drag) {
+            const std::size_t comma = value.find(L',');
+            if (comma == std::wstring::npos ||
+                !ParseCoordinate(std::wstring_view(value).substr(0, comma), command.toX,
+                                 command.toXPercent) ||
+                !ParseCoordinate(std::wstring_view(value).substr(comma + 1), command.toY,
+                                 command.toYPercent)) {
+                error = L"to= takes X,Y (pixels, or a percentage such as 50%): " + token;
+                return false;
+            }
+            command.hasTo = true;
+            continue;
+        }
+        if (key == L"steps" && command.kind == ScriptCommand::Kind::Drag) {
+            if (!ParseInt(value, command.steps) || command.steps < 1 || command.steps > 1000) {
+                error = L"steps= takes a number from 1 to 1000: " + token;
+                return false;
+            }
+            continue;
+        }
         if (key == L"path" && TakesTreePath(command.kind)) {
             if (value.empty()) {
                 error = L"path= takes a tree item's labels joined by backslashes: " + token;
@@ -285,6 +318,16 @@ bool ReadLine(const std::vector<std::wstring>& tokens, ScriptCommand& command, s
         return false;
     }
     switch (command.kind) {
+    case ScriptCommand::Kind::Drag:
+        if (!command.hasTo) {
+            error = L"drag needs to=X,Y, where the button is let go";
+            return false;
+        }
+        if (!positional.empty()) {
+            error = L"unexpected " + positional[0];
+            return false;
+        }
+        return true;
     case ScriptCommand::Kind::Sleep:
         if (positional.size() != 1 || !ParseInt(positional[0], command.ms)) {
             error = L"sleep takes milliseconds";

@@ -64,7 +64,11 @@ struct ScriptCommand {
         Remove,
         ClipboardText,
         Post,
-        Call
+        Call,
+        Drag,
+        ScrollBar,
+        Redraw,
+        Windows
     };
     int line = 0;
     Kind kind = Kind::Echo;
@@ -73,6 +77,12 @@ struct ScriptCommand {
     bool hasPoint = false;    // at=X,Y: a point of the window's client area
     bool windowPoint = false; // window-at=X,Y: a point of the whole window (negative: from right/bottom)
     int x = 0, y = 0;
+    // drag: to=X,Y, where the button is let go, in the same kind of point as at= / window-at=; a value
+    // ending in % is that share of the window's (or client area's) width or height.
+    bool hasTo = false;
+    int toX = 0, toY = 0;
+    bool toXPercent = false, toYPercent = false;
+    int steps = 8;                   // drag: steps=N, pointer moves between press and release
     unsigned modifiers = 0;          // with=ctrl+shift+alt
     std::vector<KeyChord> keys;      // key
     std::wstring text;               // type, echo, clipboard-text

@@ -6,6 +6,7 @@
 #include "devhost/HostWindows.h"
 #include "devhost/Output.h"
 #include "devhost/Text.h"
+#include "devhost/Timing.h"
 #include "thumbs/AppMessages.h"
 
 #include <commctrl.h>
@@ -251,6 +252,73 @@ void Click(HWND hwnd, const ScriptCommand& command) {
     Send(inputs);
 }
 
+// The screen point where a drag lets go: to=X,Y as at= or window-at= reads it, a percentage being that
+// share of the window's (or client area's) width or height.
+POINT DropPoint(HWND hwnd, const ScriptCommand& command) {
+    RECT area{};
+    if (command.windowPoint)
+        GetWindowRect(hwnd, &area);
+    else
+        GetClientRect(hwnd, &area);
+    auto coordinate = [](int value, bool percent, LONG low, LONG high, bool fromEnd) {
+        if (percent)
+            return static_cast<LONG>(low + MulDiv(high - low, value, 100));
+        return fromEnd && value < 0 ? high + value : low + value;
+    };
+    POINT point{coordinate(command.toX, command.toXPercent, area.left, area.right, command.windowPoint),
+                coordinate(command.toY, command.toYPercent, area.top, area.bottom, command.windowPoint)};
+    if (!command.windowPoint)
+        ClientToScreen(hwnd, &point);
+    return point;
+}
+
+// Presses the left button at the command's point, moves the pointer to the drop point in steps (as a hand
+// does: the window sees each move while the button is down) and lets go there.
+void Drag(HWND hwnd, const ScriptCommand& command) {
+    const POINT from = TargetPoint(hwnd, command);
+    const POINT to = DropPoint(hwnd, command);
+    MovePointer(from);
+    Sleep(30);
+    std::vector<INPUT> press;
+    AddMouse(press, MOUSEEVENTF_LEFTDOWN);
+    Send(press);
+    Sleep(60);
+    for (int i = 1; i <= command.steps; ++i) {
+        MovePointer({from.x + MulDiv(to.x - from.x, i, command.steps),
+                     from.y + MulDiv(to.y - from.y, i, command.steps)});
+        Sleep(40);
+    }
+    Sleep(100);
+    std::vector<INPUT> release;
+    AddMouse(release, MOUSEEVENTF_LEFTUP);
+    Send(release);
+}
+
+// The vertical scroll bar of a window: its SCROLLINFO and where its thumb is, in the window's coordinates
+// (from its top, as window-at= counts).
+std::wstring DescribeScrollBar(HWND hwnd) {
+    SCROLLINFO info{};
+    info.cbSize = sizeof info;
+    info.fMask = SIF_ALL;
+    if (!GetScrollInfo(hwnd, SB_VERT, &info))
+        return L"scrollbar none";
+    SCROLLBARINFO bar{};
+    bar.cbSize = sizeof bar;
+    RECT window{};
+    GetWindowRect(hwnd, &window);
+    int thumbTop = -1, thumbBottom = -1, troughTop = -1, troughBottom = -1;
+    if (GetScrollBarInfo(hwnd, static_cast<LONG>(OBJID_VSCROLL), &bar)) {
+        thumbTop = bar.rcScrollBar.top - window.top + bar.xyThumbTop;
+        thumbBottom = bar.rcScrollBar.top - window.top + bar.xyThumbBottom;
+        troughTop = bar.rcScrollBar.top - window.top + bar.dxyLineButton;
+        troughBottom = bar.rcScrollBar.bottom - window.top - bar.dxyLineButton;
+    }
+    return L"scrollbar pos=" + std::to_wstring(info.nPos) + L" min=" + std::to_wstring(info.nMin) + L" max=" +
+           std::to_wstring(info.nMax) + L" page=" + std::to_wstring(info.nPage) + L" thumb=" +
+           std::to_wstring(thumbTop) + L"," + std::to_wstring(thumbBottom) + L" trough=" +
+           std::to_wstring(troughTop) + L"," + std::to_wstring(troughBottom);
+}
+
 void PressKeys(const ScriptCommand& command) {
     for (const KeyChord& chord : command.keys) {
         std::vector<INPUT> inputs;
@@ -259,6 +327,7 @@ void PressKeys(const ScriptCommand& command) {
         AddKey(inputs, chord.virtualKey, true);
         AddModifiers(inputs, chord.modifiers, true);
         Send(inputs);
+        TimingInputSent(L"key " + std::to_wstring(chord.virtualKey));
         Sleep(30);
     }
 }
@@ -853,6 +922,16 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
                  std::to_wstring(rect.right - rect.left) + L" " + std::to_wstring(rect.bottom - rect.top));
         }
         break;
+    case Kind::Windows:
+        // Where each match is and what it says: which thumbnails a grid shows, in one look.
+        for (HWND hwnd : FindWindows(command.window)) {
+            RECT rect{};
+            GetWindowRect(hwnd, &rect);
+            Fact(L"window " + std::to_wstring(rect.left) + L" " + std::to_wstring(rect.top) + L" " +
+                 std::to_wstring(rect.right - rect.left) + L" " + std::to_wstring(rect.bottom - rect.top) +
+                 L" " + EscapeControls(TextOf(hwnd)));
+        }
+        break;
     case Kind::Enabled:
         Fact(L"enabled " + YesNo(IsWindowEnabled(WaitForWindow(command))));
         break;
@@ -871,6 +950,23 @@ bool ScriptRunner::Execute(const ScriptCommand& command) {
             throw ScriptError{L"the host's frame cannot take the call"};
         expression.release(); // the frame's now
         Fact(L"call posted");
+        Sleep(kSettleMs);
+        break;
+    }
+    case Kind::Drag:
+        Drag(WaitForWindow(command), command);
+        Sleep(kSettleMs);
+        break;
+    case Kind::ScrollBar:
+        Fact(DescribeScrollBar(WaitForWindow(command)));
+        break;
+    case Kind::Redraw: {
+        // As another window moving off it would: the whole window painted again, background first; the
+        // paint is sent to the window's own thread, and this waits until that thread has taken it.
+        WaitForWindow(command);
+        for (HWND hwnd : FindWindows(command.window))
+            RedrawWindow(hwnd, nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_FRAME | RDW_UPDATENOW);
+        Fact(L"redraw");
         Sleep(kSettleMs);
         break;
     }

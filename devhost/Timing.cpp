@@ -5,6 +5,7 @@
 #include "devhost/ImportPatch.h"
 #include "devhost/Output.h"
 
+#include <atomic>
 #include <cstdint>
 #include <cstdio>
 #include <cstring>
@@ -25,7 +26,7 @@ HHOOK g_hook = nullptr;
 HHOOK g_cbtHook = nullptr;
 HHOOK g_sentHook = nullptr;
 bool g_afterKey = false;
-bool g_inCall = false;
+std::atomic<bool> g_inCall{false}; // read by the script thread too (input marks)
 long g_scanEntries = 0;
 DWORD g_uiThread = 0;
 
@@ -417,6 +418,13 @@ void TimingCallBegins() {
         delete g_pinger;
         g_pinger = nullptr;
     }
+}
+
+void TimingInputSent(const std::wstring& what) {
+    // The clock is read from the script's thread; the overhead it subtracts may be a line behind.
+    if (!Host().options.timing || !g_inCall)
+        return;
+    Line(Elapsed(), L"input " + what);
 }
 
 void TimingCallEnded() {

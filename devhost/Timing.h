@@ -1,6 +1,7 @@
 // --timing: "[timing] MS WHAT ..." lines that let a benchmark see how fast the library answers, MS being
 // milliseconds (three decimals) since the running LISP call began, less the time devhost spent measuring
-// (counting windows, writing these lines). Used on the user-interface thread only.
+// (counting windows, writing these lines). Used on the user-interface thread, but for the script's input
+// marks.
 //
 //   [timing] 0.000 call                   the call begins (the clock starts)
 //   [timing] MS preview DRAWN/VISIBLE NAME a preview was drawn into a window, by the host's preview
@@ -32,9 +33,12 @@
 //   [timing] MS settings-open NAME        it opened that file to read it
 //   [timing] MS scan-begin PATTERN        the library began a folder search
 //   [timing] MS scan-end N entries        it closed the search after N entries
+//   [timing] MS input key VK              the script sent a key press (from the script's thread)
 #pragma once
 
 #include <windows.h>
+
+#include <string>
 
 namespace devhost {
 
@@ -43,5 +47,7 @@ void TimingWatchLibrary(HMODULE library);
 void TimingCallBegins();
 void TimingCallEnded();
 void TimingPreviewDrawn(HWND window, const wchar_t* fileName);
+// The script sent input (WHAT, e.g. "key 27"), during a call: "[timing] MS input WHAT". Any thread.
+void TimingInputSent(const std::wstring& what);
 
 } // namespace devhost

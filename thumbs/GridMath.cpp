@@ -223,12 +223,23 @@ int RelayoutFirstRow(int oldColumns, int firstRow, int newColumns, int count) {
     return static_cast<int>(std::min<long long>(row, count));
 }
 
-int RelayoutScrollY(const Geometry& g, int firstRow, int totalHeight) {
-    long long y = static_cast<long long>(g.RowPitch()) * firstRow + g.originY;
-    // Into (0, totalHeight] by whole turns of the range, in one step: a loop of turns can take seconds.
-    if (totalHeight > 0 && y > totalHeight)
-        y = (y - 1) % totalHeight + 1;
-    return static_cast<int>(y);
+int BarMaxPos(int totalHeight, int clientHeight) {
+    return std::max(0, totalHeight - clientHeight);
+}
+
+int BarPosOfRow(int firstRow, int lastFirstRow, int maxPos) {
+    if (lastFirstRow <= 0 || maxPos <= 0)
+        return 0;
+    const long long row = std::clamp(firstRow, 0, lastFirstRow);
+    // Rounded to the nearest position, in 64 bits: 2^28 rows times a 32768-pixel range passes int.
+    return static_cast<int>((row * maxPos + lastFirstRow / 2) / lastFirstRow);
+}
+
+int RowOfBarPos(int pos, int lastFirstRow, int maxPos) {
+    if (lastFirstRow <= 0 || maxPos <= 0)
+        return 0;
+    const long long p = std::clamp(pos, 0, maxPos);
+    return static_cast<int>((p * lastFirstRow + maxPos / 2) / maxPos);
 }
 
 int PageUpFirstRow(int firstRow, int visibleRows) {
@@ -249,35 +260,19 @@ int EndFirstRow(int rows, int visibleRows) {
     return std::max(0, rows - std::max(1, visibleRows));
 }
 
-int ThumbTrackStep(int trackPos, int scrollY, int rowPitch) {
-    if (rowPitch <= 0)
-        return 0;
-    const int d = trackPos - trackPos % rowPitch - scrollY;
-    if (std::abs(d) < rowPitch)
-        return 0;
-    return d < 1 ? -1 : 1;
-}
-
 namespace {
-// The base scroll view's line step: the position moves by delta within 0..total - client.
-void BaseScroll(ScrollState& s, int delta) {
-    const int limit = std::max(0, s.totalHeight - s.clientHeight);
-    s.y = std::clamp(s.y + delta, 0, limit);
+void PlaceBar(ScrollState& s) {
+    s.y =
+        BarPosOfRow(s.firstRow, EndFirstRow(s.rows, s.visibleRows), BarMaxPos(s.totalHeight, s.clientHeight));
 }
 } // namespace
 
 LineStep LineUp(ScrollState& s, const Geometry& g) {
     LineStep step;
     const int rowPitch = g.RowPitch();
-    if (s.x > 0 && s.y >= 1) {
+    if (s.x > 0 && s.firstRow > 0) {
         s.x = 0;
         step.resetX = true;
-    }
-    if (s.y == 0 && s.firstRow > 0) {
-        // The top of the capped range wraps round to its bottom.
-        s.y = s.totalHeight - rowPitch * (s.visibleRows + 1);
-        step.wrapped = true;
-        step.wrapY = s.y;
     }
     if (s.firstRow == 0)
         return step;
@@ -285,7 +280,7 @@ LineStep LineUp(ScrollState& s, const Geometry& g) {
     step.moved = true;
     step.createRow = s.firstRow;
     step.createRowTop = g.originY - rowPitch;
-    BaseScroll(s, -rowPitch);
+    PlaceBar(s);
     return step;
 }
 
@@ -299,12 +294,6 @@ LineStep LineDown(ScrollState& s, const Geometry& g) {
         s.x = 0;
         step.resetX = true;
     }
-    if (s.firstRow + 1 + s.visibleRows < s.rows && rowPitch * (s.visibleRows + 1) + s.y == s.totalHeight) {
-        // The bottom of the capped range wraps round to its top.
-        s.y = 0;
-        step.wrapped = true;
-        step.wrapY = 0;
-    }
     const int row = s.firstRow + 1 + s.visibleRows;
     if (row < s.rows) {
         step.createRow = row;
@@ -312,7 +301,7 @@ LineStep LineDown(ScrollState& s, const Geometry& g) {
     }
     s.firstRow += 1;
     step.moved = true;
-    BaseScroll(s, rowPitch);
+    PlaceBar(s);
     return step;
 }
 

@@ -118,17 +118,20 @@ RefitNumbers ComputeRefit(const Geometry& g, int clientRight, int clientBottom, 
 
 // First row after a change of columns, keeping the first drawing shown in view.
 int RelayoutFirstRow(int oldColumns, int firstRow, int newColumns, int count);
-// Vertical position of a first row, wrapped into the capped range.
-int RelayoutScrollY(const Geometry& g, int firstRow, int totalHeight);
+// The vertical scroll bar shows where the first row lies between the top and the last page, in
+// proportion: the bar's pixel range is capped, a folder's rows are not, so one position may stand for
+// many rows. maxPos is the bar's largest position (its range less its page).
+int BarMaxPos(int totalHeight, int clientHeight);
+// The bar's position for a first row of 0..lastFirstRow.
+int BarPosOfRow(int firstRow, int lastFirstRow, int maxPos);
+// The first row a bar position stands for (a thumb dropped there): the row whose position is nearest.
+int RowOfBarPos(int pos, int lastFirstRow, int maxPos);
 
 // Keyboard jumps.
 int PageUpFirstRow(int firstRow, int visibleRows);
 int PageDownFirstRow(int firstRow, int visibleRows, int rows);
 // The last first row: the last page, or the last row when not one row fits the client.
 int EndFirstRow(int rows, int visibleRows);
-
-// Thumb tracking moves by single rows: -1 up, +1 down, 0 none.
-int ThumbTrackStep(int trackPos, int scrollY, int rowPitch);
 
 // The row-by-row scrolling state of the view.
 struct ScrollState {
@@ -138,20 +141,18 @@ struct ScrollState {
     int x = 0; // scroll position
     int y = 0;
     int totalHeight = 0;  // capped
-    int clientHeight = 0; // for the base scroll's limit
+    int clientHeight = 0; // the bar's page
 };
 
 // What one line step asks the view to do.
 struct LineStep {
     bool moved = false;   // first row changed (a row was created and the contents scrolled)
     bool resetX = false;  // horizontal position set back to 0
-    bool wrapped = false; // vertical position jumped to wrapY before the step
-    int wrapY = 0;
     int createRow = -1;   // list row to create, -1 when it does not exist
     int createRowTop = 0; // its top in client coordinates
 };
 
-// One row up / one row down, updating the state as the view and the base scroll would.
+// One row up / one row down; y becomes the bar's position of the new first row.
 LineStep LineUp(ScrollState& s, const Geometry& g);
 LineStep LineDown(ScrollState& s, const Geometry& g);
 

@@ -547,6 +547,8 @@ void CTessel3View::Layout() {
     m_nPoolRows = n.poolRows;
     m_nTotalHeight = n.totalHeight;
     m_nTotalWidth = n.totalWidth;
+    // The bars are settled: the thumb shows where the first row lies.
+    ::SetScrollPos(m_hWnd, SB_VERT, grid::BarPosOfRow(m_nFirstRow, LastFirstRow(), BarMaxPos()), TRUE);
     PlaceSheet();
     if (m_nCount == 0)
         return;
@@ -771,9 +773,7 @@ void CTessel3View::Relayout() {
     m_pool.clear();
     const int firstRow = grid::RelayoutFirstRow(m_nOldColumns, m_nFirstRow, m_nColumns, m_nCount);
     m_nOldColumns = m_nColumns;
-    const int y = grid::RelayoutScrollY(Geometry(), firstRow, m_nTotalHeight);
     ::SetScrollPos(m_hWnd, SB_HORZ, m_ptOrigin.x, TRUE);
-    ::SetScrollPos(m_hWnd, SB_VERT, y, TRUE);
     m_nFirstRow = firstRow;
     Layout();
     SetFocus();
@@ -800,15 +800,13 @@ void CTessel3View::ApplyLineStep(const grid::LineStep& step, const grid::ScrollS
         ::SetScrollPos(m_hWnd, SB_HORZ, 0, TRUE);
         ScrollWindow(before.x, 0);
     }
-    if (step.wrapped)
-        ::SetScrollPos(m_hWnd, SB_VERT, step.wrapY, TRUE);
     if (step.createRow >= 0)
         CreateRow(step.createRow, step.createRowTop);
     if (!step.moved)
         return;
     m_nFirstRow = after.firstRow;
     SchedulePictures();
-    // The contents always move by exactly one row, whatever the capped scroll bar could show.
+    // The contents always move by exactly one row; the thumb only shows where that row lies.
     ::SetScrollPos(m_hWnd, SB_VERT, after.y, TRUE);
     ScrollWindow(0, -direction * Geometry().RowPitch());
     KeepSheetCovering();
@@ -835,29 +833,53 @@ void CTessel3View::LineDown() {
     ApplyLineStep(step, before, s, +1);
 }
 
+void CTessel3View::PageUp() {
+    m_nFirstRow = grid::PageUpFirstRow(m_nFirstRow, m_nVisibleRows);
+    Relayout();
+}
+
+void CTessel3View::PageDown() {
+    m_nFirstRow = grid::PageDownFirstRow(m_nFirstRow, m_nVisibleRows, m_nRows);
+    Relayout();
+}
+
+int CTessel3View::LastFirstRow() const {
+    return grid::EndFirstRow(m_nRows, m_nVisibleRows);
+}
+
+int CTessel3View::BarMaxPos() const {
+    return grid::BarMaxPos(m_nTotalHeight, GetClientRect().Height());
+}
+
 bool CTessel3View::OnScroll(UINT scrollCode, UINT pos, bool doScroll) {
     const UINT vertical = HIBYTE(scrollCode);
     if (vertical == 0xFF) // horizontal only: the base scrolls the grid sideways
         return CScrollView::OnScroll(scrollCode, pos, doScroll);
     switch (vertical) {
-    case SB_THUMBTRACK: {
-        const int step =
-            grid::ThumbTrackStep(TrackPos(SB_VERT), GetScrollPosition().y, Geometry().RowPitch());
-        if (step < 0)
-            LineUp();
-        else if (step > 0)
-            LineDown();
-        return step != 0;
+    case SB_THUMBTRACK:
+    case SB_THUMBPOSITION: {
+        // The grid goes where the thumb is, however far. While it moves, the 32-bit track position; at the
+        // drop, the drop's own position (the bar's range is capped well inside the message's 16 bits).
+        const int at = vertical == SB_THUMBTRACK ? TrackPos(SB_VERT) : static_cast<int>(pos);
+        const int row = grid::RowOfBarPos(at, LastFirstRow(), BarMaxPos());
+        if (row == m_nFirstRow)
+            return false;
+        m_nFirstRow = row;
+        Relayout();
+        return true;
     }
     case SB_LINEUP:
-    case SB_PAGEUP:
         LineUp();
         return true;
     case SB_LINEDOWN:
-    case SB_PAGEDOWN:
         LineDown();
         return true;
-    case SB_THUMBPOSITION:
+    case SB_PAGEUP:
+        PageUp();
+        return true;
+    case SB_PAGEDOWN:
+        PageDown();
+        return true;
     case SB_ENDSCROLL:
         return false;
     case SB_TOP:
@@ -890,12 +912,10 @@ bool CTessel3View::HandleKey(UINT key) {
         TakeChosen();
         return true;
     case VK_PRIOR:
-        m_nFirstRow = grid::PageUpFirstRow(m_nFirstRow, m_nVisibleRows);
-        Relayout();
+        PageUp();
         return true;
     case VK_NEXT:
-        m_nFirstRow = grid::PageDownFirstRow(m_nFirstRow, m_nVisibleRows, m_nRows);
-        Relayout();
+        PageDown();
         return true;
     case VK_END:
         m_nFirstRow = grid::EndFirstRow(m_nRows, m_nVisibleRows);

@@ -9,9 +9,11 @@
 // the user does to the grid, their ThumbnailOwner.
 //
 // The controls sit on a sheet, a child window that covers the client area and a margin of rows above
-// and below it, with the first row shown at the top of the client area; the scroll position only mirrors
-// the row (it wraps round inside the capped range), and every row step moves the window contents by
-// exactly one row pitch: the sheet moves, and the controls on it with it.
+// and below it, with the first row shown at the top of the client area; the vertical scroll position only
+// shows where the first row lies, in proportion between the top and the last page (one position may stand
+// for many rows), and every row step moves the window contents by exactly one row pitch: the sheet moves,
+// and the controls on it with it. A thumb dragged or let go takes the grid to its row; a click in the
+// trough moves a page.
 #pragma once
 
 #include "framework/afxview.h"
@@ -231,6 +233,11 @@ private:
     int SheetMargin() const;
     void LineUp();
     void LineDown();
+    void PageUp();
+    void PageDown();
+    // The first row of the last page, and the scroll bar's largest position: the two ends the thumb maps.
+    int LastFirstRow() const;
+    int BarMaxPos() const;
     void ApplyLineStep(const grid::LineStep& step, const grid::ScrollState& before,
                        const grid::ScrollState& after, int direction);
     grid::ScrollState CurrentScrollState() const;

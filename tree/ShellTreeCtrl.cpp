@@ -11,6 +11,8 @@
 
 #include <cstring>
 #include <memory>
+#include <string>
+#include <vector>
 
 namespace {
 
@@ -134,36 +136,55 @@ void CShellTreeCtrl::PopulateTree(LPCITEMIDLIST root, std::uint32_t flags) {
     SendMessage(WM_SETREDRAW, TRUE);
 }
 
-HTREEITEM CShellTreeCtrl::InsertNode(HTREEITEM parent, IShellFolder* parentFolder, LPCITEMIDLIST parentId,
-                                     LPCITEMIDLIST relativeId, std::uint32_t flags) {
+CShellTreeCtrl::PreparedNode CShellTreeCtrl::PrepareNode(IShellFolder* parentFolder, LPCITEMIDLIST parentId,
+                                                         LPCITEMIDLIST relativeId,
+                                                         std::uint32_t flags) const {
+    PreparedNode prepared;
     CShellPidl absolute = CShellPidl::Concat(parentId, relativeId);
     if (!absolute)
-        return nullptr;
-    auto node = std::make_unique<CShellNode>(parentFolder, std::move(absolute), flags);
-
+        return prepared;
+    prepared.node = std::make_unique<CShellNode>(parentFolder, std::move(absolute), flags);
     char label[kLabelChars] = "";
+    TVITEMA& item = prepared.item;
+    item.mask = kInsertMask;
+    item.pszText = label;
+    item.cchTextMax = kLabelChars;
+    item.lParam = reinterpret_cast<LPARAM>(prepared.node.get());
+    // What is not supplied on demand is computed now.
+    FillDisplayInfo(item, *prepared.node, kInsertMask & ~m_nCallbackMask, false);
+    prepared.label = label;
+    item.pszText = nullptr; // the label's own copy is pointed at when the item goes in
+    if (m_nCallbackMask & kCallbackText)
+        item.pszText = LPSTR_TEXTCALLBACKA;
+    if (m_nCallbackMask & kCallbackImage)
+        item.iImage = I_IMAGECALLBACK;
+    if (m_nCallbackMask & kCallbackSelectedImage)
+        item.iSelectedImage = I_IMAGECALLBACK;
+    if (m_nCallbackMask & kCallbackChildren)
+        item.cChildren = I_CHILDRENCALLBACK;
+    item.mask |= kInsertMask; // the state bits the fill added stay
+    return prepared;
+}
+
+HTREEITEM CShellTreeCtrl::InsertPrepared(HTREEITEM parent, PreparedNode& prepared) {
+    if (!prepared.node)
+        return nullptr;
     TVINSERTSTRUCTA insert{};
     insert.hParent = parent;
     insert.hInsertAfter = TVI_LAST;
-    insert.item.mask = kInsertMask;
-    insert.item.pszText = label;
-    insert.item.cchTextMax = kLabelChars;
-    insert.item.lParam = reinterpret_cast<LPARAM>(node.get());
-    // What is not supplied on demand is computed now.
-    FillDisplayInfo(insert.item, *node, kInsertMask & ~m_nCallbackMask, false);
-    if (m_nCallbackMask & kCallbackText)
-        insert.item.pszText = LPSTR_TEXTCALLBACKA;
-    if (m_nCallbackMask & kCallbackImage)
-        insert.item.iImage = I_IMAGECALLBACK;
-    if (m_nCallbackMask & kCallbackSelectedImage)
-        insert.item.iSelectedImage = I_IMAGECALLBACK;
-    if (m_nCallbackMask & kCallbackChildren)
-        insert.item.cChildren = I_CHILDRENCALLBACK;
-    insert.item.mask |= kInsertMask; // the state bits the fill added stay
+    insert.item = prepared.item;
+    if (!insert.item.pszText)
+        insert.item.pszText = const_cast<char*>(prepared.label.c_str());
     HTREEITEM item = InsertItem(&insert);
     if (item)
-        node.release(); // the item owns it now; TVN_DELETEITEM frees it
+        prepared.node.release(); // the item owns it now; TVN_DELETEITEM frees it
     return item;
+}
+
+HTREEITEM CShellTreeCtrl::InsertNode(HTREEITEM parent, IShellFolder* parentFolder, LPCITEMIDLIST parentId,
+                                     LPCITEMIDLIST relativeId, std::uint32_t flags) {
+    PreparedNode prepared = PrepareNode(parentFolder, parentId, relativeId, flags);
+    return InsertPrepared(parent, prepared);
 }
 
 void CShellTreeCtrl::FillDisplayInfo(TVITEMA& item, const CShellNode& node, UINT mask, bool wideText) const {
@@ -238,13 +259,31 @@ bool CShellTreeCtrl::PopulateNode(HTREEITEM item, LPCITEMIDLIST absoluteId, std:
         }
     } release{folder, enumerator};
     if (enumerator) {
+        // First every child is read from the shell, then they all go into the tree: Escape while reading
+        // leaves nothing in the tree to take out again, which under some systems costs as much per item
+        // as the tree holds. The node is folded while they go in: a child inserted into an expanded node
+        // costs a walk of all the tree shows below it.
         SetPopulationCount(0, 0);
+        std::vector<PreparedNode> children;
+        bool stopped = false;
         LPITEMIDLIST child = nullptr;
-        while (enumerator->Next(1, &child, nullptr) == S_OK) {
+        while (!(stopped = FillCancelled()) && enumerator->Next(1, &child, nullptr) == S_OK) {
             CShellPidl relative(child);
-            InsertNode(item, folder, absoluteId, relative.get(), flags & kShellInherited);
+            children.push_back(PrepareNode(folder, absoluteId, relative.get(), flags & kShellInherited));
             IncreasePopulation(1);
         }
+        // The bar stays where the reading left it (the total was not known) until the end.
+        const bool expanded = item != TVI_ROOT && (GetItemState(item, TVIS_EXPANDED) & TVIS_EXPANDED);
+        if (expanded)
+            SetItemState(item, 0, TVIS_EXPANDED);
+        for (std::size_t i = 0; i < children.size() && !stopped; ++i) {
+            if (!(stopped = FillCancelled()))
+                InsertPrepared(item, children[i]);
+        }
+        if (expanded)
+            SetItemState(item, TVIS_EXPANDED, TVIS_EXPANDED);
+        if (stopped)
+            return true;
         if (GetPopulationCount() > 0) {
             TVSORTCB sort{};
             sort.hParent = item;

@@ -14,6 +14,7 @@
 #include "tree/WaitingTreeCtrl.h"
 
 #include <functional>
+#include <memory>
 #include <string>
 
 class CTessel3Doc;
@@ -99,6 +100,16 @@ protected:
     LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
 
 private:
+    // A child made ready to go into the tree: its record and its item, whose label is computed (unless the
+    // tree asks for it on demand).
+    struct PreparedNode {
+        std::unique_ptr<CShellNode> node;
+        TVITEMA item{};
+        std::string label;
+    };
+    PreparedNode PrepareNode(IShellFolder* parentFolder, LPCITEMIDLIST parentId, LPCITEMIDLIST relativeId,
+                             std::uint32_t flags) const;
+    HTREEITEM InsertPrepared(HTREEITEM parent, PreparedNode& prepared);
     HTREEITEM InsertNode(HTREEITEM parent, IShellFolder* parentFolder, LPCITEMIDLIST parentId,
                          LPCITEMIDLIST relativeId, std::uint32_t flags);
     void FillDisplayInfo(TVITEMA& item, const CShellNode& node, UINT mask, bool wideText) const;

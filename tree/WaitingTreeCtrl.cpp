@@ -88,6 +88,23 @@ void CWaitingTreeCtrl::IncreasePopulation(int count) {
         ::SetEvent(event);
 }
 
+bool CWaitingTreeCtrl::FillCancelled() {
+    if (m_bFillCancelled)
+        return true;
+    const ULONGLONG now = ::GetTickCount64();
+    if (now < m_nNextFillCheck)
+        return false;
+    m_nNextFillCheck = now + kFillCheckMs;
+    // A repaint asked for meanwhile (another window moved away, an invalidation): the snapshot, then the
+    // bar over it. Painted directly, not taken from the queue, which belongs to the loop outside.
+    ::UpdateWindow(m_hWnd);
+    // Looking at the queue also answers what other threads send the tree meanwhile.
+    MSG msg;
+    if (::PeekMessageA(&msg, nullptr, WM_KEYDOWN, WM_KEYDOWN, PM_NOREMOVE) && msg.wParam == VK_ESCAPE)
+        m_bFillCancelled = true;
+    return m_bFillCancelled;
+}
+
 bool CWaitingTreeCtrl::OnNotifyReflect(NMHDR* hdr, LRESULT* result) {
     const UINT code = AfxTreeNotifyCode(hdr->code);
     if (code != TVN_ITEMEXPANDINGA && code != TVN_ITEMEXPANDEDA)
@@ -228,10 +245,27 @@ void CWaitingTreeCtrl::Populate(HTREEITEM node) {
         DeleteItem(loading);
     m_hLoadingItem = nullptr;
 
+    m_bFillCancelled = false;
+    m_nNextFillCheck = 0;
     const bool keepButtonOnlyWithChildren = PopulateItem(node);
     animation.reset();
 
-    if (node != TVI_ROOT) {
+    if (std::exchange(m_bFillCancelled, false)) {
+        // Stopped by the user: not filled is better than half filled, which would pass for the whole. The
+        // children go in one collapse, not one deletion each: each deletion of an expanded node's child
+        // walks the node's remaining children, many thousand of them.
+        if (node != TVI_ROOT)
+            SendMessage(TVM_EXPAND, TVE_COLLAPSE | TVE_COLLAPSERESET, reinterpret_cast<LPARAM>(node));
+        DeleteChildren(node);
+        if (node != TVI_ROOT) {
+            TVITEMA tvi{};
+            tvi.mask = TVIF_HANDLE | TVIF_CHILDREN;
+            tvi.hItem = node;
+            tvi.cChildren = 1;
+            SetItem(&tvi);
+            SetItemState(node, 0, TVIS_EXPANDED | TVIS_EXPANDEDONCE);
+        }
+    } else if (node != TVI_ROOT) {
         if (keepButtonOnlyWithChildren) {
             TVITEMA tvi{};
             tvi.mask = TVIF_HANDLE | TVIF_CHILDREN;
@@ -278,6 +312,7 @@ bool CWaitingTreeCtrl::OnEraseBkgnd(CDC* pDC) {
         ::SelectObject(memory, old);
         ::DeleteDC(memory);
     }
+    m_bRepainted = true;
     if (HANDLE event = m_hRefreshEvent)
         ::SetEvent(event);
     return true;

@@ -62,6 +62,16 @@ protected:
     // Progress reports for PopulateItem.
     void SetPopulationCount(int total, int count);
     void IncreasePopulation(int count = 1);
+    // For PopulateItem, between two items: true once the user has pressed Escape, and PopulateItem should
+    // stop; the key stays in the queue for whoever handles it after the filling (Escape ends the explorer).
+    // Looks at the queue at most every kFillCheckMs, however long an item takes or however many items there
+    // are, and meanwhile lets the tree repaint (the snapshot, then the bar over it) and answers messages
+    // other threads send. A filling that stopped leaves the node collapsed and empty, with its button.
+    static constexpr unsigned kFillCheckMs = 40;
+    bool FillCancelled();
+    // For DoAnimation: true once after the tree painted its snapshot again, so that what is drawn over it
+    // (the progress bar) is drawn again too.
+    bool TakeRepaint() { return m_bRepainted.exchange(false); }
 
     // The rectangle of the loading item's icon place; false without an image list or a label rectangle.
     bool GetLoadingIconRect(HTREEITEM loadingItem, CRect& rect) const;
@@ -87,6 +97,9 @@ private:
     std::atomic<HANDLE> m_hRefreshEvent{nullptr};
     std::atomic<bool> m_bStop{false};
     std::atomic<bool> m_bSnapshotValid{false};
+    std::atomic<bool> m_bRepainted{false};
+    unsigned long long m_nNextFillCheck = 0; // GetTickCount64 time of the next look at the queue
+    bool m_bFillCancelled = false;
     CBitmap m_bmpSnapshot;
     UINT m_nPeriod = 0;
     std::string m_strLoadingText = "Loading...";
@@ -124,10 +137,11 @@ protected:
         T::DoAnimation(tick, total, count);
         if (tick || !m_brFrame.GetSafeHandle() || !m_brBar.GetSafeHandle())
             return;
-        // Drawn again only when the bar grew: a report for every one of many thousand items would
-        // otherwise cost a drawing each, and drawing into another thread's window is slow.
+        // Drawn again only when the bar grew or the tree painted its snapshot over it: a report for every
+        // one of many thousand items would otherwise cost a drawing each, and drawing into another
+        // thread's window is slow.
         const int width = orvex::tree::ProgressWidth(total, count);
-        if (width == m_nDrawnWidth)
+        if (!this->TakeRepaint() && width == m_nDrawnWidth)
             return;
         m_nDrawnWidth = width;
         if (HDC dc = this->GetAnimationDC()) {

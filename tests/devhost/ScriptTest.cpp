@@ -203,6 +203,45 @@ TEST(Script, PostNamesAWindowAMessageAndItsParameters) {
     EXPECT_EQ(Error(L"post 32768 1\n"), L"line 1: post needs a window, such as class=NAME or id=N");
 }
 
+TEST(Script, DragPressesAtOnePointAndLetsGoAtAnother) {
+    const auto commands = Read(L"drag id=59649 window-at=-8,22 to=-8,50% steps=20\n"
+                               L"drag class=X at=3,4 to=30%,-5\n");
+    ASSERT_EQ(commands.size(), 2u);
+    EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::Drag);
+    EXPECT_TRUE(commands[0].windowPoint);
+    EXPECT_EQ(commands[0].x, -8);
+    EXPECT_EQ(commands[0].y, 22);
+    EXPECT_TRUE(commands[0].hasTo);
+    EXPECT_EQ(commands[0].toX, -8);
+    EXPECT_FALSE(commands[0].toXPercent);
+    EXPECT_EQ(commands[0].toY, 50);
+    EXPECT_TRUE(commands[0].toYPercent);
+    EXPECT_EQ(commands[0].steps, 20);
+    EXPECT_FALSE(commands[1].windowPoint);
+    EXPECT_EQ(commands[1].toX, 30);
+    EXPECT_TRUE(commands[1].toXPercent);
+    EXPECT_EQ(commands[1].toY, -5);
+    EXPECT_EQ(commands[1].steps, 8);
+    EXPECT_EQ(Error(L"drag class=X at=1,1\n"), L"line 1: drag needs to=X,Y, where the button is let go");
+    EXPECT_NE(Error(L"drag class=X to=1\n").find(L"to= takes X,Y"), std::wstring::npos);
+    EXPECT_NE(Error(L"drag class=X to=1,150%\n").find(L"to= takes X,Y"), std::wstring::npos);
+    EXPECT_NE(Error(L"drag class=X to=1,-5%\n").find(L"to= takes X,Y"), std::wstring::npos);
+    EXPECT_NE(Error(L"drag class=X to=1,1 steps=0\n").find(L"steps= takes"), std::wstring::npos);
+    EXPECT_NE(Error(L"click class=X to=1,1\n").find(L"unexpected to=1,1"), std::wstring::npos);
+}
+
+TEST(Script, ScrollBarRedrawAndWindowsNameAWindow) {
+    const auto commands =
+        Read(L"scrollbar id=59649\nredraw class=SysTreeView32\nwindows id=1 > class=Edit\n");
+    ASSERT_EQ(commands.size(), 3u);
+    EXPECT_EQ(commands[0].kind, ScriptCommand::Kind::ScrollBar);
+    EXPECT_EQ(commands[1].kind, ScriptCommand::Kind::Redraw);
+    EXPECT_EQ(commands[2].kind, ScriptCommand::Kind::Windows);
+    EXPECT_EQ(commands[2].window.size(), 2u);
+    EXPECT_EQ(Error(L"scrollbar\n"), L"line 1: scrollbar needs a window, such as class=NAME or id=N");
+    EXPECT_EQ(Error(L"redraw\n"), L"line 1: redraw needs a window, such as class=NAME or id=N");
+}
+
 TEST(Script, CallTakesOneLispCall) {
     const auto commands = Read(L"call \"(Orvex 1 2 \\\"\\\" \\\"\\\" \\\"\\\")\"\n");
     ASSERT_EQ(commands.size(), 1u);

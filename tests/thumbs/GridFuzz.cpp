@@ -63,6 +63,11 @@ int SetScrollPos(const View& v, int y) {
     return std::clamp(y, 0, std::max(0, v.s.totalHeight));
 }
 
+int BarPos(const View& v) {
+    return grid::BarPosOfRow(v.s.firstRow, grid::EndFirstRow(v.s.rows, v.s.visibleRows),
+                             grid::BarMaxPos(v.s.totalHeight, v.s.clientHeight));
+}
+
 void Lay(View& v) {
     v.columns = grid::ColumnsForWidth(v.clientWidth, v.g.cellWidth, v.g.gap);
     v.n = grid::ComputeLayout(v.g, v.count, v.columns, v.clientHeight);
@@ -146,7 +151,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
             break;
         case 4:
             v.s.firstRow = grid::EndFirstRow(v.s.rows, v.s.visibleRows);
-            v.s.y = SetScrollPos(v, grid::RelayoutScrollY(v.g, v.s.firstRow, v.s.totalHeight));
+            v.s.y = SetScrollPos(v, BarPos(v));
             break;
         case 5: { // Increase or Decrease, then a new layout
             if (in.ConsumeBool())
@@ -165,20 +170,19 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
             const int newColumns = grid::ColumnsForWidth(v.clientWidth, v.g.cellWidth, v.g.gap);
             v.s.firstRow = grid::RelayoutFirstRow(oldColumns, v.s.firstRow, newColumns, v.count);
             Lay(v);
-            v.s.y = SetScrollPos(v, grid::RelayoutScrollY(v.g, v.s.firstRow, v.s.totalHeight));
+            v.s.y = SetScrollPos(v, BarPos(v));
             const grid::RefitNumbers r = grid::ComputeRefit(v.g, v.clientWidth, v.clientHeight,
                                                             v.clientWidth + 16, v.clientHeight + 40);
             Check(r.columns >= 1);
             break;
         }
         case 7: { // the thumb is dragged
-            const int track = in.ConsumeIntegralInRange(0, std::max(0, v.s.totalHeight));
-            const int step = grid::ThumbTrackStep(track, v.s.y, v.g.RowPitch());
-            Check(step >= -1 && step <= 1);
-            const grid::LineStep line = step < 0   ? grid::LineUp(v.s, v.g)
-                                        : step > 0 ? grid::LineDown(v.s, v.g)
-                                                   : grid::LineStep();
-            CheckCreatedRow(v, line);
+            const int maxPos = grid::BarMaxPos(v.s.totalHeight, v.s.clientHeight);
+            const int track = in.ConsumeIntegralInRange(0, maxPos);
+            const int last = grid::EndFirstRow(v.s.rows, v.s.visibleRows);
+            v.s.firstRow = grid::RowOfBarPos(track, last, maxPos);
+            Check(v.s.firstRow >= 0 && v.s.firstRow <= last);
+            v.s.y = SetScrollPos(v, BarPos(v));
             break;
         }
         case 8: // the list is read again with another count

@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <cstdlib>
+
 namespace {
 
 using namespace grid;
@@ -295,20 +298,54 @@ TEST(GridMath, RelayoutKeepsFirstDrawingInView) {
     EXPECT_EQ(RelayoutFirstRow(60, 100, 1, 50), 50); // never beyond the count
 }
 
-TEST(GridMath, RelayoutScrollPositionWraps) {
-    const Geometry g = DefaultGeometry();
-    EXPECT_EQ(RelayoutScrollY(g, 10, 32763), 1630);
-    EXPECT_EQ(RelayoutScrollY(g, 201, 32763), 32763); // equal is not larger
-    EXPECT_EQ(RelayoutScrollY(g, 202, 32763), 202 * 163 - 32763);
-    EXPECT_EQ(RelayoutScrollY(g, 500, 32763), 500 * 163 - 2 * 32763);
+TEST(GridMath, BarPositionIsTheFirstRowInProportion) {
+    // 100 rows, 10 visible: first rows 0..90 over positions 0..900.
+    EXPECT_EQ(BarPosOfRow(0, 90, 900), 0);
+    EXPECT_EQ(BarPosOfRow(45, 90, 900), 450);
+    EXPECT_EQ(BarPosOfRow(90, 90, 900), 900);
+    EXPECT_EQ(BarPosOfRow(200, 90, 900), 900); // beyond the last page: at the bottom
+    EXPECT_EQ(BarPosOfRow(-3, 90, 900), 0);
+    EXPECT_EQ(BarPosOfRow(5, 0, 900), 0); // everything fits: no range
+    EXPECT_EQ(BarPosOfRow(5, 90, 0), 0);
+    EXPECT_EQ(BarMaxPos(32763, 500), 32263);
+    EXPECT_EQ(BarMaxPos(400, 500), 0);
 }
 
-TEST(GridMath, RelayoutScrollPositionOfAFarRowIsImmediate) {
-    // 1.6 * 10^11 pixels down a range of 7: as many turns as a loop would have taken, at once.
-    const Geometry g = DefaultGeometry();
-    const long long y = 163LL * 1000000000 + g.originY;
-    EXPECT_EQ(RelayoutScrollY(g, 1000000000, 7), static_cast<int>((y - 1) % 7 + 1));
-    EXPECT_EQ(RelayoutScrollY(g, 1000000000, 163), 163);
+TEST(GridMath, BarPositionOfAFolderBeyondTheCappedRange) {
+    // 200,000 rows of 30 pixels in a 32,768-pixel range: the middle row is in the middle of the bar, the
+    // last page at its bottom; no step overflows.
+    const int last = 200000 - 20;
+    const int maxPos = 32760 - 600;
+    EXPECT_EQ(BarPosOfRow(last / 2, last, maxPos), maxPos / 2);
+    EXPECT_EQ(BarPosOfRow(last, last, maxPos), maxPos);
+    EXPECT_EQ(RowOfBarPos(maxPos / 2, last, maxPos), last / 2);
+    EXPECT_EQ(RowOfBarPos(maxPos, last, maxPos), last);
+    EXPECT_EQ(RowOfBarPos(0, last, maxPos), 0);
+    // A quarter of a billion rows.
+    EXPECT_EQ(RowOfBarPos(maxPos, 1 << 28, maxPos), 1 << 28);
+    EXPECT_EQ(BarPosOfRow(1 << 27, 1 << 28, maxPos), maxPos / 2);
+}
+
+TEST(GridMath, ThumbDroppedAnywhereStaysThere) {
+    // Whether one position stands for many rows or one row for many positions, the row a dropped thumb
+    // stands for puts the thumb back where it was dropped (within one row's share of the bar).
+    struct Case {
+        int last, maxPos;
+    };
+    for (const Case c :
+         {Case{199980, 32160}, Case{90, 14590}, Case{997, 32263}, Case{1, 50}, Case{32160, 32160}}) {
+        for (int pos = 0; pos <= c.maxPos; pos += std::max(1, c.maxPos / 997)) {
+            const int row = RowOfBarPos(pos, c.last, c.maxPos);
+            ASSERT_GE(row, 0);
+            ASSERT_LE(row, c.last);
+            const int back = BarPosOfRow(row, c.last, c.maxPos);
+            const int share = c.maxPos / c.last + 1;
+            ASSERT_LE(std::abs(back - pos), share) << pos << " of " << c.maxPos << " rows " << c.last;
+            if (c.last >= c.maxPos) {
+                ASSERT_EQ(back, pos);
+            }
+        }
+    }
 }
 
 TEST(GridMath, PageUpJumpsToTopWithinOnePage) {
@@ -328,14 +365,6 @@ TEST(GridMath, PageDownStopsAtLastPage) {
 TEST(GridMath, EndShowsLastPage) {
     EXPECT_EQ(EndFirstRow(100, 10), 90);
     EXPECT_EQ(EndFirstRow(4, 4), 0);
-}
-
-TEST(GridMath, ThumbTrackMovesOneRowAtATime) {
-    EXPECT_EQ(ThumbTrackStep(163 * 5 + 20, 163 * 4, 163), 1);
-    EXPECT_EQ(ThumbTrackStep(163 * 9, 163 * 4, 163), 1); // far away still one row
-    EXPECT_EQ(ThumbTrackStep(163 * 3, 163 * 4, 163), -1);
-    EXPECT_EQ(ThumbTrackStep(163 * 4 + 100, 163 * 4, 163), 0); // within the same row
-    EXPECT_EQ(ThumbTrackStep(0, 0, 163), 0);
 }
 
 ScrollState StateFor(const Geometry& g, int count, int columns, int clientHeight) {
@@ -383,7 +412,6 @@ TEST(GridMath, LineUpAtTopDoesNothingAndResetsNothing) {
     s.x = 40;
     const LineStep step = LineUp(s, g);
     EXPECT_FALSE(step.moved);
-    EXPECT_FALSE(step.wrapped);
     EXPECT_FALSE(step.resetX); // y is 0
     EXPECT_EQ(s.x, 40);
 }
@@ -409,8 +437,8 @@ TEST(GridMath, HugeFolderReachesLastRowThroughCappedRange) {
     ScrollState s = StateFor(g, 3000, 3, 500); // 1000 rows, 163000 pixels > 32768
     ASSERT_EQ(s.totalHeight, 32763);
     const int limit = s.totalHeight - s.clientHeight;
-    int wraps = 0;
     int steps = 0;
+    int lastY = 0;
     while (true) {
         const int before = s.firstRow;
         const LineStep step = LineDown(s, g);
@@ -418,10 +446,10 @@ TEST(GridMath, HugeFolderReachesLastRowThroughCappedRange) {
             break;
         ++steps;
         ASSERT_EQ(s.firstRow, before + 1);
-        ASSERT_GE(s.y, 0);
+        // The thumb only ever goes down on the way down, and stays within the range.
+        ASSERT_GE(s.y, lastY);
         ASSERT_LE(s.y, limit);
-        if (step.wrapped)
-            ++wraps;
+        lastY = s.y;
         // Each created row exists and lies just below the visible band.
         if (step.createRow >= 0) {
             ASSERT_LT(step.createRow, s.rows);
@@ -431,45 +459,30 @@ TEST(GridMath, HugeFolderReachesLastRowThroughCappedRange) {
     }
     EXPECT_EQ(s.firstRow + s.visibleRows, s.rows);
     EXPECT_EQ(s.firstRow, 997);
-    EXPECT_GT(wraps, 0);
+    EXPECT_EQ(s.y, limit); // the last page: the thumb at the bottom
 
-    // And back up to the first row, wrapping at the top of the range.
-    int upWraps = 0;
+    // And back up to the first row, the thumb going up with it.
     while (s.firstRow > 0) {
         const LineStep step = LineUp(s, g);
         ASSERT_TRUE(step.moved);
-        ASSERT_GE(s.y, 0);
-        ASSERT_LE(s.y, limit);
-        if (step.wrapped)
-            ++upWraps;
+        ASSERT_LE(s.y, lastY);
+        lastY = s.y;
     }
     EXPECT_EQ(s.firstRow, 0);
-    EXPECT_GT(upWraps, 0);
+    EXPECT_EQ(s.y, 0);
     EXPECT_FALSE(LineUp(s, g).moved);
 }
 
-TEST(GridMath, WrapDownHappensAtBottomOfCappedRange) {
+TEST(GridMath, LineStepsPutTheThumbWhereTheRowIs) {
     const Geometry g = DefaultGeometry();
     ScrollState s = StateFor(g, 3000, 3, 500);
-    s.firstRow = 100;
-    s.y = s.totalHeight - 163 * (s.visibleRows + 1);
-    const LineStep step = LineDown(s, g);
-    EXPECT_TRUE(step.wrapped);
-    EXPECT_EQ(step.wrapY, 0);
-    EXPECT_EQ(s.y, 163);
-    EXPECT_EQ(s.firstRow, 101);
-}
-
-TEST(GridMath, WrapUpHappensAtTopWhenRowsAbove) {
-    const Geometry g = DefaultGeometry();
-    ScrollState s = StateFor(g, 3000, 3, 500);
-    s.firstRow = 300;
-    s.y = 0;
-    const LineStep step = LineUp(s, g);
-    EXPECT_TRUE(step.wrapped);
-    EXPECT_EQ(step.wrapY, 32763 - 163 * 4);
-    EXPECT_EQ(s.y, 32763 - 163 * 5);
-    EXPECT_EQ(s.firstRow, 299);
+    s.firstRow = 498;
+    LineDown(s, g);
+    EXPECT_EQ(s.firstRow, 499);
+    EXPECT_EQ(s.y, BarPosOfRow(499, 997, 32763 - 500));
+    EXPECT_NEAR(s.y, (32763 - 500) / 2, 20);
+    LineUp(s, g);
+    EXPECT_EQ(s.y, BarPosOfRow(498, 997, 32763 - 500));
 }
 
 } // namespace

@@ -109,9 +109,8 @@ TEST(GridScroll, DownArrowThroughThreeThousandDrawingsKeepsTheRing) {
     const int columns = view.GetColumns();
     const int rows = view.GetRows();
     ASSERT_EQ(rows, (3000 + columns - 1) / columns);
-    ASSERT_GT(rows * RowPitch(view), grid::kScrollCap); // the capped range must wrap round
+    ASSERT_GT(rows * RowPitch(view), grid::kScrollCap); // more rows than the capped range holds
     const int limit = columns * (view.GetVisibleRows() + 2);
-    int wraps = 0;
     int lastY = 0;
     int steps = 0;
     while (view.GetFirstRow() + view.GetVisibleRows() < rows && steps < rows + 5) {
@@ -122,15 +121,20 @@ TEST(GridScroll, DownArrowThroughThreeThousandDrawingsKeepsTheRing) {
         ASSERT_EQ(view.GetFirstRow(), before + 1) << "step " << steps;
         ASSERT_LE(LiveThumbnails(view.m_hWnd), limit) << "step " << steps;
         ASSERT_LE(LiveLabels(view.m_hWnd), limit) << "step " << steps;
+        // The thumb only goes down on the way down.
         const int y = view.GetScrollPosition().y;
-        if (y < lastY)
-            ++wraps;
+        ASSERT_GE(y, lastY) << "step " << steps;
         lastY = y;
         if (steps % 97 == 0)
             ExpectFirstRowAtTop(view);
     }
     EXPECT_EQ(view.GetFirstRow(), rows - view.GetVisibleRows());
-    EXPECT_GE(wraps, 1);
+    // At the last page the thumb is at the bottom of the bar.
+    SCROLLINFO info{};
+    info.cbSize = sizeof info;
+    info.fMask = SIF_ALL;
+    ASSERT_TRUE(::GetScrollInfo(view.m_hWnd, SB_VERT, &info));
+    EXPECT_EQ(info.nPos, info.nMax - static_cast<int>(info.nPage) + 1);
     ExpectFirstRowAtTop(view);
     // The very last drawing is on screen.
     exCDwgThumbnail* last = view.ControlOf(2999);
@@ -375,7 +379,7 @@ TEST(GridScroll, EndHomePageDownPageUp) {
     ExpectFirstRowAtTop(view);
 }
 
-TEST(GridScroll, ScrollBarAndWheelStepOneRow) {
+TEST(GridScroll, ScrollBarLinesAndTheWheelStepOneRowPagesAPageTheThumbGoesWhereItIsPut) {
     GridBench bench(700, 600);
     FillList(300);
     CTessel3View& view = bench.view();
@@ -385,15 +389,30 @@ TEST(GridScroll, ScrollBarAndWheelStepOneRow) {
     const int visible = view.GetVisibleRows();
     view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_LINEDOWN, 0), 0);
     EXPECT_EQ(view.GetFirstRow(), 1);
+    // A click in the trough moves a page, as Page Down and Page Up do.
+    ASSERT_GT(visible, 1);
     view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_PAGEDOWN, 0), 0);
-    EXPECT_EQ(view.GetFirstRow(), 2);
+    EXPECT_EQ(view.GetFirstRow(), 1 + visible);
     view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_PAGEUP, 0), 0);
-    EXPECT_EQ(view.GetFirstRow(), 1);
+    EXPECT_EQ(view.GetFirstRow(), grid::PageUpFirstRow(1 + visible, visible));
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_TOP, 0), 0);
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_LINEDOWN, 0), 0);
     view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_LINEUP, 0), 0);
     EXPECT_EQ(view.GetFirstRow(), 0);
     view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_LINEUP, 0), 0);
     EXPECT_EQ(view.GetFirstRow(), 0);
-    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_THUMBPOSITION, 500), 0);
+    // The thumb let go half-way down the bar: the grid goes half-way and the thumb stays there.
+    SCROLLINFO info{};
+    info.cbSize = sizeof info;
+    info.fMask = SIF_ALL;
+    ASSERT_TRUE(::GetScrollInfo(view.m_hWnd, SB_VERT, &info));
+    const int maxPos = info.nMax - static_cast<int>(info.nPage) + 1;
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_THUMBPOSITION, maxPos / 2), 0);
+    EXPECT_EQ(view.GetFirstRow(), grid::RowOfBarPos(maxPos / 2, rows - visible, maxPos));
+    EXPECT_NEAR(view.GetFirstRow(), (rows - visible) / 2, 1);
+    EXPECT_NEAR(view.GetScrollPosition().y, maxPos / 2, maxPos / (rows - visible) + 1);
+    ExpectFirstRowAtTop(view);
+    view.SendMessage(WM_VSCROLL, MAKEWPARAM(SB_TOP, 0), 0);
     EXPECT_EQ(view.GetFirstRow(), 0);
     CRect rc = view.GetWindowRect();
     view.SendMessage(WM_MOUSEWHEEL, MAKEWPARAM(0, static_cast<WORD>(-WHEEL_DELTA)),

@@ -44,6 +44,10 @@ public:
     bool refresh = false;
     bool throwHalfWay = false;
     bool captureHalfWay = false;
+    bool repaintHalfWay = false; // half way: the tree repaints, then the bar is measured
+    int escapeAt = -1;           // an Escape key press is queued after this many children
+    int added = 0;               // children added before the filling ended or stopped
+    int barAfterRepaint = 0;
     int populations = 0;
     std::string loadingText;
     HTREEITEM loadingParent = nullptr;
@@ -74,14 +78,22 @@ protected:
     bool PopulateItem(HTREEITEM node) override {
         ++populations;
         SetPopulationCount(0, 0);
+        added = 0;
         for (int i = 0; i < childrenToAdd; ++i) {
+            if (escapeAt >= 0 && FillCancelled())
+                return true;
             InsertItem("child " + std::to_string(i), 0, 0, node);
+            ++added;
             IncreasePopulation();
+            if (i + 1 == escapeAt)
+                PostMessage(WM_KEYDOWN, VK_ESCAPE, 1);
             if (pauseMs)
                 ::Sleep(pauseMs);
             if (i + 1 == childrenToAdd / 2) {
                 if (captureHalfWay)
                     Capture();
+                if (repaintHalfWay)
+                    RepaintAndMeasure();
                 if (throwHalfWay)
                     throw std::runtime_error("the folder went away");
             }
@@ -91,6 +103,22 @@ protected:
     }
 
 private:
+    // Once the bar has grown as far as it goes, the tree's picture is painted over it (as when another
+    // window moved off the tree); the bar must come back over the picture.
+    void RepaintAndMeasure() {
+        ::WaitForSingleObject(m_drawn, 20000);
+        ::InvalidateRect(m_hWnd, nullptr, TRUE);
+        FillCancelled(); // the filling's look at the queue paints what is invalid
+        const int y = (m_rcBar.top + m_rcBar.bottom) / 2;
+        for (int round = 0; round < 100 && barAfterRepaint < 47; ++round) {
+            ::Sleep(30);
+            HDC dc = ::GetDC(m_hWnd);
+            barAfterRepaint = 0;
+            for (int x = m_rcBar.left; x < m_rcFrame.right; ++x)
+                barAfterRepaint += ::GetPixel(dc, x, y) == RGB(255, 0, 0);
+            ::ReleaseDC(m_hWnd, dc);
+        }
+    }
     // Looks at the progress bar's place once the animation thread drew the half-way report.
     void Capture() {
         capturedAfterDrawing = ::WaitForSingleObject(m_drawn, 20000) == WAIT_OBJECT_0;
@@ -242,6 +270,38 @@ TEST_F(WaitingTree, ExpandingFillsTheNodeBehindALoadingItemAndDrawsTheProgress) 
     int total = -5;
     EXPECT_EQ(tree.GetPopulationCount(&total), 1);
     EXPECT_EQ(total, 1);
+}
+
+TEST_F(WaitingTree, TheBarIsDrawnAgainAfterTheTreeRepaintsDuringTheFilling) {
+    tree.childrenToAdd = 40; // half way the bar of an unknown total has stopped growing
+    tree.repaintHalfWay = true;
+    tree.Expand(node, TVE_EXPAND);
+    EXPECT_GE(tree.barAfterRepaint, 47);
+    EXPECT_EQ(Children().size(), 40u);
+}
+
+TEST_F(WaitingTree, EscapeStopsTheFillingAndLeavesTheNodeEmptyWithItsButton) {
+    tree.childrenToAdd = 2000;
+    tree.pauseMs = 2; // four seconds or more to the end
+    tree.escapeAt = 10;
+    tree.Expand(node, TVE_EXPAND);
+    // Stopped at the next look at the queue (every 40 ms), long before the end.
+    EXPECT_GE(tree.added, 10);
+    EXPECT_LT(tree.added, 1000);
+    EXPECT_TRUE(Children().empty());
+    EXPECT_EQ(tree.GetItemState(node, TVIS_EXPANDED), 0u);
+    EXPECT_TRUE(tree.ItemHasChildren(node)); // the button stays: it can be filled again
+    // The key is left for whoever handles it after the filling.
+    MSG msg;
+    ASSERT_TRUE(::PeekMessageA(&msg, tree.m_hWnd, WM_KEYDOWN, WM_KEYDOWN, PM_REMOVE));
+    EXPECT_EQ(msg.wParam, static_cast<WPARAM>(VK_ESCAPE));
+    // Filled again, whole, when the user opens it again.
+    tree.escapeAt = -1;
+    tree.childrenToAdd = 5;
+    tree.pauseMs = 0;
+    ClickButton(tree, node);
+    EXPECT_EQ(Children().size(), 5u);
+    EXPECT_EQ(tree.populations, 2);
 }
 
 TEST_F(WaitingTree, AFilledNodeIsNotFilledAgain) {
