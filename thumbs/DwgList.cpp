@@ -1,6 +1,7 @@
 #include "thumbs/DwgList.h"
 
 #include "hostapi/NarrowText.h"
+#include "thumbs/NameCollation.h"
 
 #include <algorithm>
 #include <cstring>
@@ -80,6 +81,43 @@ std::string SkippedFilesMessage(int skipped) {
            " not shown: the full path is longer than " + std::to_string(kMaxPathChars) + " characters";
 }
 
+void SortByName(NameCollation& collation) {
+    const int count = DwgList.GetSize();
+    // Every key once, side by side in one buffer: the sort then compares bytes, never the locale.
+    std::string keys;
+    keys.reserve(static_cast<std::size_t>(count) * 32);
+    std::vector<std::size_t> starts(static_cast<std::size_t>(count) + 1);
+    for (int i = 0; i < count; ++i) {
+        starts[i] = keys.size();
+        collation.AppendSortKey(DwgList[i].m_strName, keys);
+    }
+    starts[count] = keys.size();
+    std::vector<int> order(static_cast<std::size_t>(count));
+    for (int i = 0; i < count; ++i)
+        order[i] = i;
+    const char* base = keys.data();
+    std::sort(order.begin(), order.end(), [&](int a, int b) {
+        const std::size_t lengthA = starts[a + 1] - starts[a];
+        const std::size_t lengthB = starts[b + 1] - starts[b];
+        const int byKey = std::memcmp(base + starts[a], base + starts[b], std::min(lengthA, lengthB));
+        if (byKey != 0)
+            return byKey < 0;
+        if (lengthA != lengthB)
+            return lengthA < lengthB;
+        // Equal keys ("file01" and "file1", "b" and a full-width b): by their bytes, then as they were.
+        const int byName = DwgList[a].m_strName.compare(DwgList[b].m_strName);
+        if (byName != 0)
+            return byName < 0;
+        return a < b;
+    });
+    std::vector<DwgData> sorted;
+    sorted.reserve(order.size());
+    for (int i : order)
+        sorted.push_back(std::move(DwgList[i]));
+    for (int i = 0; i < count; ++i)
+        DwgList[i] = std::move(sorted[i]);
+}
+
 void SortDwgList(int mode) {
     const int count = DwgList.GetSize();
     if (count == 0)
@@ -87,13 +125,9 @@ void SortDwgList(int mode) {
     DwgData* first = DwgList.GetData();
     DwgData* last = first + count;
     switch (mode) {
-    case DwgSortByName: {
-        const NameFoldTable& fold = NameFold();
-        std::sort(first, last, [&fold](const DwgData& a, const DwgData& b) {
-            return CompareNamesNoCase(a.m_strName, b.m_strName, fold) < 0;
-        });
+    case DwgSortByName:
+        SortByName(ActiveNameCollation());
         break;
-    }
     case DwgSortByDate:
         std::sort(first, last,
                   [](const DwgData& a, const DwgData& b) { return a.m_timeWrite < b.m_timeWrite; });
@@ -136,9 +170,9 @@ DwgPrefixSearch FindByPrefix(const std::string& text) {
         return result;
     result.ran = true;
     DeselectAllFlags();
-    const NameFoldTable& fold = NameFold();
+    NameCollation& collation = ActiveNameCollation();
     for (int i = 0; i < count; ++i) {
-        if (StartsWithNoCase(DwgList[i].m_strName, text, fold)) {
+        if (collation.StartsWith(DwgList[i].m_strName, text)) {
             result.match = i;
             DwgList[i].Select();
             break;
