@@ -15,19 +15,20 @@ NameCollation::~NameCollation() = default;
 
 const CharacterWeights& NameCollation::Weights(unsigned code) {
     code &= 0xFFFF;
+    const unsigned low = code & 0xFF;
+    Block* known = m_blocks[code >> 8].get();
+    if (known != nullptr && known->known[low])
+        return known->weights[low];
     std::unique_ptr<Block>& block = m_blocks[code >> 8];
     if (!block)
         block = std::make_unique<Block>();
-    const unsigned low = code & 0xFF;
-    if (!block->known[low]) {
-        CharacterWeights w = m_weightsOf(code);
-        if (w.keyLength > CharacterWeights::kCapacity)
-            w.keyLength = CharacterWeights::kCapacity;
-        if (w.primaryLength > w.keyLength)
-            w.primaryLength = w.keyLength;
-        block->weights[low] = w;
-        block->known[low] = true;
-    }
+    CharacterWeights w = m_weightsOf(code);
+    if (w.keyLength > CharacterWeights::kCapacity)
+        w.keyLength = CharacterWeights::kCapacity;
+    if (w.primaryLength > w.keyLength)
+        w.primaryLength = w.keyLength;
+    block->weights[low] = w;
+    block->known[low] = true;
     return block->weights[low];
 }
 
@@ -63,27 +64,47 @@ void AppendNumber(const std::string& digits, std::uint8_t mark, std::string& key
 } // namespace
 
 void NameCollation::AppendSortKey(const std::string& name, std::string& key) {
+    // Weights gather in a buffer on the stack and go to key in a few appends: a name is sorted as often
+    // as it has characters, and one append a character costs more than the look-up.
+    char buffer[512];
+    std::size_t used = 0;
     std::string digits;
+    const std::size_t size = name.size();
+    const auto* bytes = reinterpret_cast<const unsigned char*>(name.data());
     std::size_t at = 0;
-    while (at < name.size()) {
-        std::size_t next = NextCharacter(name, at, m_lead);
-        const CharacterWeights* w = &Weights(CodeAt(name, at, next));
+    while (at < size) {
+        unsigned code = bytes[at];
+        std::size_t next = at + 1;
+        if (m_lead.lead[code] && next < size)
+            code = code * 256u + bytes[next++];
+        const CharacterWeights* w = &Weights(code);
         if (w->digit == kNotADigit) {
-            key.append(reinterpret_cast<const char*>(w->key), w->primaryLength);
+            if (used + CharacterWeights::kCapacity > sizeof buffer) {
+                key.append(buffer, used);
+                used = 0;
+            }
+            std::memcpy(buffer + used, w->key, w->primaryLength);
+            used += w->primaryLength;
             at = next;
             continue;
         }
+        key.append(buffer, used);
+        used = 0;
         digits.clear();
         while (w->digit != kNotADigit) {
             digits.push_back(static_cast<char>(w->digit));
             at = next;
-            if (at >= name.size())
+            if (at >= size)
                 break;
-            next = NextCharacter(name, at, m_lead);
-            w = &Weights(CodeAt(name, at, next));
+            code = bytes[at];
+            next = at + 1;
+            if (m_lead.lead[code] && next < size)
+                code = code * 256u + bytes[next++];
+            w = &Weights(code);
         }
         AppendNumber(digits, m_numberMark, key);
     }
+    key.append(buffer, used);
 }
 
 std::string NameCollation::SortKey(const std::string& name) {
