@@ -65,3 +65,7 @@ bool ContainsForbiddenCharacter(const std::string& name, const LeadByteTable& le
 // A length for a message about a buffer of bytes: "12 characters" when each character is one byte, else
 // "161 characters, 301 bytes" (the limit is then to be said in bytes too).
 std::string CharactersAndBytes(const std::string& text, const LeadByteTable& lead = ActiveLeadBytes());
+
+// The unit of a limit of bytes said of text: "characters" when each character of text is one byte (the
+// two are the same), else "bytes".
+const char* ByteLimitUnit(const std::string& text, const LeadByteTable& lead = ActiveLeadBytes());
