@@ -64,8 +64,8 @@ void AppendNumber(const std::string& digits, std::uint8_t mark, std::string& key
 } // namespace
 
 void NameCollation::AppendSortKey(const std::string& name, std::string& key) {
-    // Weights gather in a buffer on the stack and go to key in a few appends: a name is sorted as often
-    // as it has characters, and one append a character costs more than the look-up.
+    // Weights gather in a buffer on the stack and go to key in a few appends: one append a character
+    // would cost more than the look-up itself, and a sort builds a key for every record.
     char buffer[512];
     std::size_t used = 0;
     std::string digits;
