@@ -2,6 +2,7 @@
 
 #include "host/AdsListUser.h"
 #include "hostapi/HostApi.h"
+#include "hostapi/NarrowText.h"
 #include "hostapi/TextConv.h"
 #include "settings/FolderSettings.h"
 #include "settings/IniFile.h"
@@ -133,11 +134,12 @@ int Orvex(PickerPlatform& platform) {
     // path is taken against the host's current folder now, before the explorer changes it.
     const std::string narrowPath =
         startPath.empty() ? std::string() : platform.WholeStartPath(NarrowAnsi(startPath));
-    if (acceptCaption.size() >= kCaptionChars || cancelCaption.size() >= kCaptionChars) {
-        RefuseTooLong(L"caption", kCaptionChars, kCaptionChars); // multi-byte code pages can grow a text
+    // The bounds count characters, in the narrow text as in the wide: a character of a double-byte code
+    // page is two bytes, and a message that gave bytes would call a 161-character path 301 characters.
+    if (RefuseTooLong(L"accept caption", CharacterCount(acceptCaption), kCaptionChars) ||
+        RefuseTooLong(L"cancel caption", CharacterCount(cancelCaption), kCaptionChars))
         return 0;
-    }
-    if (RefuseTooLong(L"start path", narrowPath.size(), kPathChars)) // made whole, it may have grown
+    if (RefuseTooLong(L"start path", CharacterCount(narrowPath), kPathChars)) // made whole, it may have grown
         return 0;
 
     // This call's arguments exist only here, once every check has passed, and go to this run alone: a
@@ -145,7 +147,7 @@ int Orvex(PickerPlatform& platform) {
     PickerArguments call{acceptCaption, cancelCaption, narrowPath, std::string()};
     if (!narrowPath.empty()) {
         std::string shellPath = platform.StartShellPath(narrowPath);
-        if (shellPath.size() < kPathChars)
+        if (CharacterCount(shellPath) < kPathChars)
             call.startShellPath = std::move(shellPath);
         else
             acutPrintf(L"\nOrvex: the start folder's shell path is too long; starting at the last folder\n");

@@ -114,6 +114,10 @@ bool ContainsForbiddenCharacter(const std::string& name, const LeadByteTable& le
     return false;
 }
 
+const char* ByteLimitUnit(const std::string& text, const LeadByteTable& lead) {
+    return CharacterCount(text, lead) == text.size() ? "characters" : "bytes";
+}
+
 std::string CharactersAndBytes(const std::string& text, const LeadByteTable& lead) {
     const std::size_t characters = CharacterCount(text, lead);
     std::string length = std::to_string(characters) + " characters";

@@ -76,3 +76,7 @@ std::string BreakLongWords(const std::string& text, std::size_t maxChars,
                            const LeadByteTable& lead = ActiveLeadBytes());
 // The same for text in Unicode (UTF-16; a character is one code unit here).
 std::wstring BreakLongWords(const std::wstring& text, std::size_t maxChars);
+
+// The unit of a limit of bytes said of text: "characters" when each character of text is one byte (the
+// two are the same), else "bytes".
+const char* ByteLimitUnit(const std::string& text, const LeadByteTable& lead = ActiveLeadBytes());

@@ -131,11 +131,11 @@ void CDialogSetLa::OnOK() {
         m_LayerName.SetFocus();
         return;
     case FolderSettingsAction::LayerTooLong:
-        ::acedAlert(WidenAnsi(LayerTooLongAlert(layer.size())).c_str());
+        ::acedAlert(WidenAnsi(LayerTooLongAlert(layer)).c_str());
         m_LayerName.SetFocus();
         return;
     case FolderSettingsAction::CommandTooLong:
-        ::acedAlert(WidenAnsi(CommandTooLongAlert(command.size())).c_str());
+        ::acedAlert(WidenAnsi(CommandTooLongAlert(command)).c_str());
         m_LispCommand.SetFocus();
         return;
     case FolderSettingsAction::Write:

@@ -59,15 +59,19 @@ int MaxFolderCommandChars() {
     return MaxIniValueChars(kFolderSettingsCommand);
 }
 
-std::string CommandTooLongAlert(std::size_t length) {
-    return "The LISP command is " + std::to_string(length) +
-           " characters long; the folder's settings hold at most " + std::to_string(MaxFolderCommandChars()) +
-           ". Shorten it, then Accept again.";
+// The settings file's lines are bounded in bytes: text with double-byte characters is told both lengths
+// and the bound in bytes.
+std::string CommandTooLongAlert(const std::string& command) {
+    const bool bytes = CharacterCount(command) != command.size();
+    return "The LISP command is " + CharactersAndBytes(command) +
+           " long; the folder's settings hold at most " + std::to_string(MaxFolderCommandChars()) +
+           (bytes ? " bytes" : "") + ". Shorten it, then Accept again.";
 }
 
-std::string LayerTooLongAlert(std::size_t length) {
-    return "The layer name is " + std::to_string(length) +
-           " characters long; the folder's settings hold at most " + std::to_string(MaxFolderLayerChars()) +
+std::string LayerTooLongAlert(const std::string& layer) {
+    const bool bytes = CharacterCount(layer) != layer.size();
+    return "The layer name is " + CharactersAndBytes(layer) + " long; the folder's settings hold at most " +
+           std::to_string(MaxFolderLayerChars()) + (bytes ? " bytes" : "") +
            ". Shorten it, then Accept again.";
 }
 

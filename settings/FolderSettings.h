@@ -67,8 +67,8 @@ constexpr const char kLayerNameEmptyAlert[] = "Name of layer is empty";
 
 // What the user is told when a text is longer than the file reads back (Accept refused), and the note
 // under the edits when typing or pasting reached the limit (the rest was not taken).
-std::string CommandTooLongAlert(std::size_t length);
-std::string LayerTooLongAlert(std::size_t length);
+std::string CommandTooLongAlert(const std::string& command);
+std::string LayerTooLongAlert(const std::string& layer);
 std::string CommandLimitNote();
 std::string LayerLimitNote();
 

@@ -1,5 +1,6 @@
 #include "settings/IniFile.h"
 
+#include "hostapi/NarrowText.h"
 #include "settings/IniFileIo.h"
 #include "settings/SettingsReport.h"
 
@@ -85,7 +86,7 @@ std::string WhyIniSectionUnreadable(const std::string& keyname) {
         return "the section name \"" + Shown(keyname) + "\" begins with [ or ends with ]";
     if (keyname.size() + 2 > static_cast<std::size_t>(kMaxIniLineChars))
         return "the section name \"" + Shown(keyname) + "\" is longer than " +
-               std::to_string(kMaxIniLineChars - 2) + " characters";
+               std::to_string(kMaxIniLineChars - 2) + " " + ByteLimitUnit(keyname);
     return {};
 }
 
@@ -99,9 +100,9 @@ std::string WhyIniValueUnreadable(const std::string& valuename, const std::strin
     if (!valuename.empty() && valuename.front() == '[' && !value.empty() && value.back() == ']')
         return "the line of " + Shown(valuename) + " would read as a [section]";
     if (value.size() > static_cast<std::size_t>(MaxIniValueChars(valuename)))
-        return "the value of " + Shown(valuename) + " is " + std::to_string(value.size()) +
-               " characters long, at most " + std::to_string(MaxIniValueChars(valuename)) +
-               " can be read back";
+        return "the value of " + Shown(valuename) + " is " + CharactersAndBytes(value) + " long, at most " +
+               std::to_string(MaxIniValueChars(valuename)) +
+               (CharacterCount(value) != value.size() ? " bytes" : "") + " can be read back";
     return {};
 }
 
@@ -169,7 +170,7 @@ bool CIniFile::ReadFile() {
             // The line and the rest of the file are not taken.
             if (keepWhy.empty())
                 keepWhy = "line " + std::to_string(lineNumber) + " is longer than " +
-                          std::to_string(kMaxIniLineChars) + " characters";
+                          std::to_string(kMaxIniLineChars) + " " + ByteLimitUnit(line);
             break;
         }
         if (line.empty())

@@ -1,10 +1,13 @@
 #include "thumbs/DwgList.h"
 
 #include "hostapi/NarrowText.h"
+#include "thumbs/NameCollation.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <cstring>
 #include <utility>
+#include <vector>
 
 CDwgArray DwgList;
 
@@ -80,6 +83,75 @@ std::string SkippedFilesMessage(int skipped) {
            " not shown: the full path is longer than " + std::to_string(kMaxPathChars) + " characters";
 }
 
+namespace {
+
+// One record's place in the sort by name: the first 16 bytes of its key as two integers (most
+// comparisons end there, without a look at the keys' buffer), then where the rest of its key lies.
+struct NameSortEntry {
+    std::uint64_t head[2];
+    std::uint32_t start;  // of the whole key in the buffer
+    std::uint32_t length; // of the whole key
+    int index;            // of the record
+};
+
+std::uint64_t BigEndianAt(const std::string& keys, std::size_t at, std::size_t end) {
+    std::uint64_t value = 0;
+    for (std::size_t i = 0; i < 8; ++i)
+        value = (value << 8) | (at + i < end ? static_cast<unsigned char>(keys[at + i]) : 0u);
+    return value;
+}
+
+} // namespace
+
+void SortByName(NameCollation& collation) {
+    const int count = DwgList.GetSize();
+    // Every key once, side by side in one buffer: the sort then compares bytes, never the locale.
+    std::string keys;
+    keys.reserve(static_cast<std::size_t>(count) * 32);
+    std::vector<NameSortEntry> entries(static_cast<std::size_t>(count));
+    for (int i = 0; i < count; ++i) {
+        const std::size_t start = keys.size();
+        collation.AppendSortKey(DwgList[i].m_strName, keys);
+        NameSortEntry& e = entries[i];
+        e.start = static_cast<std::uint32_t>(start);
+        e.length = static_cast<std::uint32_t>(keys.size() - start);
+        e.index = i;
+    }
+    // The heads once the buffer has stopped moving. A key shorter than a head is padded with zeros, which
+    // no weight is; the lengths then tell "a" from "a" followed by a zero byte.
+    for (NameSortEntry& e : entries) {
+        const std::size_t end = e.start + e.length;
+        e.head[0] = BigEndianAt(keys, e.start, end);
+        e.head[1] = BigEndianAt(keys, e.start + 8, end);
+    }
+    const char* base = keys.data();
+    std::sort(entries.begin(), entries.end(), [base](const NameSortEntry& a, const NameSortEntry& b) {
+        if (a.head[0] != b.head[0])
+            return a.head[0] < b.head[0];
+        if (a.head[1] != b.head[1])
+            return a.head[1] < b.head[1];
+        if (a.length > 16 && b.length > 16) {
+            const int rest =
+                std::memcmp(base + a.start + 16, base + b.start + 16, std::min(a.length, b.length) - 16);
+            if (rest != 0)
+                return rest < 0;
+        }
+        if (a.length != b.length)
+            return a.length < b.length;
+        // Equal keys ("file01" and "file1", "b" and a full-width b): by their bytes, then as they were.
+        const int byName = DwgList[a.index].m_strName.compare(DwgList[b.index].m_strName);
+        if (byName != 0)
+            return byName < 0;
+        return a.index < b.index;
+    });
+    std::vector<DwgData> sorted;
+    sorted.reserve(entries.size());
+    for (const NameSortEntry& e : entries)
+        sorted.push_back(std::move(DwgList[e.index]));
+    for (int i = 0; i < count; ++i)
+        DwgList[i] = std::move(sorted[i]);
+}
+
 void SortDwgList(int mode) {
     const int count = DwgList.GetSize();
     if (count == 0)
@@ -87,13 +159,9 @@ void SortDwgList(int mode) {
     DwgData* first = DwgList.GetData();
     DwgData* last = first + count;
     switch (mode) {
-    case DwgSortByName: {
-        const NameFoldTable& fold = NameFold();
-        std::sort(first, last, [&fold](const DwgData& a, const DwgData& b) {
-            return CompareNamesNoCase(a.m_strName, b.m_strName, fold) < 0;
-        });
+    case DwgSortByName:
+        SortByName(ActiveNameCollation());
         break;
-    }
     case DwgSortByDate:
         std::sort(first, last,
                   [](const DwgData& a, const DwgData& b) { return a.m_timeWrite < b.m_timeWrite; });
@@ -136,9 +204,9 @@ DwgPrefixSearch FindByPrefix(const std::string& text) {
         return result;
     result.ran = true;
     DeselectAllFlags();
-    const NameFoldTable& fold = NameFold();
+    NameCollation& collation = ActiveNameCollation();
     for (int i = 0; i < count; ++i) {
-        if (StartsWithNoCase(DwgList[i].m_strName, text, fold)) {
+        if (collation.StartsWith(DwgList[i].m_strName, text)) {
             result.match = i;
             DwgList[i].Select();
             break;

@@ -90,7 +90,13 @@ std::string SkippedFilesMessage(int skipped);
 // --- Sorting -------------------------------------------------------------------------------------
 
 // Sorts every record by name (0), date (1) or size (2), ascending. Other modes leave the list as it is.
+// By name: the collation's order (ActiveNameCollation: the user's locale, case and width ignored, runs of
+// digits by value); names with equal keys by their bytes, and the same names as they were.
 void SortDwgList(int mode);
+
+class NameCollation;
+// The sort by name with the keys of collation, each built once.
+void SortByName(NameCollation& collation);
 
 // --- Selection and search ------------------------------------------------------------------------
 
@@ -109,9 +115,10 @@ struct DwgPrefixSearch {
     int match = -1;   // index of the first match, -1 when none
 };
 
-// Searches for the first record whose name starts with text (a whole name matches too), case ignored
-// through the fold table. When it runs it first clears every flag, then sets the match's. The caller
-// then shows the match and makes it the current drawing, or, without a match, leaves none current.
+// Searches for the first record whose name starts with text (a whole name matches too), case and width
+// ignored, character by character as the name collation tells them apart. When it runs it first clears every
+// flag, then sets the match's. The caller then shows the match and makes it the current drawing, or, without
+// a match, leaves none current.
 DwgPrefixSearch FindByPrefix(const std::string& text);
 // Same search; the index of the match or -1.
 int FindByPrefixIndex(const std::string& text);

@@ -1,7 +1,9 @@
 // Case folding of drawing names, one byte at a time through a 256-entry table of the ANSI code page. The
-// scan lowers names with it, the search and the sort by name compare through it, so all three agree on
-// which letters are the same, and a comparison costs one table look-up per byte. Portable: no
-// <windows.h>; the Windows build fills the table from the system's code page.
+// scan lowers names with it and the exact-name comparisons (finding a drawing by name, a rename that
+// changes only the case) go through it, so they agree on which letters are the same, and a comparison
+// costs one table look-up per byte. The order of names and the search by prefix follow the locale
+// instead (NameCollation.h). Portable: no <windows.h>; the Windows build fills the table from the
+// system's code page.
 #pragma once
 
 #include <string>

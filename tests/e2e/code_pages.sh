@@ -3,7 +3,8 @@
 # call in the code page of its locale (932, 936, 950, 949), where the second byte of 表 ソ 能 運 功 許 is "\"
 # (0x5C). Folders ending in such a character are opened and picked from (never their parent's drawings),
 # the tree walks through ソフト, drawings are copied, pasted, deleted and renamed there, the saved name's
-# search text is whole, a folder's settings in 運 are read with the pick, and a Korean folder is listed.
+# search text is whole, a folder's settings in 運 are read with the pick, and folders are sorted and
+# searched by the locale's order (Korean, Chinese, full-width Japanese letters, digits by value).
 # Wine takes each program's code page from LANG when it starts (the probe below checks it); tools/wine-run
 # runs the CJK locales in a prefix of their own whose interface font links to the CJK font that
 # tools/ensure-packages installs (with the locales).
@@ -213,6 +214,9 @@ expect_true "932: a Japanese name's tooltip is as high as an English one's (got 
 
 rm -f "$WORK/lib/Orvex1.ini"
 # --- 949: a Korean folder listed and sorted by name ------------------------------------------------------
+# By the locale's order, as the system's file manager lists them: Latin letters first, then the syllables
+# in their Korean order. 갂 and 똠 are in the code page's extension range (lead bytes 0x81-0xA0): by bytes
+# they came before 도면 and 한국.
 lib949="$base/kr/lib"
 drawing "$lib949/도면.dwg" "$lib949/한국.dwg" "$lib949/갂.dwg" "$lib949/똠.dwg" "$lib949/zz.dwg"
 script 'wait contains=".dwg" timeout=30000' 'sleep 300' 'count class=Edit contains=".dwg"' \
@@ -220,15 +224,55 @@ script 'wait contains=".dwg" timeout=30000' 'sleep 300' 'count class=Edit contai
        'text class=Edit contains=".dwg" nth=2' 'text class=Edit contains=".dwg" nth=3' \
        'text class=Edit contains=".dwg" nth=4' "$(shot cp949-sorted)" 'key escape'
 in_locale ko_KR.UTF-8 run "$(call_at "$lib949")"
-# The list keeps the file system's last entry last (it takes no part in the sort); the rest by name.
-last949=$(python3 -c 'import os, sys; print([n for n in os.listdir(sys.argv[1]) if ".dwg" in n.lower()][-1])' "$lib949")
-order949=$(python3 -c '
-import os, sys
-names = [n for n in os.listdir(sys.argv[1]) if ".dwg" in n.lower()]
-last = names[-1]
-rest = sorted(names[:-1], key=lambda n: n.lower().encode("cp949"))
-print(" ".join(rest + [last]))' "$lib949")
 expect_line "949: the five drawings are shown" "[script] count 5"
-expect_true "949: their labels are whole, sorted by name (got $(labels); expected $order949)" [ "$(labels)" == "$order949" ]
+expect_true "949: their labels are whole, in the Korean order (got $(labels))" \
+  [ "$(labels)" == "zz.dwg 갂.dwg 도면.dwg 똠.dwg 한국.dwg" ]
+
+# --- 936: a GBK extension character among the common ones ------------------------------------------------
+# 丂 (kao, 0x81 0x40) is a GBK extension character: by bytes it came before every common one; by the
+# locale's order it stands between 安 (an) and 一 (yi).
+lib936s="$base/cn/sorted"
+drawing "$lib936s/一.dwg" "$lib936s/丂.dwg" "$lib936s/安.dwg"
+script 'wait contains=".dwg" timeout=30000' 'sleep 300' 'text class=Edit contains=".dwg" nth=0' \
+       'text class=Edit contains=".dwg" nth=1' 'text class=Edit contains=".dwg" nth=2' "$(shot cp936-sorted)" \
+       'key escape'
+in_locale zh_CN.UTF-8 run "$(call_at "$lib936s")"
+expect_true "936: 丂 sorts between 安 and 一, not before them (got $(labels))" [ "$(labels)" == "安.dwg 丂.dwg 一.dwg" ]
+
+rm -f "$WORK/lib/Orvex1.ini"
+# --- 932: a full-width name found by its half-width letters ------------------------------------------------
+# Ｂｏｘ.dwg is written in full-width letters; typing "b" on the keyboard finds it, as the file manager does,
+# and full-width "ｃ" pasted into the search finds c.dwg. Full-width letters sort with their half-width
+# ones, and runs of digits by value (２ before 10).
+lib932w="$base/jp/wide"
+drawing "$lib932w/a.dwg" "$lib932w/Ｂｏｘ.dwg" "$lib932w/c.dwg" "$lib932w/d10.dwg" "$lib932w/d２.dwg"
+script 'wait contains=".dwg" timeout=30000' 'sleep 300' 'text class=Edit contains=".dwg" nth=0' \
+       'text class=Edit contains=".dwg" nth=1' 'text class=Edit contains=".dwg" nth=2' \
+       'text class=Edit contains=".dwg" nth=3' 'text class=Edit contains=".dwg" nth=4' \
+       "click $search" 'clipboard-text "ｃ"' "right-click $search" 'sleep 300' 'key p' 'sleep 300' \
+       "text $search" 'text contains="orvexcjk" nth=0' \
+       "click $search" 'key end' 'key shift+home' 'type "b"' 'sleep 300' "text $search" "$(shot cp932-search-wide)" \
+       'click text="Insert"'
+in_locale ja_JP.UTF-8 run "$(call_at "$lib932w")"
+labels932=$(labels | cut -d' ' -f1-5) # then the title, which names the drawing chosen
+expect_true "932: full-width Ｂ sorts with b, d２ before d10 (got $labels932)" \
+  [ "$labels932" == "a.dwg Ｂｏｘ.dwg c.dwg d２.dwg d10.dwg" ]
+expect_line "932: full-width ｃ pasted into the search" "[script] text ｃ"
+expect_true "932: and it chose c.dwg, which the title names" has "$OUT" '^\[script\] text .*\\c\.dwg$'
+expect_line "932: b typed into the search" "[script] text b"
+expect_line "932: b chose Ｂｏｘ.dwg, which accept returns" \
+  "=> (\"$(picked "$lib932w/Ｂｏｘ.dwg")\" (\"\" \"\" \"\"))"
+
+rm -f "$WORK/lib/Orvex1.ini"
+# --- 1252: runs of digits by value ------------------------------------------------------------------------
+lib1252="$base/west/doors"
+drawing "$lib1252/door-1000.dwg" "$lib1252/door-900.dwg" "$lib1252/Door-90.dwg" "$lib1252/étage.dwg" "$lib1252/f.dwg"
+script 'wait contains=".dwg" timeout=30000' 'sleep 300' 'text class=Edit contains=".dwg" nth=0' \
+       'text class=Edit contains=".dwg" nth=1' 'text class=Edit contains=".dwg" nth=2' \
+       'text class=Edit contains=".dwg" nth=3' 'text class=Edit contains=".dwg" nth=4' "$(shot cp1252-sorted)" \
+       'key escape'
+in_locale C.UTF-8 run "$(call_at "$lib1252")"
+expect_true "1252: door-90, door-900, door-1000 by value, étage before f (not after it, as its byte 0xE9) (got $(labels))" \
+  [ "$(labels)" == "door-90.dwg door-900.dwg door-1000.dwg étage.dwg f.dwg" ]
 
 finish

@@ -6,7 +6,25 @@
 folder="$WORK/orvexmany"
 gen_dwg "$folder" 3000 --variant 5
 [ "$(ls "$folder" | wc -l)" -eq 3000 ] && pass "3000 drawings generated" || fail "generator: $(cat "$WORK/gen.err")"
-names=$(ls "$folder" | tr 'A-Z' 'a-z' | LC_ALL=C sort -f)
+# The order the explorer shows them in, the file manager's: letters by the alphabet with case ignored,
+# runs of digits by value (after the punctuation, before the letters), a hyphen passed over as the
+# locale's word sort does, then space, "." and "_" in the locale's order of them (the only characters
+# these names hold).
+names=$(ls "$folder" | tr 'A-Z' 'a-z' | python3 -c '
+import re, sys
+punctuation = {" ": 0x02, ".": 0x33, "_": 0x44}
+def key(name):
+    weights = []
+    for part in re.findall(r"[0-9]+|[^0-9]", name):
+        if part.isdigit():
+            value = part.lstrip("0")
+            weights.append((0x0D, len(value), value))
+        elif part in punctuation:
+            weights.append((0x07, punctuation[part], ""))
+        elif part != "-":
+            weights.append((0x0E, 0, part))
+    return weights
+print("\n".join(sorted(sys.stdin.read().splitlines(), key=key)))')
 first=$(printf '%s\n' "$names" | head -1)
 last=$(printf '%s\n' "$names" | tail -1)
 call="(Orvex 1 2 \"$(lisppath "$folder")\\\\\" \"Insert\" \"Close\")"

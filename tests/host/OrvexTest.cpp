@@ -8,6 +8,10 @@
 
 #include <gtest/gtest.h>
 
+#ifdef _WIN32
+#include <windows.h>
+#endif
+
 #if defined(__SANITIZE_ADDRESS__)
 #include <sanitizer/lsan_interface.h>
 #endif
@@ -376,6 +380,49 @@ TEST_F(OrvexTest, StartPathsOf259CharactersAreTakenAnd260Or1000Refused) {
     EXPECT_TRUE(platform.steps.empty());
     EXPECT_NE(host.printed().find("start path is too long (305 characters; at most 259)"), std::string::npos);
 }
+
+#ifdef _WIN32
+// Run again with Wine in the Japanese locale: a character of the code page is two bytes there, and the
+// bound and the message count characters, not bytes.
+TEST_F(OrvexTest, AJapaneseStartPathIsMeasuredInCharacters) {
+    if (::GetACP() != 932)
+        GTEST_SKIP() << "runs in code page 932, this is " << ::GetACP();
+    const std::wstring so = L"\x30BD"; // katakana so: two bytes, the second one "\"
+    std::wstring path = L"C:\\";
+    for (int i = 0; i < 157; ++i)
+        path += so;
+    path += L"\\"; // 161 characters, 318 bytes
+    ASSERT_EQ(NarrowAnsi(path).size(), 318u);
+    FiveArguments(path);
+    EXPECT_EQ(Orvex(platform), 1);
+    ASSERT_EQ(platform.handed.size(), 1u);
+    EXPECT_EQ(platform.handed[0].startPath, NarrowAnsi(path));
+    EXPECT_EQ(host.printed().find("too long"), std::string::npos) << host.printed();
+
+    // Made whole it grows past the bound: 305 characters (405 bytes) are said.
+    host.events.clear();
+    platform.steps.clear();
+    std::wstring current = L"C:\\";
+    for (int i = 0; i < 100; ++i)
+        current += so;
+    platform.currentFolder = NarrowAnsi(current + L"\\");
+    FiveArguments(std::wstring(200, L'r') + L"\\");
+    EXPECT_EQ(Orvex(platform), 0);
+    EXPECT_TRUE(platform.steps.empty());
+    EXPECT_NE(host.printed().find("start path is too long (305 characters; at most 259)"), std::string::npos)
+        << host.printed();
+
+    // A caption of 100 Japanese characters (200 bytes) is within its 127.
+    host.events.clear();
+    platform.steps.clear();
+    std::wstring caption;
+    for (int i = 0; i < 100; ++i)
+        caption += so;
+    FiveArguments(L"C:\\dwg\\", caption, L"Close");
+    EXPECT_EQ(Orvex(platform), 1);
+    EXPECT_EQ(platform.handed.back().acceptCaption, NarrowAnsi(caption));
+}
+#endif
 
 TEST_F(OrvexTest, AShellPathTooLongIsSaidAndTheRunStartsWithoutOne) {
     // This platform's shell path is the path behind "Desktop\Computer\" (17 characters): a start path of

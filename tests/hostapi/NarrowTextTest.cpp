@@ -173,6 +173,11 @@ TEST(NarrowText, LengthsForMessages) {
     EXPECT_EQ(CharactersAndBytes("C:\\\x83\x5C\x83\x74\x83\x67", LeadBytesOfCodePage(932)),
               "6 characters, 9 bytes");
     EXPECT_EQ(CharactersAndBytes("C:\\\x83\x5C\x83\x74\x83\x67", LeadBytesOfCodePage(1252)), "9 characters");
+    // A limit of bytes is said in bytes beside a text of double-byte characters, else in characters.
+    EXPECT_STREQ(ByteLimitUnit("C:\\dwg", LeadBytesOfCodePage(932)), "characters");
+    EXPECT_STREQ(ByteLimitUnit("C:\\\x83\x5C", LeadBytesOfCodePage(932)), "bytes");
+    EXPECT_STREQ(ByteLimitUnit("C:\\\x83\x5C", LeadBytesOfCodePage(1252)), "characters");
+    EXPECT_STREQ(ByteLimitUnit(""), "characters");
 }
 
 // The longest word of text (a run without blanks or line breaks), in characters: a message box wraps at

@@ -125,7 +125,7 @@ TEST(FolderSettingsAccept, TextsLongerThanTheFileReadsBackAreRefused) {
     EXPECT_EQ(DecideFolderSettingsAccept(true, layer + "L", ""), A::DeleteFile)
         << "the layer edit is not read";
     EXPECT_EQ(
-        CommandTooLongAlert(2158),
+        CommandTooLongAlert(std::string(2158, 'c')),
         "The LISP command is 2158 characters long; the folder's settings hold at most 2034. Shorten it, "
         "then Accept again.");
     EXPECT_EQ(CommandLimitNote(), "The command holds at most 2034 characters; the rest was not taken.");

@@ -606,7 +606,7 @@ TEST_F(FolderSettingsDialog, ACommandLongerThanTheFileReadsBackIsRefusedAndTheFi
     });
     EXPECT_EQ(result, IDCANCEL);
     EXPECT_TRUE(stillOpen) << "the dialog stays open";
-    EXPECT_EQ(g_alerts, std::vector<std::wstring>{WidenAnsi(CommandTooLongAlert(2158))});
+    EXPECT_EQ(g_alerts, std::vector<std::wstring>{WidenAnsi(CommandTooLongAlert(std::string(2158, 'c')))});
     EXPECT_EQ(focused, "command");
     EXPECT_EQ(keptLength, 2158u) << "what was entered stays to be shortened";
     EXPECT_EQ(Ini(), before);
@@ -661,7 +661,7 @@ TEST_F(FolderSettingsDialog, ALayerNameLongerThanTheFileReadsBackIsRefused) {
         d.Press(IDOK);
         d.Press(IDCANCEL);
     });
-    EXPECT_EQ(g_alerts, std::vector<std::wstring>{WidenAnsi(LayerTooLongAlert(layer.size()))});
+    EXPECT_EQ(g_alerts, std::vector<std::wstring>{WidenAnsi(LayerTooLongAlert(layer))});
     EXPECT_EQ(Ini(), before);
 }
 

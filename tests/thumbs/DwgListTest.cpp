@@ -218,6 +218,13 @@ TEST_F(DwgListTest, SortByNameIgnoresCase) {
     EXPECT_EQ(Names(), (std::vector<std::string>{"Aardvark.dwg", "alpha.dwg", "Beta.dwg", "CHARLIE.dwg"}));
 }
 
+TEST_F(DwgListTest, SortByNameTakesRunsOfDigitsByValue) {
+    Scan({File("door-1000.dwg"), File("door-900.dwg"), File("Door-90.dwg"), File("door-9a.dwg")});
+    SortDwgList(DwgSortByName);
+    EXPECT_EQ(Names(),
+              (std::vector<std::string>{"door-9a.dwg", "door-90.dwg", "door-900.dwg", "door-1000.dwg"}));
+}
+
 TEST_F(DwgListTest, SortByDateOldestFirst) {
     Scan({File("n.dwg", 300), File("o.dwg", -10), File("m.dwg", 200), File("z.dwg", 0)});
     SortDwgList(DwgSortByDate);
@@ -277,12 +284,16 @@ TEST_F(DwgListTest, LargeSortOrdersEveryRecord) {
     for (int mode = 0; mode < 3; ++mode) {
         SortDwgList(mode);
         ASSERT_EQ(DwgList.GetSize(), 1000);
+        if (mode == 0) {
+            // The numbers in the names by value: f0, f1, f2, ... f999.
+            for (int i = 0; i < 1000; ++i)
+                ASSERT_EQ(DwgList[i].m_strName, "f" + std::to_string(i) + ".dwg");
+            continue;
+        }
         for (int i = 1; i < 1000; ++i) {
             const DwgData& a = DwgList[i - 1];
             const DwgData& b = DwgList[i];
-            if (mode == 0)
-                ASSERT_LE(CompareNamesNoCase(a.m_strName, b.m_strName), 0);
-            else if (mode == 1)
+            if (mode == 1)
                 ASSERT_LE(a.m_timeWrite, b.m_timeWrite);
             else
                 ASSERT_LE(a.m_nSize, b.m_nSize);
