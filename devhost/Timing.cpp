@@ -249,6 +249,58 @@ int __cdecl TimedFindClose(std::intptr_t search) {
     return result;
 }
 
+// The folder scan's wide search. The pick's check of a name (FindFirstFileW) goes through FindNextFileW
+// and FindClose too: only the search FindFirstFileExW began is counted. The scan runs on a thread of the
+// library's own when it is slow: its lines take no part in the user-interface thread's overhead.
+using FindFirstExWFn = HANDLE(WINAPI*)(LPCWSTR, FINDEX_INFO_LEVELS, LPVOID, FINDEX_SEARCH_OPS, LPVOID, DWORD);
+using FindNextWFn = BOOL(WINAPI*)(HANDLE, LPWIN32_FIND_DATAW);
+using FindCloseWFn = BOOL(WINAPI*)(HANDLE);
+FindFirstExWFn g_findFirstExW = nullptr;
+FindNextWFn g_findNextW = nullptr;
+FindCloseWFn g_findCloseW = nullptr;
+HANDLE volatile g_wideScan = INVALID_HANDLE_VALUE;
+volatile LONG g_wideScanEntries = 0;
+
+void ScanLine(const std::wstring& what) {
+    if (!g_inCall)
+        return;
+    try {
+        if (GetCurrentThreadId() == g_uiThread) {
+            Overhead measuring;
+            Line(Elapsed(), what);
+        } else {
+            Line(Elapsed(), what);
+        }
+    } catch (...) {
+    }
+}
+
+HANDLE WINAPI TimedFindFirstFileExW(LPCWSTR pattern, FINDEX_INFO_LEVELS level, LPVOID found,
+                                    FINDEX_SEARCH_OPS search, LPVOID filter, DWORD flags) {
+    ScanLine(L"scan-begin " + std::wstring(pattern ? pattern : L""));
+    const HANDLE handle = g_findFirstExW(pattern, level, found, search, filter, flags);
+    InterlockedExchange(&g_wideScanEntries, handle != INVALID_HANDLE_VALUE ? 1 : 0);
+    g_wideScan = handle;
+    return handle;
+}
+
+BOOL WINAPI TimedFindNextFileW(HANDLE handle, LPWIN32_FIND_DATAW found) {
+    const BOOL result = g_findNextW(handle, found);
+    if (result && handle == g_wideScan)
+        InterlockedIncrement(&g_wideScanEntries);
+    return result;
+}
+
+BOOL WINAPI TimedFindCloseW(HANDLE handle) {
+    const bool scan = handle != INVALID_HANDLE_VALUE && handle == g_wideScan;
+    const BOOL result = g_findCloseW(handle);
+    if (scan) {
+        g_wideScan = INVALID_HANDLE_VALUE;
+        ScanLine(L"scan-end " + std::to_wstring(g_wideScanEntries) + L" entries");
+    }
+    return result;
+}
+
 using SetDIBitsToDeviceFn = int(WINAPI*)(HDC, int, int, DWORD, DWORD, int, int, UINT, UINT, const VOID*,
                                          const BITMAPINFO*, UINT);
 SetDIBitsToDeviceFn g_setDIBitsToDevice = nullptr;
@@ -385,6 +437,10 @@ void TimingWatchLibrary(HMODULE library) {
     if (!Watch(library, "_findnext64", &TimedFindNext, g_findNext))
         Watch(library, "_findnext64i32", &TimedFindNext, g_findNext);
     Watch(library, "_findclose", &TimedFindClose, g_findClose);
+    // The folder scan itself: the system's wide search.
+    Watch(library, "FindFirstFileExW", &TimedFindFirstFileExW, g_findFirstExW);
+    Watch(library, "FindNextFileW", &TimedFindNextFileW, g_findNextW);
+    Watch(library, "FindClose", &TimedFindCloseW, g_findCloseW);
     Watch(library, "SetDIBitsToDevice", &TimedSetDIBitsToDevice, g_setDIBitsToDevice);
 }
 

@@ -17,7 +17,8 @@ struct MemoryReader : FolderReader {
     std::vector<std::string> reads;
     std::vector<std::string> currentDirectories;
 
-    bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem) override {
+    bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem,
+              ScanProgress& progress) override {
         reads.push_back(folder);
         if (auto said = problems.find(folder); said != problems.end())
             problem = said->second;
