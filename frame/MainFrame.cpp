@@ -316,6 +316,9 @@ void CMainFrame::OnFolderShown() {
         SetTimer(kTimerScan, kScanCountMs);
     } else {
         KillTimer(kTimerScan);
+        // The tree opens the start folder it kept closed while the folder was read.
+        if (CChildView* tree = GetFolderTree())
+            tree->OpenDeferredTarget();
         // What went wrong stays in the status bar; else it comes back to the count.
         m_strIdleMessage =
             m_folder.Problem().empty() ? DrawingCountText(m_folder.Count()) : m_folder.Problem();

@@ -321,6 +321,11 @@ void CShellTreeCtrl::OpenPathTargetLater() {
         PostMessage(WM_ORVEX_OPEN_TARGET);
 }
 
+void CShellTreeCtrl::OpenDeferredTarget() {
+    if (m_hOpenLater && m_hWnd)
+        PostMessage(WM_ORVEX_OPEN_TARGET);
+}
+
 void CShellTreeCtrl::WalkToStartLater() {
     PostMessage(WM_ORVEX_WALK_START);
 }
@@ -368,6 +373,9 @@ LRESULT CShellTreeCtrl::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
         WalkToStart();
         return 0;
     case WM_ORVEX_OPEN_TARGET: {
+        // Kept for the scan's end: filling the node reads the folder on this thread.
+        if (m_pFolder && m_pFolder->IsScanning())
+            return 0;
         HTREEITEM item = m_hOpenLater;
         m_hOpenLater = nullptr;
         if (item && !m_bClosing)

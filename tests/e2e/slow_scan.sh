@@ -14,6 +14,7 @@ folder() {
 }
 folder "$root/big" 60 big
 folder "$root/small" 2 small
+mkdir -p "$root/big/sub" # the tree opens big to show it, once big is read
 [ "$(find "$root" -name '*.dwg' | wc -l)" -eq 62 ] && pass "62 drawings in two folders" ||
   fail "generator: $(cat "$WORK/gen.err")"
 
@@ -33,10 +34,12 @@ has() { grep -q -- "$2" <<<"$1"; } # has TEXT PATTERN
 script "wait $status contains=\"Reading the folder\" timeout=20000" \
        "screenshot $frame $(winpath "$WORK/slow-scan-reading.png")" \
        "text $status" 'count class=Edit contains=".dwg" visible=any' \
+       'echo tree-during' 'tree-items class=SysTreeView32' \
        'sleep 700' "text $status" \
        'wait contains="big-13.dwg" timeout=20000' 'sleep 300' \
        "screenshot $frame $(winpath "$WORK/slow-scan-read.png")" \
        "text $status" 'count class=Edit contains=".dwg" visible=any' \
+       'echo tree-after' 'tree-items class=SysTreeView32' \
        'double-click text="big-13.dwg" at=60,-50'
 run
 first_paint=$(printf '%s\n' "$OUT" | awk '$1 == "[timing]" && $3 == "paint" && $4 == "ToolbarWindow32" { print $2; exit }')
@@ -55,6 +58,12 @@ expect_true "no thumbnail shows while the folder is read, the grid's once it is 
   [ "$(counts | cut -d' ' -f1)" == "0" ]
 expect_true "the status bar counts the folder's drawings at the end ($(texts | sed -n 3p))" \
   [ "$(texts | sed -n 3p)" == "60 drawings" ]
+# The tree's item big as the tree listed it after the marker MARK: "big [expanded] [selected] ...".
+big_item() { printf '%s\n' "$OUT" | sed -n "/^\[script\] $1\$/,\$p" |
+             sed -n 's/^\[script\] tree-item [0-9]* \(big\( .*\)\?\)$/\1/p' | head -1; }
+expect_true "the tree keeps the folder being read closed: reading it for its sub-folders would hold the host ($(big_item tree-during))" \
+  test -n "$(big_item tree-during)" -a -z "$(big_item tree-during | grep expanded)"
+expect_true "and opens it once it is read ($(big_item tree-after))" has "$(big_item tree-after)" '^big expanded'
 expect_line "a double-click after the read picks its drawing" \
   "=> (\"$(lisppath "$root/big")\\\\big-13.dwg\" (\"\" \"\" \"\"))"
 
