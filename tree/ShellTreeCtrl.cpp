@@ -434,6 +434,9 @@ void CShellTreeCtrl::RefreshCurrentFolder() {
 void CShellTreeCtrl::OnSelChanged(HTREEITEM item) {
     if (m_bClosing || !m_bFollowSelection || !item)
         return;
+    // The user went elsewhere while the start folder was read: it is not opened behind their back.
+    if (m_hOpenLater && item != m_hOpenLater && m_pFolder && m_pFolder->IsScanning())
+        m_hOpenLater = nullptr;
     ShowFolder(item);
     HighlightSelected(item);
     SetFocus();

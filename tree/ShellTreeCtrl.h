@@ -64,7 +64,8 @@ public:
     // sub-folders (the better part of a second for 100,000 drawings under Wine), which the first
     // pictures need not wait for. Nothing happens when the node has gone meanwhile. While the folder model
     // reads a folder on its scan's thread the node is kept closed (the host's thread would read a folder
-    // of a million files again, and Escape would wait for it): OpenDeferredTarget opens it then.
+    // of a million files again, and Escape would wait for it): OpenDeferredTarget opens it then, unless
+    // the user selected another node meanwhile.
     void OpenPathTargetLater();
     // Opens the path target OpenPathTargetLater kept closed during a scan; nothing when none waits.
     void OpenDeferredTarget();

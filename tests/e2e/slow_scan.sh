@@ -87,7 +87,7 @@ script "wait $status contains=\"Reading the folder\" timeout=20000" \
        'sleep 3500' \
        "screenshot $frame $(winpath "$WORK/slow-scan-other.png")" \
        'count class=Edit contains="small-" visible=any' 'count class=Edit contains="big-" visible=any' \
-       "text $status" "text $frame" \
+       "text $status" "text $frame" 'echo tree-other' 'tree-items class=SysTreeView32' \
        'double-click text="small-2.dwg" at=60,-50'
 run
 expect_true "the keyboard is in the tree during the read ($(printf '%s\n' "$OUT" | sed -n 's/^\[script\] focus //p'))" \
@@ -96,6 +96,8 @@ expect_true "the folder chosen in the tree shows its 2 drawings, none of the fir
   [ "$(counts)" == "2 0 2 0" ]
 expect_true "the status bar counts the folder chosen ($(texts | head -1))" [ "$(texts | head -1)" == "2 drawings" ]
 expect_true "the title names the folder chosen ($(texts | sed -n 2p))" has "$(texts | sed -n 2p)" 'small$'
+expect_true "the folder left during its read is not opened behind the user's back ($(big_item tree-other))" \
+  test -n "$(big_item tree-other)" -a -z "$(big_item tree-other | grep expanded)"
 expect_line "a pick in the folder chosen returns its path" \
   "=> (\"$(lisppath "$root/small")\\\\small-2.dwg\" (\"\" \"\" \"\"))"
 
