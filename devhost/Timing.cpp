@@ -43,13 +43,26 @@ double Elapsed() {
            static_cast<double>(g_frequency.QuadPart);
 }
 
+// Held while the user-interface thread measures and while another thread (the library's scan) takes its
+// time and writes its line: a time taken in the middle of a measuring would have that measuring's
+// overhead left in, and come out after a later line of the user-interface thread.
+struct LineOrder {
+    CRITICAL_SECTION section;
+    LineOrder() { InitializeCriticalSection(&section); }
+    ~LineOrder() { DeleteCriticalSection(&section); }
+};
+LineOrder g_lineOrder;
+
 // Adds the time from its construction to its destruction to the overhead.
 class Overhead {
 public:
-    Overhead() : m_begin(Now()) {}
+    Overhead() : m_begin(Now()) { EnterCriticalSection(&g_lineOrder.section); }
     Overhead(const Overhead&) = delete;
     Overhead& operator=(const Overhead&) = delete;
-    ~Overhead() { g_overhead += Now() - m_begin; }
+    ~Overhead() {
+        g_overhead += Now() - m_begin;
+        LeaveCriticalSection(&g_lineOrder.section);
+    }
 
 private:
     LONGLONG m_begin;
@@ -269,7 +282,12 @@ void ScanLine(const std::wstring& what) {
             Overhead measuring;
             Line(Elapsed(), what);
         } else {
-            Line(Elapsed(), what);
+            EnterCriticalSection(&g_lineOrder.section);
+            try {
+                Line(Elapsed(), what);
+            } catch (...) {
+            }
+            LeaveCriticalSection(&g_lineOrder.section);
         }
     } catch (...) {
     }
