@@ -67,7 +67,19 @@ expect_true "and opens it once it is read ($(big_item tree-after))" has "$(big_i
 expect_line "a double-click after the read picks its drawing" \
   "=> (\"$(lisppath "$root/big")\\\\big-13.dwg\" (\"\" \"\" \"\"))"
 
-# 2. Escape while the folder is read: the call returns at once, the host takes input again.
+# 2. The drawing picked in the last call is chosen again once the slow folder is read, as after a quick one.
+script "wait $status contains=\"Reading the folder\" timeout=20000" "text $frame" \
+       'wait contains="big-13.dwg" timeout=20000' 'sleep 500' "text $frame" 'text id=32790' \
+       'enabled text="Insert"' 'click text="Insert"'
+run
+titles() { printf '%s\n' "$OUT" | sed -n 's/^\[script\] text //p' | sed 's/.*\\//' | tr '\n' ' ' | sed 's/ $//'; }
+expect_true "the title names the folder while it is read, then the drawing of the last call, chosen again (got $(titles))" \
+  [ "$(titles)" == "big big-13.dwg big-13" ]
+expect_line "the accept button is enabled for it" "[script] enabled yes"
+expect_line "the accept button takes the drawing chosen again" \
+  "=> (\"$(lisppath "$root/big")\\\\big-13.dwg\" (\"\" \"\" \"\"))"
+
+# 3. Escape while the folder is read: the call returns at once, the host takes input again.
 script "wait $status contains=\"Reading the folder\" timeout=20000" 'key escape'
 run
 expect_line "Escape while the folder is read cancels" "=> nil"
@@ -79,7 +91,7 @@ expect_true "Escape during the read ends the call at once (${closing:-?} ms) and
 expect_true "the abandoned read never reached its end during the call" test -z "$(at scan-end)"
 expect_true "devhost ended on its own after the call (exit $RC)" test "$RC" -eq 0
 
-# 3. Another folder chosen in the tree during the read: it is shown, the first one's drawings never are.
+# 4. Another folder chosen in the tree during the read: it is shown, the first one's drawings never are.
 script "wait $status contains=\"Reading the folder\" timeout=20000" \
        "wait class=SysTreeView32 timeout=10000" 'focus' 'key down' \
        'wait contains="small-1.dwg" timeout=20000' 'sleep 300' \
