@@ -38,8 +38,15 @@ LONGLONG Now() {
     return now.QuadPart;
 }
 
+// The moment the outermost measuring began, while one goes on (0: none).
+LONGLONG g_measuringBegan = 0;
+int g_measuringDepth = 0;
+
+// Inside a measuring, the moment it began: its own time is left out of the lines it writes too, so a
+// line written after it never shows an earlier time than one written in it.
 double Elapsed() {
-    return static_cast<double>(Now() - g_start.QuadPart - g_overhead) * 1000.0 /
+    const LONGLONG now = g_measuringDepth > 0 ? g_measuringBegan : Now();
+    return static_cast<double>(now - g_start.QuadPart - g_overhead) * 1000.0 /
            static_cast<double>(g_frequency.QuadPart);
 }
 
@@ -54,18 +61,23 @@ struct LineOrder {
 LineOrder g_lineOrder;
 
 // Adds the time from its construction to its destruction to the overhead.
+// Nested ones count once, from the outermost.
 class Overhead {
 public:
-    Overhead() : m_begin(Now()) { EnterCriticalSection(&g_lineOrder.section); }
+    Overhead() {
+        EnterCriticalSection(&g_lineOrder.section);
+        if (g_measuringDepth++ == 0)
+            g_measuringBegan = Now();
+    }
     Overhead(const Overhead&) = delete;
     Overhead& operator=(const Overhead&) = delete;
     ~Overhead() {
-        g_overhead += Now() - m_begin;
+        if (--g_measuringDepth == 0) {
+            g_overhead += Now() - g_measuringBegan;
+            g_measuringBegan = 0;
+        }
         LeaveCriticalSection(&g_lineOrder.section);
     }
-
-private:
-    LONGLONG m_begin;
 };
 
 void Line(double ms, const std::wstring& what) {

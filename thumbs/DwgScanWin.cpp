@@ -138,15 +138,17 @@ struct ScanThreadStart {
 };
 
 DWORD WINAPI ScanThread(void* parameter) {
-    auto* start = static_cast<ScanThreadStart*>(parameter);
-    const HMODULE module = start->module;
-    try {
-        FileSystemFolderReader reader;
-        RunFolderScan(reader, *start->scan);
-        delete start; // the last holder of an abandoned scan frees it here
-    } catch (...) {
-        // Nothing leaves a thread of the library.
-    }
+    HMODULE module = nullptr;
+    {
+        const std::unique_ptr<ScanThreadStart> start(static_cast<ScanThreadStart*>(parameter));
+        module = start->module;
+        try {
+            FileSystemFolderReader reader;
+            RunFolderScan(reader, *start->scan);
+        } catch (...) {
+            // Nothing leaves a thread of the library.
+        }
+    } // the last holder of an abandoned scan frees it here, while the library is surely there
     FreeLibraryAndExitThread(module, 0);
 }
 
