@@ -316,9 +316,6 @@ void CMainFrame::OnFolderShown() {
         SetTimer(kTimerScan, kScanCountMs);
     } else {
         KillTimer(kTimerScan);
-        // The tree opens the start folder it kept closed while the folder was read.
-        if (CChildView* tree = GetFolderTree())
-            tree->OpenDeferredTarget();
         // What went wrong stays in the status bar; else it comes back to the count.
         m_strIdleMessage =
             m_folder.Problem().empty() ? DrawingCountText(m_folder.Count()) : m_folder.Problem();
@@ -357,7 +354,7 @@ void CMainFrame::FollowScan() {
         KillTimer(kTimerScan);
         return;
     }
-    // The scan's end tells the frame (OnFolderShown) and stops the timer.
+    // The scan's end tells the frame (OnFolderShown), which stops the timer.
     if (m_folder.TakeEndedScan())
         return;
     const std::string text = ScanningText(m_folder.ScanCount());

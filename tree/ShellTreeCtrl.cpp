@@ -321,11 +321,6 @@ void CShellTreeCtrl::OpenPathTargetLater() {
         PostMessage(WM_ORVEX_OPEN_TARGET);
 }
 
-void CShellTreeCtrl::OpenDeferredTarget() {
-    if (m_hOpenLater && m_hWnd)
-        PostMessage(WM_ORVEX_OPEN_TARGET);
-}
-
 void CShellTreeCtrl::WalkToStartLater() {
     PostMessage(WM_ORVEX_WALK_START);
 }
@@ -373,11 +368,11 @@ LRESULT CShellTreeCtrl::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
         WalkToStart();
         return 0;
     case WM_ORVEX_OPEN_TARGET: {
-        // Kept for the scan's end: filling the node reads the folder on this thread.
-        if (m_pFolder && m_pFolder->IsScanning())
-            return 0;
         HTREEITEM item = m_hOpenLater;
         m_hOpenLater = nullptr;
+        // Left closed: filling the node would read the folder being read again, on this thread.
+        if (m_pFolder && m_pFolder->IsScanning())
+            return 0;
         if (item && !m_bClosing)
             Expand(item, TVE_EXPAND);
         return 0;
@@ -434,9 +429,6 @@ void CShellTreeCtrl::RefreshCurrentFolder() {
 void CShellTreeCtrl::OnSelChanged(HTREEITEM item) {
     if (m_bClosing || !m_bFollowSelection || !item)
         return;
-    // The user went elsewhere while the start folder was read: it is not opened behind their back.
-    if (m_hOpenLater && item != m_hOpenLater && m_pFolder && m_pFolder->IsScanning())
-        m_hOpenLater = nullptr;
     ShowFolder(item);
     HighlightSelected(item);
     SetFocus();

@@ -14,7 +14,7 @@ folder() {
 }
 folder "$root/big" 60 big
 folder "$root/small" 2 small
-mkdir -p "$root/big/sub" # the tree opens big to show it, once big is read
+mkdir -p "$root/big/sub" # a quick folder would be opened in the tree to show it
 [ "$(find "$root" -name '*.dwg' | wc -l)" -eq 62 ] && pass "62 drawings in two folders" ||
   fail "generator: $(cat "$WORK/gen.err")"
 
@@ -61,9 +61,10 @@ expect_true "the status bar counts the folder's drawings at the end ($(texts | s
 # The tree's item big as the tree listed it after the marker MARK: "big [expanded] [selected] ...".
 big_item() { printf '%s\n' "$OUT" | sed -n "/^\[script\] $1\$/,\$p" |
              sed -n 's/^\[script\] tree-item [0-9]* \(big\( .*\)\?\)$/\1/p' | head -1; }
-expect_true "the tree keeps the folder being read closed: reading it for its sub-folders would hold the host ($(big_item tree-during))" \
+expect_true "the tree leaves the folder being read closed: reading it for its sub-folders would hold the host ($(big_item tree-during))" \
   test -n "$(big_item tree-during)" -a -z "$(big_item tree-during | grep expanded)"
-expect_true "and opens it once it is read ($(big_item tree-after))" has "$(big_item tree-after)" '^big expanded'
+expect_true "also once it is read: a folder slow to read is slow to open, the user opens it ($(big_item tree-after))" \
+  test -n "$(big_item tree-after)" -a -z "$(big_item tree-after | grep expanded)"
 expect_line "a double-click after the read picks its drawing" \
   "=> (\"$(lisppath "$root/big")\\\\big-13.dwg\" (\"\" \"\" \"\"))"
 
