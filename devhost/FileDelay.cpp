@@ -3,6 +3,7 @@
 #include "devhost/HostObjects.h"
 #include "devhost/ImportPatch.h"
 
+#include <cstdint>
 #include <cstdio>
 #include <cstring>
 #include <cwchar>
@@ -156,10 +157,85 @@ void FindSystemFunctions() {
     g_system.fread = reinterpret_cast<FreadFn>(reinterpret_cast<void*>(GetProcAddress(runtime, "fread")));
 }
 
+// The functions the library's import table held before (the system's, or --timing's watchers).
+using FindFirstExWFn = HANDLE(WINAPI*)(LPCWSTR, FINDEX_INFO_LEVELS, LPVOID, FINDEX_SEARCH_OPS, LPVOID, DWORD);
+using FindFirstWFn = HANDLE(WINAPI*)(LPCWSTR, LPWIN32_FIND_DATAW);
+using FindFirstAFn = HANDLE(WINAPI*)(LPCSTR, LPWIN32_FIND_DATAA);
+using FindNextWFn = BOOL(WINAPI*)(HANDLE, LPWIN32_FIND_DATAW);
+using FindNextAFn = BOOL(WINAPI*)(HANDLE, LPWIN32_FIND_DATAA);
+using RuntimeFindFirstFn = std::intptr_t(__cdecl*)(const char*, void*);
+using RuntimeFindNextFn = int(__cdecl*)(std::intptr_t, void*);
+
+struct ScanOriginals {
+    FindFirstExWFn findFirstExW = nullptr;
+    FindFirstWFn findFirstW = nullptr;
+    FindFirstAFn findFirstA = nullptr;
+    FindNextWFn findNextW = nullptr;
+    FindNextAFn findNextA = nullptr;
+    RuntimeFindFirstFn runtimeFindFirst = nullptr;
+    RuntimeFindNextFn runtimeFindNext = nullptr;
+};
+ScanOriginals g_scan;
+
+void ScanWait() {
+    Sleep(static_cast<DWORD>(Host().options.scanLatencyMs));
+}
+
+HANDLE WINAPI SlowFindFirstFileExW(LPCWSTR pattern, FINDEX_INFO_LEVELS level, LPVOID found,
+                                   FINDEX_SEARCH_OPS search, LPVOID filter, DWORD flags) {
+    ScanWait();
+    return g_scan.findFirstExW(pattern, level, found, search, filter, flags);
+}
+
+HANDLE WINAPI SlowFindFirstFileW(LPCWSTR pattern, LPWIN32_FIND_DATAW found) {
+    ScanWait();
+    return g_scan.findFirstW(pattern, found);
+}
+
+HANDLE WINAPI SlowFindFirstFileA(LPCSTR pattern, LPWIN32_FIND_DATAA found) {
+    ScanWait();
+    return g_scan.findFirstA(pattern, found);
+}
+
+BOOL WINAPI SlowFindNextFileW(HANDLE search, LPWIN32_FIND_DATAW found) {
+    ScanWait();
+    return g_scan.findNextW(search, found);
+}
+
+BOOL WINAPI SlowFindNextFileA(HANDLE search, LPWIN32_FIND_DATAA found) {
+    ScanWait();
+    return g_scan.findNextA(search, found);
+}
+
+std::intptr_t __cdecl SlowRuntimeFindFirst(const char* pattern, void* found) {
+    ScanWait();
+    return g_scan.runtimeFindFirst(pattern, found);
+}
+
+int __cdecl SlowRuntimeFindNext(std::intptr_t search, void* found) {
+    ScanWait();
+    return g_scan.runtimeFindNext(search, found);
+}
+
 } // namespace
 
 long DrawingFilesOpened() {
     return InterlockedCompareExchange(&g_drawingsOpened, 0, 0);
+}
+
+void ScanDelayWatch(HMODULE library) {
+    if (!library || Host().options.scanLatencyMs <= 0)
+        return;
+    Watch(library, "FindFirstFileExW", &SlowFindFirstFileExW, g_scan.findFirstExW);
+    Watch(library, "FindFirstFileW", &SlowFindFirstFileW, g_scan.findFirstW);
+    Watch(library, "FindFirstFileA", &SlowFindFirstFileA, g_scan.findFirstA);
+    Watch(library, "FindNextFileW", &SlowFindNextFileW, g_scan.findNextW);
+    Watch(library, "FindNextFileA", &SlowFindNextFileA, g_scan.findNextA);
+    // The runtime's search, under whichever of its names the build imports.
+    if (!Watch(library, "_findfirst64", &SlowRuntimeFindFirst, g_scan.runtimeFindFirst))
+        Watch(library, "_findfirst64i32", &SlowRuntimeFindFirst, g_scan.runtimeFindFirst);
+    if (!Watch(library, "_findnext64", &SlowRuntimeFindNext, g_scan.runtimeFindNext))
+        Watch(library, "_findnext64i32", &SlowRuntimeFindNext, g_scan.runtimeFindNext);
 }
 
 void FileDelayWatch(HMODULE module) {

@@ -17,4 +17,10 @@ void FileDelayWatch(HMODULE module);
 // How many drawing files the watched modules have opened since the process began, on any thread.
 long DrawingFilesOpened();
 
+// --scan-latency MS: every entry of a folder search the library makes (the first and each next one, the
+// system's wide and narrow searches and the runtime's) waits MS milliseconds first, on the thread that
+// searches, as a folder listed over a slow network. Nothing when the option is not given. Called after
+// the --timing watch, whose functions it calls through to.
+void ScanDelayWatch(HMODULE library);
+
 } // namespace devhost

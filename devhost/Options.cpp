@@ -10,6 +10,7 @@ const wchar_t* const kUsage =
     L"                   [--load FILE]... [--eval EXPR]... [--script FILE] [--verbose] [--timing] "
     L"[--timing-sent]\n"
     L"                   [--preview real|flat] [--file-latency MS] [--file-hang NAME]\n"
+    L"                   [--scan-latency MS]\n"
     L"                   [--check-heaps] [--resources] [--refuse-window CLASS-PREFIX]\n";
 
 namespace {
@@ -143,6 +144,15 @@ bool ParseOptions(const std::vector<std::wstring>& args, Options& options, std::
                 return false;
             }
             options.fileLatencyMs = static_cast<int>(number);
+        } else if (option == L"--scan-latency") {
+            long number = 0;
+            if (!value(text))
+                return false;
+            if (!ParseNumber(text, 0, 60000, number)) {
+                error = L"--scan-latency takes milliseconds from 0 to 60000, not " + text;
+                return false;
+            }
+            options.scanLatencyMs = static_cast<int>(number);
         } else if (option == L"--file-hang") {
             if (!value(options.fileHang))
                 return false;

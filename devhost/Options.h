@@ -34,6 +34,7 @@ struct Options {
     bool resources = false;    // print the process's GDI objects, windows, handles, threads after each call
     int fileLatencyMs = 0;     // added to every read of a drawing file, on the thread that reads
     std::wstring fileHang;     // reads of the drawing file of this name wait until the process ends
+    int scanLatencyMs = 0;     // added to every entry of the library's folder searches
     std::wstring refuseWindow; // top-level windows whose class begins with this are refused (a test aid)
     bool help = false;
 };

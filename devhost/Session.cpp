@@ -263,6 +263,7 @@ bool Session::LoadLibraryAndEntryPoints() {
         WriteLine(L"[host] loaded " + m_libraryPath);
     TimingWatchLibrary(m_library);
     FileDelayWatch(m_library);
+    ScanDelayWatch(m_library);
     FileDelayWatch(GetModuleHandleW(nullptr)); // the host's own preview operation reads drawings too
     return true;
 }

@@ -40,21 +40,46 @@ LONGLONG Now() {
     return now.QuadPart;
 }
 
+// The moment the outermost measuring began, while one goes on (0: none).
+LONGLONG g_measuringBegan = 0;
+int g_measuringDepth = 0;
+
+// Inside a measuring, the moment it began: its own time is left out of the lines it writes too, so a
+// line written after it never shows an earlier time than one written in it.
 double Elapsed() {
-    return static_cast<double>(Now() - g_start.QuadPart - g_overhead) * 1000.0 /
+    const LONGLONG now = g_measuringDepth > 0 ? g_measuringBegan : Now();
+    return static_cast<double>(now - g_start.QuadPart - g_overhead) * 1000.0 /
            static_cast<double>(g_frequency.QuadPart);
 }
 
+// Held while the user-interface thread measures and while another thread (the library's scan) takes its
+// time and writes its line: a time taken in the middle of a measuring would have that measuring's
+// overhead left in, and come out after a later line of the user-interface thread.
+struct LineOrder {
+    CRITICAL_SECTION section;
+    LineOrder() { InitializeCriticalSection(&section); }
+    ~LineOrder() { DeleteCriticalSection(&section); }
+};
+LineOrder g_lineOrder;
+
 // Adds the time from its construction to its destruction to the overhead.
+// Nested ones count once, from the outermost.
 class Overhead {
 public:
-    Overhead() : m_begin(Now()) {}
+    Overhead() {
+        EnterCriticalSection(&g_lineOrder.section);
+        if (g_measuringDepth++ == 0)
+            g_measuringBegan = Now();
+    }
     Overhead(const Overhead&) = delete;
     Overhead& operator=(const Overhead&) = delete;
-    ~Overhead() { g_overhead += Now() - m_begin; }
-
-private:
-    LONGLONG m_begin;
+    ~Overhead() {
+        if (--g_measuringDepth == 0) {
+            g_overhead += Now() - g_measuringBegan;
+            g_measuringBegan = 0;
+        }
+        LeaveCriticalSection(&g_lineOrder.section);
+    }
 };
 
 void Line(double ms, const std::wstring& what) {
@@ -252,6 +277,63 @@ int __cdecl TimedFindClose(std::intptr_t search) {
     return result;
 }
 
+// The folder scan's wide search. The pick's check of a name (FindFirstFileW) goes through FindNextFileW
+// and FindClose too: only the search FindFirstFileExW began is counted. The scan runs on a thread of the
+// library's own when it is slow: its lines take no part in the user-interface thread's overhead.
+using FindFirstExWFn = HANDLE(WINAPI*)(LPCWSTR, FINDEX_INFO_LEVELS, LPVOID, FINDEX_SEARCH_OPS, LPVOID, DWORD);
+using FindNextWFn = BOOL(WINAPI*)(HANDLE, LPWIN32_FIND_DATAW);
+using FindCloseWFn = BOOL(WINAPI*)(HANDLE);
+FindFirstExWFn g_findFirstExW = nullptr;
+FindNextWFn g_findNextW = nullptr;
+FindCloseWFn g_findCloseW = nullptr;
+HANDLE volatile g_wideScan = INVALID_HANDLE_VALUE;
+volatile LONG g_wideScanEntries = 0;
+
+void ScanLine(const std::wstring& what) {
+    if (!g_inCall)
+        return;
+    try {
+        if (GetCurrentThreadId() == g_uiThread) {
+            Overhead measuring;
+            Line(Elapsed(), what);
+        } else {
+            EnterCriticalSection(&g_lineOrder.section);
+            try {
+                Line(Elapsed(), what);
+            } catch (...) {
+            }
+            LeaveCriticalSection(&g_lineOrder.section);
+        }
+    } catch (...) {
+    }
+}
+
+HANDLE WINAPI TimedFindFirstFileExW(LPCWSTR pattern, FINDEX_INFO_LEVELS level, LPVOID found,
+                                    FINDEX_SEARCH_OPS search, LPVOID filter, DWORD flags) {
+    ScanLine(L"scan-begin " + std::wstring(pattern ? pattern : L""));
+    const HANDLE handle = g_findFirstExW(pattern, level, found, search, filter, flags);
+    InterlockedExchange(&g_wideScanEntries, handle != INVALID_HANDLE_VALUE ? 1 : 0);
+    g_wideScan = handle;
+    return handle;
+}
+
+BOOL WINAPI TimedFindNextFileW(HANDLE handle, LPWIN32_FIND_DATAW found) {
+    const BOOL result = g_findNextW(handle, found);
+    if (result && handle == g_wideScan)
+        InterlockedIncrement(&g_wideScanEntries);
+    return result;
+}
+
+BOOL WINAPI TimedFindCloseW(HANDLE handle) {
+    const bool scan = handle != INVALID_HANDLE_VALUE && handle == g_wideScan;
+    const BOOL result = g_findCloseW(handle);
+    if (scan) {
+        g_wideScan = INVALID_HANDLE_VALUE;
+        ScanLine(L"scan-end " + std::to_wstring(g_wideScanEntries) + L" entries");
+    }
+    return result;
+}
+
 using SetDIBitsToDeviceFn = int(WINAPI*)(HDC, int, int, DWORD, DWORD, int, int, UINT, UINT, const VOID*,
                                          const BITMAPINFO*, UINT);
 SetDIBitsToDeviceFn g_setDIBitsToDevice = nullptr;
@@ -388,6 +470,10 @@ void TimingWatchLibrary(HMODULE library) {
     if (!Watch(library, "_findnext64", &TimedFindNext, g_findNext))
         Watch(library, "_findnext64i32", &TimedFindNext, g_findNext);
     Watch(library, "_findclose", &TimedFindClose, g_findClose);
+    // The folder scan itself: the system's wide search.
+    Watch(library, "FindFirstFileExW", &TimedFindFirstFileExW, g_findFirstExW);
+    Watch(library, "FindNextFileW", &TimedFindNextFileW, g_findNextW);
+    Watch(library, "FindClose", &TimedFindCloseW, g_findCloseW);
     Watch(library, "SetDIBitsToDevice", &TimedSetDIBitsToDevice, g_setDIBitsToDevice);
 }
 

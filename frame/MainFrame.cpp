@@ -28,6 +28,9 @@ namespace {
 
 const UINT kIndicators[] = {ID_SEPARATOR, ID_INDICATOR_CAPS, ID_INDICATOR_NUM, ID_INDICATOR_SCRL};
 
+// The frame's timer that follows a slow scan.
+constexpr UINT_PTR kTimerScan = 1;
+
 constexpr int kSearchEditWidth = 125;
 constexpr int kLayerLabelExtra = 1000;
 // The grid keeps at least this width (half the frame when it is narrower) however wide the stored tree
@@ -122,6 +125,19 @@ std::string DrawingCountText(int count) {
     if (count <= 0)
         return "No drawings";
     return count == 1 ? "1 drawing" : std::to_string(count) + " drawings";
+}
+
+std::string ScanningText(int count) {
+    // The one character where the code page has it; the status bar is an ANSI window.
+    char ellipsis[8] = {};
+    BOOL usedDefault = FALSE;
+    const int n = ::WideCharToMultiByte(CP_ACP, WC_NO_BEST_FIT_CHARS, L"\u2026", 1, ellipsis, sizeof ellipsis,
+                                        nullptr, &usedDefault);
+    const std::string dots =
+        n > 0 && !usedDefault ? std::string(ellipsis, static_cast<std::size_t>(n)) : "...";
+    const std::string drawings =
+        count == 1 ? "1 drawing" : std::to_string(count < 0 ? 0 : count) + " drawings";
+    return "Reading the folder" + dots + " " + drawings;
 }
 
 std::string LayerLabelText(const std::string& folder) {
@@ -294,15 +310,66 @@ void CMainFrame::OnFolderShown() {
     if (m_pGridView && m_pGridView->m_hWnd)
         m_pGridView->Rebuild();
     UpdateLayerLabel();
-    // What went wrong stays in the status bar; else it comes back to the count.
-    m_strIdleMessage = m_folder.Problem().empty() ? DrawingCountText(m_folder.Count()) : m_folder.Problem();
+    if (m_folder.IsScanning()) {
+        // The host's thread does not wait for a slow folder: the count follows the scan from a timer.
+        m_strIdleMessage = ScanningText(m_folder.ScanCount());
+        SetTimer(kTimerScan, kScanCountMs);
+    } else {
+        KillTimer(kTimerScan);
+        // What went wrong stays in the status bar; else it comes back to the count.
+        m_strIdleMessage =
+            m_folder.Problem().empty() ? DrawingCountText(m_folder.Count()) : m_folder.Problem();
+    }
+    SetMessageText(m_strIdleMessage);
+    if (!m_folder.IsScanning() && !m_chooseAfterScan.name.empty()) {
+        const auto again = std::move(m_chooseAfterScan);
+        m_chooseAfterScan = {};
+        if (m_folder.IsRead() && m_folder.Folder() == again.folder && m_wndSearch.m_hWnd && m_pGridView) {
+            m_wndSearch.SetWindowText(again.searchText);
+            m_pGridView->ChooseDrawing(again.name);
+            // The search has its own message for the status bar: what went wrong is said last.
+            if (!m_folder.Problem().empty())
+                SetMessageText(m_folder.Problem());
+        }
+    }
+}
+
+void CMainFrame::ChooseAfterScan(const std::string& folder, const std::string& name,
+                                 const std::string& searchText) {
+    m_chooseAfterScan.folder = folder;
+    m_chooseAfterScan.name = name;
+    m_chooseAfterScan.searchText = searchText;
+}
+
+void CMainFrame::OnTimer(UINT_PTR id) {
+    if (id != kTimerScan) {
+        CFrameWnd::OnTimer(id);
+        return;
+    }
+    FollowScan();
+}
+
+void CMainFrame::FollowScan() {
+    if (!m_folder.IsScanning()) {
+        KillTimer(kTimerScan);
+        return;
+    }
+    // The scan's end tells the frame (OnFolderShown), which stops the timer.
+    if (m_folder.TakeEndedScan())
+        return;
+    const std::string text = ScanningText(m_folder.ScanCount());
+    if (text == m_strIdleMessage)
+        return;
+    m_strIdleMessage = text;
     SetMessageText(m_strIdleMessage);
 }
 
 std::string CMainFrame::FolderTitle() const {
     // A folder that could not be read is not open: the title does not name it (the status bar says why).
     // One refused for its length is still there, and the title, Path and ShellPath all name it.
-    if (!m_folder.Folder().empty() && !m_folder.IsRead() && FolderPathProblem(m_folder.Folder()).empty())
+    // One being read is named while its drawings are counted.
+    if (!m_folder.Folder().empty() && !m_folder.IsRead() && !m_folder.IsScanning() &&
+        FolderPathProblem(m_folder.Folder()).empty())
         return kExplorerTitle;
     return m_folder.Folder();
 }

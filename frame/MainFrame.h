@@ -103,12 +103,18 @@ public:
     // The frame's accelerators, but for the keys an edit box uses on its text while one has the focus.
     bool PreTranslateMessage(MSG* pMsg) override;
 
+    // The drawing of the last run, to be chosen again once the slow scan of the start folder has ended
+    // (as the application object chooses it at once after a quick one): its name starts the search
+    // (searchText) and it is selected. Only when the folder shown then is still folder.
+    void ChooseAfterScan(const std::string& folder, const std::string& name, const std::string& searchText);
+
     // How many drawings the folder shown holds, once one is shown: the status bar comes back to it.
     std::string GetIdleMessage() const override;
 
 protected:
     int OnCreate(LPCREATESTRUCTA cs) override;
     void OnDestroy() override;
+    void OnTimer(UINT_PTR id) override;
     bool OnCreateClient(LPCREATESTRUCTA cs, CCreateContext* context) override;
     bool OnCmdMsg(UINT id, int code) override;
     bool OnUpdateCmdUI(CCmdUI* pCmdUI) override;
@@ -128,6 +134,8 @@ private:
     // What the folder model says changed.
     void OnFolderShown();
     void OnDrawingChosen();
+    // While a slow scan goes on: its count in the status bar; its end shows the folder.
+    void FollowScan();
     // The title for the folder shown: its path, or the explorer's name when it does not exist or cannot
     // be reached.
     std::string FolderTitle() const;
@@ -166,6 +174,9 @@ private:
     CTessel3View* m_pGridView = nullptr; // the right pane
     CLeftView* m_pFolderPane = nullptr;  // the left pane
     std::string m_strIdleMessage;        // the status bar's resting text; empty: the framework's
+    struct {
+        std::string folder, name, searchText;
+    } m_chooseAfterScan; // the last run's drawing while the start folder is being read
 };
 
 // The one command of the folder tree's right-click menu.
@@ -191,3 +202,8 @@ std::string HelpFilePath();
 std::string LayerLabelText(const std::string& folder);
 // The status bar's count of the drawings a folder holds: "No drawings", "1 drawing", "12 drawings".
 std::string DrawingCountText(int count);
+// The status bar while a slow scan goes on: "Reading the folder… 12 drawings", the ellipsis as the
+// names' code page writes it ("..." where it has none).
+std::string ScanningText(int count);
+// How often the status bar's count follows a slow scan, in milliseconds.
+constexpr UINT kScanCountMs = 100;

@@ -185,7 +185,8 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
         frame->ShowWindow(SW_SHOWNORMAL);
     }
 
-    // 7. The start folder is scanned and laid out at the size the frame is shown at. The keyboard starts in
+    // 7. The start folder is scanned and laid out at the size the frame is shown at (a slow one goes on
+    // while the frame shows it being read, and is laid out when it ends). The keyboard starts in
     // the tree (which selects nothing of its own before its walk); then the frame is drawn. Nothing is
     // chosen yet.
     const std::string scanProblem = ShowStartFolder(*m_pFolder, call.startPath, doc->m_strPath);
@@ -199,7 +200,12 @@ bool CMdiMixin::CreateAndShow(CDialog* dialog, const ExplorerCall& call) {
     // takes it; when the folder no longer holds it, nothing is chosen.
     // Only in the folder it was chosen in: another folder's drawing of the same name is another drawing.
     CEditSearch& search = frame->GetSearchEdit();
-    if (search.m_hWnd && !saved.empty() && DrawingFolder::SameFolder(savedFolder, m_pFolder->Folder())) {
+    if (m_pFolder->IsScanning()) {
+        // A slow folder: chosen once it is read, unless the user went elsewhere meanwhile.
+        if (!saved.empty() && DrawingFolder::SameFolder(savedFolder, m_pFolder->Folder()))
+            frame->ChooseAfterScan(m_pFolder->Folder(), saved, SearchTextOf(saved));
+    } else if (search.m_hWnd && !saved.empty() &&
+               DrawingFolder::SameFolder(savedFolder, m_pFolder->Folder())) {
         search.SetWindowText(SearchTextOf(saved));
         if (CTessel3View* grid = frame->GetGridView())
             grid->ChooseDrawing(saved);

@@ -36,8 +36,28 @@ bool IsShareRoot(const std::string& text, const std::vector<std::size_t>& starts
 
 } // namespace
 
+void RunFolderScan(FolderReader& reader, FolderScan& scan) {
+    try {
+        scan.read = reader.Read(scan.folder, scan.drawings, scan.problem, scan.progress);
+    } catch (...) {
+        // Out of memory in a folder of millions: nothing of it is shown.
+        scan.read = false;
+        scan.drawings.clear();
+        scan.problem.clear();
+    }
+    scan.ended.store(true, std::memory_order_release);
+}
+
+void FolderReader::Start(const std::shared_ptr<FolderScan>& scan, unsigned) {
+    RunFolderScan(*this, *scan);
+}
+
 DrawingFolder::DrawingFolder(FolderReader& reader, CTessel3Doc* document)
     : m_reader(reader), m_pDocument(document) {}
+
+DrawingFolder::~DrawingFolder() {
+    AbandonScan();
+}
 
 std::string DrawingFolder::Spelling(const std::string& folder) {
     std::string text = folder;
@@ -71,25 +91,66 @@ bool DrawingFolder::SameFolder(const std::string& a, const std::string& b) {
 // ---- the folder shown ----------------------------------------------------------------------------------
 
 bool DrawingFolder::Show(const std::string& folder) {
-    // The same folder read again (F5, a file command): the drawing chosen stays chosen while it is there.
+    // The same folder read again (F5, a file command): the drawing chosen stays chosen while it is there,
+    // also when the read before this one had not ended yet.
     const std::string previous = m_strFolder;
-    const std::string chosen = ChosenName();
+    const std::string chosen = m_pScan ? m_strKeepChosen : ChosenName();
+    AbandonScan();
     m_strFolder = Spelling(folder);
     const std::string keep = SameFolder(previous, m_strFolder) ? chosen : std::string();
     m_strProblem.clear();
-    std::vector<DwgData> drawings;
-    bool read = false;
-    if (!m_strFolder.empty()) {
-        // The reader refuses a path the runtime's buffers cannot hold before anything uses it.
-        read = m_reader.Read(m_strFolder, drawings, m_strProblem);
-        if (read)
-            m_reader.MakeCurrentDirectory(m_strFolder);
-    }
     if (m_pDocument)
         m_pDocument->m_strPath = m_strFolder;
-    m_bRead = read;
-    Fill(std::move(drawings), keep);
-    return read;
+    if (m_strFolder.empty()) {
+        m_bRead = false;
+        Fill({});
+        return false;
+    }
+    // The reader refuses a path the runtime's buffers cannot hold before anything uses it.
+    auto scan = std::make_shared<FolderScan>(m_strFolder);
+    m_reader.Start(scan, kQuickScanMs);
+    if (scan->ended.load(std::memory_order_acquire)) {
+        Accept(*scan, keep);
+        return m_bRead;
+    }
+    // Shown as being read: nothing of the folder before stays in the list meanwhile.
+    m_pScan = std::move(scan);
+    m_strKeepChosen = keep;
+    m_bRead = false;
+    Fill({});
+    return false;
+}
+
+int DrawingFolder::ScanCount() const {
+    return m_pScan ? m_pScan->progress.found.load(std::memory_order_relaxed) : 0;
+}
+
+bool DrawingFolder::TakeEndedScan() {
+    if (!m_pScan || !m_pScan->ended.load(std::memory_order_acquire))
+        return false;
+    const std::shared_ptr<FolderScan> scan = std::move(m_pScan);
+    m_pScan.reset();
+    const std::string keep = std::move(m_strKeepChosen);
+    m_strKeepChosen.clear();
+    Accept(*scan, keep);
+    return true;
+}
+
+void DrawingFolder::Accept(FolderScan& scan, const std::string& keepChosen) {
+    m_strProblem = std::move(scan.problem);
+    m_bRead = scan.read;
+    // Set here, on the thread that shows: the host's preview operation opens bare names against it.
+    if (m_bRead)
+        m_reader.MakeCurrentDirectory(m_strFolder);
+    Fill(std::move(scan.drawings), keepChosen);
+}
+
+void DrawingFolder::AbandonScan() {
+    if (!m_pScan)
+        return;
+    m_pScan->progress.abandoned.store(true, std::memory_order_relaxed);
+    m_pScan.reset();
+    m_strKeepChosen.clear();
 }
 
 bool DrawingFolder::Refresh() {
@@ -101,6 +162,7 @@ bool DrawingFolder::Refresh() {
 }
 
 void DrawingFolder::ShowNoFolder() {
+    AbandonScan();
     m_strProblem.clear();
     Fill({});
 }

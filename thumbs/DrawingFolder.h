@@ -6,7 +6,10 @@
 //
 // Who writes what:
 // - Show (and Refresh, which shows the same folder again) is the only scan: it alone fills the drawing
-//   list, changes the process's current directory and writes the document's folder (`Path`).
+//   list, changes the process's current directory and writes the document's folder (`Path`). A scan that
+//   has not ended within kQuickScanMs goes on on a thread of its own: the list stays empty meanwhile
+//   (IsScanning, ScanCount), and TakeEndedScan, on this thread, fills it once the scan has ended. A later
+//   Show, ShowNoFolder or the model's end abandons it: its result is never shown.
 // - Choose and ChooseNone alone change the chosen drawing, and with it the document's `Name`.
 // - The selection flags of the records are set and cleared through Select, Deselect, SelectAll,
 //   DeselectAll and SelectFirstStartingWith; sorting goes through Sort.
@@ -20,29 +23,67 @@
 
 #include "thumbs/DwgList.h"
 
+#include <atomic>
 #include <functional>
+#include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 class CTessel3Doc;
 
+// What the thread that reads a folder and the thread that shows it share while the read goes on.
+struct ScanProgress {
+    // Set by the thread that shows: the read stops at its next entry, and its result is dropped.
+    std::atomic<bool> abandoned{false};
+    // Drawings taken so far, written by the reader: the status bar counts them.
+    std::atomic<int> found{0};
+};
+
+// One read of a folder, shared by the thread that reads it and the one that shows it; whoever lets go
+// last frees it. The result is written by the reading thread only, before `ended` is set, and read by
+// the showing thread only after it has seen `ended`.
+struct FolderScan {
+    explicit FolderScan(std::string folderToRead) : folder(std::move(folderToRead)) {}
+    const std::string folder;
+    ScanProgress progress;
+    std::atomic<bool> ended{false};
+    bool read = false;
+    std::vector<DwgData> drawings;
+    std::string problem;
+};
+
 // How a folder's drawings are listed and how a folder becomes the process's current directory: the
-// runtime's file search in the library, lists in memory in the tests.
+// system's file search in the library, lists in memory in the tests.
 class FolderReader {
 public:
     virtual ~FolderReader() = default;
     // Lists folder's drawings by the scan's rules (AcceptScanEntry), in the file system's order. False
-    // when the folder could not be read. problem receives what the user should be told (a refused path,
-    // files left out), or stays empty.
-    virtual bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem) = 0;
+    // when the folder could not be read, or when progress says it was abandoned. problem receives what
+    // the user should be told (a refused path, files left out), or stays empty. May run on any thread.
+    virtual bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem,
+                      ScanProgress& progress) = 0;
     // Makes folder the process's current directory: the host's preview operation opens bare names.
     virtual void MakeCurrentDirectory(const std::string& folder) = 0;
+    // Reads scan's folder (Read) and sets its `ended`; returns once it has ended or waitMs have passed,
+    // whichever comes first. This one reads on the caller's thread; the library's reads on a thread of
+    // its own.
+    virtual void Start(const std::shared_ptr<FolderScan>& scan, unsigned waitMs);
 };
+
+// Runs the reader's Read for scan and sets `ended`, whatever happens (nothing is thrown out of it).
+void RunFolderScan(FolderReader& reader, FolderScan& scan);
 
 class DrawingFolder {
 public:
     // document may be null (nothing is kept between runs then).
+    // How long Show waits for a scan before the explorer shows the folder as being read.
+    static constexpr unsigned kQuickScanMs = 150;
+
+    // document may be null (nothing is kept between runs then).
     DrawingFolder(FolderReader& reader, CTessel3Doc* document);
+    // A scan still going on is abandoned.
+    ~DrawingFolder();
     DrawingFolder(const DrawingFolder&) = delete;
     DrawingFolder& operator=(const DrawingFolder&) = delete;
 
@@ -54,8 +95,17 @@ public:
     // Reads folder and shows it: the list holds its drawings (unsorted), nothing is chosen or selected,
     // the folder becomes the current directory and the document's folder. A folder that cannot be read
     // is still the folder shown, with an empty list; the current directory stays where it was. True
-    // when the folder was read.
+    // when the folder was read. A scan that takes longer than kQuickScanMs is left running: the folder
+    // is the one shown, with an empty list, IsScanning is true and Show returns false; TakeEndedScan
+    // shows its drawings later. A scan still going on from before is abandoned.
     bool Show(const std::string& folder);
+    // Whether a scan of the folder shown is still going on.
+    bool IsScanning() const { return m_pScan != nullptr; }
+    // The drawings the scan going on has found so far (0 when none goes on).
+    int ScanCount() const;
+    // When the scan going on has ended, shows its result as Show would have (onShown is told) and
+    // returns true; else false. Called on the thread that shows, from its timer.
+    bool TakeEndedScan();
     // Reads the folder shown again (after a file command, or F5).
     bool Refresh();
     // Shows no folder (the tree's Desktop or My Computer): an empty list, nothing chosen; the folder, the
@@ -114,6 +164,8 @@ public:
 
 private:
     // keepChosen: the name of a drawing that stays chosen (and selected) if it is still there.
+    void Accept(FolderScan& scan, const std::string& keepChosen = std::string());
+    void AbandonScan();
     void Fill(std::vector<DwgData>&& drawings, const std::string& keepChosen = std::string());
     void TellShown();
     void TellChosen();
@@ -124,13 +176,20 @@ private:
     std::string m_strProblem;
     bool m_bRead = false;
     int m_nChosen = -1;
+    std::shared_ptr<FolderScan> m_pScan; // the scan going on, shared with its thread
+    std::string m_strKeepChosen;         // the drawing chosen again when that scan ends (F5 during it)
 };
 
 #ifdef _WIN32
-// The runtime's file search, and SetCurrentDirectory.
+// The system's file search, and SetCurrentDirectory. Start reads on a thread of its own that holds its
+// own reference on the library: a scan left running when the call returns (a million files, a share that
+// stopped answering) ends by itself, at its next entry, and cannot run code that was unloaded. The
+// reader keeps nothing of a scan: it may go before the scans it started.
 class FileSystemFolderReader : public FolderReader {
 public:
-    bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem) override;
+    bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem,
+              ScanProgress& progress) override;
     void MakeCurrentDirectory(const std::string& folder) override;
+    void Start(const std::shared_ptr<FolderScan>& scan, unsigned waitMs) override;
 };
 #endif

@@ -1,47 +1,18 @@
-// The folder scan over the runtime library's file search, and the pick's check of a name (Windows only).
+// The folder scan over the system's wide file search, its thread, and the pick's check of a name
+// (Windows only).
 #include "thumbs/DrawingFolder.h"
 #include "thumbs/DwgList.h"
 #include "thumbs/NameFold.h"
 
-#include <cerrno>
+#include <cstdint>
 #include <windows.h>
 
-#include <io.h>
-
+#include <memory>
 #include <string>
 #include <utility>
 #include <vector>
 
 namespace {
-
-// Closes the search handle however the scan ends.
-class FindHandle {
-public:
-    explicit FindHandle(intptr_t handle) : m_handle(handle) {}
-    FindHandle(const FindHandle&) = delete;
-    FindHandle& operator=(const FindHandle&) = delete;
-    ~FindHandle() {
-        if (m_handle != -1)
-            _findclose(m_handle);
-    }
-    intptr_t get() const { return m_handle; }
-
-private:
-    intptr_t m_handle;
-};
-
-DwgFindEntry EntryOf(const struct __finddata64_t& found) {
-    DwgFindEntry entry;
-    entry.name = found.name;
-    entry.isDirectory = (found.attrib & _A_SUBDIR) != 0;
-    entry.timeWrite = found.time_write;
-    entry.size = static_cast<std::uint64_t>(found.size);
-    return entry;
-}
-
-bool IsReadableEntry(const std::string& folder, const char* name) {
-    return ::GetFileAttributesA(DrawingFolder::Join(folder, name).c_str()) != INVALID_FILE_ATTRIBUTES;
-}
 
 std::wstring Widened(const std::string& text) {
     const int n = ::MultiByteToWideChar(CP_ACP, 0, text.data(), static_cast<int>(text.size()), nullptr, 0);
@@ -77,6 +48,12 @@ public:
 private:
     HANDLE m_handle;
 };
+
+// Whether the entry's attributes can be read by its name in the code page, as its preview would be opened.
+bool IsReadableEntry(const std::string& folder, const wchar_t* name) {
+    return ::GetFileAttributesA(DrawingFolder::Join(folder, Narrowed(name)).c_str()) !=
+           INVALID_FILE_ATTRIBUTES;
+}
 
 } // namespace
 
@@ -121,8 +98,64 @@ PickedName CheckPickedName(const std::string& folder, const std::string& name) {
     return listed == 1 ? PickedName::Exact : PickedName::Missing;
 }
 
+namespace {
+
+// Seconds since 1970 from a file time, as the runtime's file search gives its write time.
+std::int64_t SecondsSince1970(const FILETIME& time) {
+    constexpr std::int64_t kTicksPerSecond = 10000000;
+    constexpr std::int64_t kTicksTo1970 = 116444736000000000LL;
+    const std::int64_t ticks = static_cast<std::int64_t>(
+        (static_cast<std::uint64_t>(time.dwHighDateTime) << 32) | time.dwLowDateTime);
+    return (ticks - kTicksTo1970) / kTicksPerSecond;
+}
+
+// The entry in the names' code page. A name that does not come back from its narrow form is kept as the
+// narrow search gave it (the code page's best fit): it shows, and the pick says why it cannot be taken.
+DwgFindEntry EntryOf(const WIN32_FIND_DATAW& found) {
+    DwgFindEntry entry;
+    entry.name = Narrowed(found.cFileName);
+    entry.isDirectory = (found.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
+    entry.timeWrite = SecondsSince1970(found.ftLastWriteTime);
+    // The 64-bit size: a 32-bit one turns a file of 2 GiB and more into a negative or wrong size.
+    entry.size = (static_cast<std::uint64_t>(found.nFileSizeHigh) << 32) | found.nFileSizeLow;
+    return entry;
+}
+
+// The wide search, without the short names and in large reads where the system offers them.
+HANDLE FindFirst(const std::wstring& pattern, WIN32_FIND_DATAW& found) {
+    HANDLE search = ::FindFirstFileExW(pattern.c_str(), FindExInfoBasic, &found, FindExSearchNameMatch,
+                                       nullptr, FIND_FIRST_EX_LARGE_FETCH);
+    if (search == INVALID_HANDLE_VALUE && ::GetLastError() == ERROR_INVALID_PARAMETER)
+        search =
+            ::FindFirstFileExW(pattern.c_str(), FindExInfoBasic, &found, FindExSearchNameMatch, nullptr, 0);
+    return search;
+}
+
+// The scan as the thread of its own runs it; the module reference is given back as the thread ends.
+struct ScanThreadStart {
+    std::shared_ptr<FolderScan> scan;
+    HMODULE module;
+};
+
+DWORD WINAPI ScanThread(void* parameter) {
+    HMODULE module = nullptr;
+    {
+        const std::unique_ptr<ScanThreadStart> start(static_cast<ScanThreadStart*>(parameter));
+        module = start->module;
+        try {
+            FileSystemFolderReader reader;
+            RunFolderScan(reader, *start->scan);
+        } catch (...) {
+            // Nothing leaves a thread of the library.
+        }
+    } // the last holder of an abandoned scan frees it here, while the library is surely there
+    FreeLibraryAndExitThread(module, 0);
+}
+
+} // namespace
+
 bool FileSystemFolderReader::Read(const std::string& folder, std::vector<DwgData>& drawings,
-                                  std::string& problem) {
+                                  std::string& problem, ScanProgress& progress) {
     drawings.clear();
     problem.clear();
     if (folder.empty())
@@ -132,42 +165,75 @@ bool FileSystemFolderReader::Read(const std::string& folder, std::vector<DwgData
         problem = std::move(refused);
         return false;
     }
-    std::string pattern = DrawingFolder::Join(folder, "*");
-    // The 64-bit size: a 32-bit one turns a file of 2 GiB and more into a negative or wrong size.
-    struct __finddata64_t found;
-    FindHandle search(_findfirst64(pattern.c_str(), &found));
-    if (search.get() == -1) {
-        const int findError = errno;
+    const std::wstring pattern = Widened(DrawingFolder::Join(folder, "*"));
+    WIN32_FIND_DATAW found;
+    WideFindHandle search(FindFirst(pattern, found));
+    if (search.get() == INVALID_HANDLE_VALUE) {
+        const DWORD findError = ::GetLastError();
         const DWORD attributes = ::GetFileAttributesA(folder.c_str());
         const DWORD error = ::GetLastError();
         const bool isFolder =
             attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY);
         // A drive's root without a single entry lists nothing, not even "." and "..": read, and empty.
-        if (isFolder && findError == ENOENT)
+        if (isFolder && (findError == ERROR_FILE_NOT_FOUND || findError == ERROR_NO_MORE_FILES))
             return true;
         if (isFolder)
-            problem = UnreadableFolderMessage(folder, false, findError == EACCES ? ERROR_ACCESS_DENIED : 0);
+            problem = UnreadableFolderMessage(folder, false,
+                                              findError == ERROR_ACCESS_DENIED ? ERROR_ACCESS_DENIED : 0);
         else
             problem = UnreadableFolderMessage(folder, attributes != INVALID_FILE_ATTRIBUTES, error);
         return false;
     }
     int tooLong = 0;
     do {
+        // Left between two entries: a million files are not read to the end for nothing.
+        if (progress.abandoned.load(std::memory_order_relaxed)) {
+            drawings.clear();
+            return false;
+        }
         DwgFindEntry entry = EntryOf(found);
         if (!AcceptScanEntry(entry, kDrawingNeedle))
             continue;
         // A pipe or a socket shows as an empty file whose attributes cannot be read (under Wine): it is
         // no drawing, and opening it for its preview could wait for a writer for good.
-        if (entry.size == 0 && !entry.isDirectory && !IsReadableEntry(folder, found.name))
+        if (entry.size == 0 && !entry.isDirectory && !IsReadableEntry(folder, found.cFileName))
             continue;
         if (!FullPathFits(folder, entry.name)) {
             ++tooLong; // its preview could not be opened by its name
             continue;
         }
         drawings.emplace_back(std::move(entry));
-    } while (_findnext64(search.get(), &found) == 0);
+        progress.found.store(static_cast<int>(drawings.size()), std::memory_order_relaxed);
+    } while (::FindNextFileW(search.get(), &found));
     problem = SkippedFilesMessage(tooLong);
     return true;
+}
+
+void FileSystemFolderReader::Start(const std::shared_ptr<FolderScan>& scan, unsigned waitMs) {
+    HMODULE module = nullptr;
+    if (!::GetModuleHandleExW(GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS,
+                              reinterpret_cast<LPCWSTR>(reinterpret_cast<void*>(&ScanThread)), &module)) {
+        RunFolderScan(*this, *scan);
+        return;
+    }
+    ScanThreadStart* start = nullptr;
+    try {
+        start = new ScanThreadStart{scan, module};
+    } catch (...) {
+        ::FreeLibrary(module);
+        RunFolderScan(*this, *scan);
+        return;
+    }
+    HANDLE thread = ::CreateThread(nullptr, 0, &ScanThread, start, 0, nullptr);
+    if (!thread) {
+        delete start;
+        ::FreeLibrary(module);
+        RunFolderScan(*this, *scan);
+        return;
+    }
+    // The thread goes on by itself past the wait; its handle is not kept.
+    ::WaitForSingleObject(thread, waitMs);
+    ::CloseHandle(thread);
 }
 
 void FileSystemFolderReader::MakeCurrentDirectory(const std::string& folder) {

@@ -409,6 +409,9 @@ LRESULT CShellTreeCtrl::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
     case WM_ORVEX_OPEN_TARGET: {
         HTREEITEM item = m_hOpenLater;
         m_hOpenLater = nullptr;
+        // Left closed: filling the node would read the folder being read again, on this thread.
+        if (m_pFolder && m_pFolder->IsScanning())
+            return 0;
         if (item && !m_bClosing)
             Expand(item, TVE_EXPAND);
         return 0;

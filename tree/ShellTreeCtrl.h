@@ -65,7 +65,10 @@ public:
     // Expands the path target once the messages queued now have been handled. The explorer opens with
     // its start folder closed and has it opened so: filling it means reading the whole folder for its
     // sub-folders (the better part of a second for 100,000 drawings under Wine), which the first
-    // pictures need not wait for. Nothing happens when the node has gone meanwhile.
+    // pictures need not wait for. Nothing happens when the node has gone meanwhile. A node whose folder
+    // the folder model is still reading on its scan's thread is left closed: filling it would read that
+    // folder again on the host's thread (seconds for a million files, Escape waiting), and a folder slow
+    // to read is slow to open; the user opens it.
     void OpenPathTargetLater();
     // The walk the explorer makes when it opens, once the messages queued now have been handled: the grid
     // shows the start folder by its path first, and the tree follows. Expands the nodes along the

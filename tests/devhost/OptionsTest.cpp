@@ -71,6 +71,8 @@ TEST(Options, EveryOption) {
     EXPECT_EQ(Parse({L"--file-latency", L"20"}).fileLatencyMs, 20);
     EXPECT_TRUE(Parse({}).fileHang.empty());
     EXPECT_EQ(Parse({L"--file-hang", L"b.dwg"}).fileHang, L"b.dwg");
+    EXPECT_EQ(Parse({}).scanLatencyMs, 0);
+    EXPECT_EQ(Parse({L"--scan-latency", L"50"}).scanLatencyMs, 50);
 }
 
 TEST(Options, FileDelaysRefused) {
@@ -80,6 +82,9 @@ TEST(Options, FileDelaysRefused) {
               L"--file-latency takes milliseconds from 0 to 60000, not 60001");
     EXPECT_EQ(Error({L"--file-latency"}), L"--file-latency needs a value");
     EXPECT_EQ(Error({L"--file-hang", L""}), L"--file-hang needs a file name");
+    EXPECT_EQ(Error({L"--scan-latency", L"60001"}),
+              L"--scan-latency takes milliseconds from 0 to 60000, not 60001");
+    EXPECT_EQ(Error({L"--scan-latency"}), L"--scan-latency needs a value");
 }
 
 TEST(Options, BadUsage) {

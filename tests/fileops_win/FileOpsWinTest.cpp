@@ -131,7 +131,7 @@ std::vector<std::string> DialogAnswer::s_seen;
 struct ListedFolder : FolderReader {
     std::vector<std::string> names;
     DrawingFolder folder{*this, nullptr};
-    bool Read(const std::string&, std::vector<DwgData>& drawings, std::string&) override {
+    bool Read(const std::string&, std::vector<DwgData>& drawings, std::string&, ScanProgress&) override {
         for (const std::string& name : names) {
             DwgFindEntry entry;
             entry.name = name;

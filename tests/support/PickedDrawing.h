@@ -21,7 +21,7 @@ public:
     const DrawingFolder& Folder() const { return m_folder; }
 
 private:
-    bool Read(const std::string&, std::vector<DwgData>& drawings, std::string&) override {
+    bool Read(const std::string&, std::vector<DwgData>& drawings, std::string&, ScanProgress&) override {
         drawings.clear();
         if (!m_name.empty()) {
             DwgFindEntry entry;

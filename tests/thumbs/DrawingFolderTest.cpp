@@ -7,6 +7,8 @@
 #include <algorithm>
 
 #include <map>
+#include <memory>
+#include <new>
 #include <string>
 #include <vector>
 
@@ -19,7 +21,8 @@ struct MemoryReader : FolderReader {
     std::vector<std::string> reads;
     std::vector<std::string> currentDirectories;
 
-    bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem) override {
+    bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem,
+              ScanProgress& progress) override {
         reads.push_back(folder);
         if (auto said = problems.find(folder); said != problems.end())
             problem = said->second;
@@ -268,4 +271,138 @@ TEST(DrawingFolderSameFolder, CaseAndASeparatorAtTheEndAside) {
     EXPECT_TRUE(DrawingFolder::SameFolder("C:\\", "c:"));
     EXPECT_FALSE(DrawingFolder::SameFolder("C:\\dwg", "C:\\dwg2"));
     EXPECT_FALSE(DrawingFolder::SameFolder("", ""));
+}
+
+// ---- a scan that takes long --------------------------------------------------------------------------
+
+namespace {
+
+// A reader whose scans go on until the test ends them, as a thread of its own would.
+struct SlowReader : MemoryReader {
+    std::vector<std::shared_ptr<FolderScan>> started;
+    std::vector<unsigned> waits;
+
+    void Start(const std::shared_ptr<FolderScan>& scan, unsigned waitMs) override {
+        started.push_back(scan);
+        waits.push_back(waitMs);
+    }
+    // The scan's thread reaches its end: the folder's drawings as Read gives them.
+    void End(std::size_t index) { RunFolderScan(*this, *started.at(index)); }
+};
+
+class SlowScanTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        reader.folders["C:\\big"] = {Drawing("x.dwg"), Drawing("y.dwg")};
+        reader.folders["C:\\small"] = {Drawing("s.dwg")};
+        folder.onShown = [this] { ++shown; };
+    }
+    void TearDown() override { BeginScan(); }
+
+    SlowReader reader;
+    CTessel3Doc doc{std::string()};
+    DrawingFolder folder{reader, &doc};
+    int shown = 0;
+};
+
+} // namespace
+
+TEST_F(SlowScanTest, AScanNotEndedWithinTheWaitShowsTheFolderEmptyWhileItIsRead) {
+    EXPECT_FALSE(folder.Show("C:\\big\\"));
+    ASSERT_EQ(reader.started.size(), 1u);
+    EXPECT_EQ(reader.waits[0], DrawingFolder::kQuickScanMs);
+    EXPECT_EQ(reader.started[0]->folder, "C:\\big");
+    EXPECT_TRUE(folder.IsScanning());
+    EXPECT_FALSE(folder.IsRead());
+    EXPECT_EQ(folder.Folder(), "C:\\big");
+    EXPECT_EQ(doc.m_strPath, "C:\\big");
+    EXPECT_EQ(folder.Count(), 0);
+    EXPECT_EQ(shown, 1); // the frame shows it being read
+    EXPECT_TRUE(reader.currentDirectories.empty());
+    EXPECT_FALSE(folder.TakeEndedScan());
+}
+
+TEST_F(SlowScanTest, TheCountFollowsTheReaderAndTheEndFillsTheListOnTheShowingThread) {
+    folder.Show("C:\\big");
+    reader.started[0]->progress.found = 1;
+    EXPECT_EQ(folder.ScanCount(), 1);
+    reader.End(0);
+    EXPECT_EQ(shown, 1); // nothing happens on the reading thread
+    EXPECT_TRUE(folder.TakeEndedScan());
+    EXPECT_FALSE(folder.IsScanning());
+    EXPECT_TRUE(folder.IsRead());
+    EXPECT_EQ(folder.ScanCount(), 0);
+    ASSERT_EQ(folder.Count(), 2);
+    EXPECT_EQ(folder.Drawing(1).m_strName, "y.dwg");
+    EXPECT_EQ(reader.currentDirectories, std::vector<std::string>{"C:\\big"});
+    EXPECT_EQ(shown, 2);
+    EXPECT_FALSE(folder.TakeEndedScan()); // taken once
+}
+
+TEST_F(SlowScanTest, AFolderThatCannotBeReadSaysSoWhenItsScanEnds) {
+    reader.problems["C:\\gone"] = "The folder cannot be read: C:\\gone does not exist";
+    folder.Show("C:\\gone");
+    reader.End(0);
+    EXPECT_TRUE(folder.TakeEndedScan());
+    EXPECT_FALSE(folder.IsRead());
+    EXPECT_EQ(folder.Problem(), "The folder cannot be read: C:\\gone does not exist");
+    EXPECT_TRUE(reader.currentDirectories.empty());
+}
+
+TEST_F(SlowScanTest, AnotherFolderShownDuringAScanAbandonsItAndItsResultIsNeverShown) {
+    folder.Show("C:\\big");
+    folder.Show("C:\\small");
+    ASSERT_EQ(reader.started.size(), 2u);
+    EXPECT_TRUE(reader.started[0]->progress.abandoned);
+    EXPECT_FALSE(reader.started[1]->progress.abandoned);
+    reader.End(0); // the first one's thread reaches its end all the same
+    EXPECT_FALSE(folder.TakeEndedScan());
+    EXPECT_EQ(folder.Count(), 0);
+    reader.End(1);
+    EXPECT_TRUE(folder.TakeEndedScan());
+    ASSERT_EQ(folder.Count(), 1);
+    EXPECT_EQ(folder.Drawing(0).m_strName, "s.dwg");
+    EXPECT_EQ(folder.Folder(), "C:\\small");
+    EXPECT_EQ(reader.currentDirectories, std::vector<std::string>{"C:\\small"});
+}
+
+TEST_F(SlowScanTest, NoFolderShownAndTheModelsEndAbandonTheScan) {
+    folder.Show("C:\\big");
+    folder.ShowNoFolder();
+    EXPECT_TRUE(reader.started[0]->progress.abandoned);
+    EXPECT_FALSE(folder.IsScanning());
+    std::shared_ptr<FolderScan> left;
+    {
+        DrawingFolder other(reader, nullptr);
+        other.Show("C:\\small");
+        left = reader.started.back();
+        EXPECT_FALSE(left->progress.abandoned);
+    }
+    EXPECT_TRUE(left->progress.abandoned);
+}
+
+TEST_F(SlowScanTest, RefreshDuringAScanReadsTheFolderAgain) {
+    folder.Show("C:\\big");
+    folder.Refresh();
+    ASSERT_EQ(reader.started.size(), 2u);
+    EXPECT_TRUE(reader.started[0]->progress.abandoned);
+    EXPECT_EQ(reader.started[1]->folder, "C:\\big");
+}
+
+TEST(FolderScanRun, AReaderThatThrowsEndsTheScanUnread) {
+    struct Throwing : FolderReader {
+        bool Read(const std::string&, std::vector<DwgData>& drawings, std::string& problem,
+                  ScanProgress&) override {
+            drawings.push_back(DwgData());
+            problem = "half";
+            throw std::bad_alloc();
+        }
+        void MakeCurrentDirectory(const std::string&) override {}
+    } reader;
+    FolderScan scan("C:\\x");
+    RunFolderScan(reader, scan);
+    EXPECT_TRUE(scan.ended);
+    EXPECT_FALSE(scan.read);
+    EXPECT_TRUE(scan.drawings.empty());
+    EXPECT_TRUE(scan.problem.empty());
 }

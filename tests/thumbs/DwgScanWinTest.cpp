@@ -2,15 +2,20 @@
 // model with the runtime's file search.
 #include "thumbs/DrawingFolder.h"
 #include "thumbs/DwgList.h"
+#include "thumbs/NameFold.h"
 
 #include "tests/support/TempFolder.h"
 
 #include <windows.h>
 
+#include <io.h>
+#include <tlhelp32.h>
+
 #include <gtest/gtest.h>
 
 #include <algorithm>
 #include <cstdint>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -270,4 +275,191 @@ TEST(PickedName, LettersOfTheCodePageOutsideAsciiAreExact) {
     ASSERT_EQ(ScanFolderPath(folder.Dir().c_str(), ".dwg"), 1);
     ASSERT_EQ(DwgList.GetSize(), 1);
     EXPECT_EQ(CheckPickedName(folder.Dir(), DwgList[0].m_strName), PickedName::Exact) << DwgList[0].m_strName;
+}
+
+// ---- the wide search, its count, its stop and its thread ---------------------------------------------
+
+namespace {
+
+// The scan's rules over the runtime's narrow search, as the folder was read before the wide search.
+std::vector<DwgData> NarrowSearch(const std::string& folder) {
+    std::vector<DwgData> drawings;
+    struct __finddata64_t found;
+    const intptr_t search = _findfirst64((folder + "\\*").c_str(), &found);
+    if (search == -1)
+        return drawings;
+    do {
+        DwgFindEntry entry;
+        entry.name = found.name;
+        entry.isDirectory = (found.attrib & _A_SUBDIR) != 0;
+        entry.timeWrite = found.time_write;
+        entry.size = static_cast<std::uint64_t>(found.size);
+        if (AcceptScanEntry(entry, kDrawingNeedle))
+            drawings.emplace_back(std::move(entry));
+    } while (_findnext64(search, &found) == 0);
+    _findclose(search);
+    return drawings;
+}
+
+std::vector<std::string> Described(const std::vector<DwgData>& drawings) {
+    std::vector<std::string> lines;
+    for (const DwgData& d : drawings)
+        lines.push_back(d.m_strName + " " + std::to_string(d.m_nSize) + " " + std::to_string(d.m_timeWrite));
+    return lines;
+}
+
+// Threads of this process now.
+int ThreadCount() {
+    HANDLE snapshot = CreateToolhelp32Snapshot(TH32CS_SNAPTHREAD, 0);
+    if (snapshot == INVALID_HANDLE_VALUE)
+        return -1;
+    THREADENTRY32 entry{};
+    entry.dwSize = sizeof entry;
+    int count = 0;
+    for (BOOL more = Thread32First(snapshot, &entry); more; more = Thread32Next(snapshot, &entry))
+        if (entry.th32OwnerProcessID == GetCurrentProcessId())
+            ++count;
+    CloseHandle(snapshot);
+    return count;
+}
+
+// The handles this process holds now, as the system lists them (GetProcessHandleCount says 0 under Wine).
+int HandleCount() {
+    struct Entry {
+        ULONG process;
+        UCHAR type;
+        UCHAR flags;
+        USHORT handle;
+        PVOID object;
+        ACCESS_MASK access;
+    };
+    struct Handles {
+        ULONG count;
+        Entry entries[1];
+    };
+    using QueryFn = LONG(NTAPI*)(ULONG, PVOID, ULONG, PULONG);
+    const auto query = reinterpret_cast<QueryFn>(
+        reinterpret_cast<void*>(GetProcAddress(GetModuleHandleW(L"ntdll.dll"), "NtQuerySystemInformation")));
+    constexpr ULONG kSystemHandleInformation = 16;
+    std::vector<char> buffer(8 << 20);
+    ULONG length = 0;
+    if (!query ||
+        query(kSystemHandleInformation, buffer.data(), static_cast<ULONG>(buffer.size()), &length) != 0)
+        return -1;
+    const auto* handles = reinterpret_cast<const Handles*>(buffer.data());
+    int count = 0;
+    for (ULONG i = 0; i < handles->count; ++i)
+        if (handles->entries[i].process == GetCurrentProcessId())
+            ++count;
+    return count;
+}
+
+// Waits up to ms for the scan's end.
+bool EndsWithin(const FolderScan& scan, int ms) {
+    for (int waited = 0; waited < ms; waited += 5) {
+        if (scan.ended.load())
+            return true;
+        Sleep(5);
+    }
+    return scan.ended.load();
+}
+
+// Waits up to ms for the process's threads to come back to count.
+bool ThreadsBackTo(int count, int ms) {
+    for (int waited = 0; waited < ms; waited += 10) {
+        if (ThreadCount() == count)
+            return true;
+        Sleep(10);
+    }
+    return ThreadCount() == count;
+}
+
+} // namespace
+
+TEST(DwgScanWin, TheWideSearchListsWhatTheRuntimesNarrowSearchListed) {
+    TempFolder folder;
+    folder.Write("Plan-1.DWG", std::string(10, 'x'));
+    folder.Write("b.dwg.bak", std::string(20, 'x'));
+    folder.Write("notes.txt", "x");
+    folder.MakeDir("x.dwg");
+    folder.MakeDir(".x.dwg");
+    ASSERT_TRUE(WriteWide(folder, L"caf\u00e9.dwg"));
+    ASSERT_TRUE(WriteWide(folder, L"\u0447\u0435\u0440\u0442.dwg")); // '?' where the code page lacks them
+    ASSERT_TRUE(WriteWide(folder, L"\u56f3\u8868\u4e00\u89a7.dwg"));
+    ASSERT_TRUE(MakeSparseFile(folder.File("big.dwg"), 5ULL << 30));
+    FileSystemFolderReader reader;
+    std::vector<DwgData> drawings;
+    std::string problem;
+    ScanProgress progress;
+    ASSERT_TRUE(reader.Read(folder.Dir(), drawings, problem, progress));
+    EXPECT_EQ(problem, "");
+    // The same names, sizes, write times and order (the file system's) as the narrow search gave.
+    EXPECT_EQ(Described(drawings), Described(NarrowSearch(folder.Dir())));
+    EXPECT_EQ(drawings.size(), 7u);
+    EXPECT_EQ(progress.found.load(), 7); // the count the status bar shows
+}
+
+TEST(DwgScanWin, JapaneseNamesComeOutInTheCodePagesBytes) {
+    const std::wstring name = L"\u56f3\u8868\u4e00\u89a7-\u30bd\u30d5\u30c8.dwg"; // 図表一覧-ソフト
+    if (!CodePageHolds(name))
+        GTEST_SKIP() << "this system's code page (" << GetACP() << ") lacks the test's letters";
+    TempFolder folder;
+    ASSERT_TRUE(WriteWide(folder, name));
+    ASSERT_EQ(ScanFolderPath(folder.Dir().c_str(), ".dwg"), 1);
+    ASSERT_EQ(DwgList.GetSize(), 1);
+    char narrow[64] = {};
+    WideCharToMultiByte(CP_ACP, 0, name.c_str(), -1, narrow, sizeof narrow, nullptr, nullptr);
+    std::string folded = narrow;
+    FoldNameInPlace(folded);
+    EXPECT_EQ(DwgList[0].m_strName, folded);
+    EXPECT_EQ(CheckPickedName(folder.Dir(), DwgList[0].m_strName), PickedName::Exact);
+}
+
+TEST(DwgScanWin, AnAbandonedReadStopsAtItsNextEntryAndListsNothing) {
+    TempFolder folder;
+    for (int i = 0; i < 20; ++i)
+        folder.Write("d" + std::to_string(i) + ".dwg", "AC1018");
+    FileSystemFolderReader reader;
+    std::vector<DwgData> drawings;
+    std::string problem;
+    ScanProgress progress;
+    progress.abandoned = true;
+    EXPECT_FALSE(reader.Read(folder.Dir(), drawings, problem, progress));
+    EXPECT_TRUE(drawings.empty());
+    EXPECT_EQ(progress.found.load(), 0);
+}
+
+TEST(DwgScanWin, StartReadsOnAThreadOfItsOwnThatEndsAndLeavesNoHandle) {
+    TempFolder folder;
+    for (int i = 0; i < 300; ++i)
+        folder.Write("d" + std::to_string(i) + ".dwg", "AC1018");
+    FileSystemFolderReader reader;
+    const int threads = ThreadCount();
+    const int handlesBefore = HandleCount();
+    ASSERT_GT(handlesBefore, 0);
+
+    // Waited for: it has ended when Start returns.
+    auto waited = std::make_shared<FolderScan>(folder.Dir());
+    reader.Start(waited, 10000);
+    ASSERT_TRUE(waited->ended.load());
+    EXPECT_TRUE(waited->read);
+    EXPECT_EQ(waited->drawings.size(), 300u);
+
+    // Not waited for: it goes on after Start returns and ends by itself.
+    auto left = std::make_shared<FolderScan>(folder.Dir());
+    reader.Start(left, 0);
+    ASSERT_TRUE(EndsWithin(*left, 20000));
+    EXPECT_TRUE(left->read);
+    EXPECT_EQ(Described(left->drawings), Described(waited->drawings));
+
+    // Abandoned: its thread reads nothing more and ends.
+    auto abandoned = std::make_shared<FolderScan>(folder.Dir());
+    abandoned->progress.abandoned = true;
+    reader.Start(abandoned, 0);
+    ASSERT_TRUE(EndsWithin(*abandoned, 20000));
+    EXPECT_FALSE(abandoned->read);
+    EXPECT_TRUE(abandoned->drawings.empty());
+
+    EXPECT_TRUE(ThreadsBackTo(threads, 5000)) << "threads before " << threads << ", now " << ThreadCount();
+    EXPECT_EQ(HandleCount(), handlesBefore); // no thread or search handle stays open
 }

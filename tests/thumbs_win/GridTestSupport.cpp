@@ -216,9 +216,10 @@ struct BenchReader : FolderReader {
     bool real = false;
     FileSystemFolderReader files;
 
-    bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem) override {
+    bool Read(const std::string& folder, std::vector<DwgData>& drawings, std::string& problem,
+              ScanProgress& progress) override {
         if (real)
-            return files.Read(folder, drawings, problem);
+            return files.Read(folder, drawings, problem, progress);
         for (int i = 0; i < count; ++i) {
             DwgFindEntry e;
             char name[32];
