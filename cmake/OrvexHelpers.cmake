@@ -42,6 +42,22 @@ function(orvex_gtest name)
   endif()
 endfunction()
 
+# orvex_test_in_locales(NAME ja_JP=932 ...)  -- the Windows test program NAME again under Wine in each
+# locale given (LOCALE=CODE-PAGE), as test NAME_cpCODE-PAGE: Wine takes the ANSI code page from the locale.
+function(orvex_test_in_locales name)
+  if(NOT WIN32)
+    return()
+  endif()
+  foreach(pair ${ARGN})
+    string(REPLACE "=" ";" _parts ${pair})
+    list(GET _parts 0 _locale)
+    list(GET _parts 1 _cp)
+    add_test(NAME ${name}_cp${_cp} COMMAND ${CMAKE_CROSSCOMPILING_EMULATOR} $<TARGET_FILE:${name}>)
+    set_tests_properties(${name}_cp${_cp} PROPERTIES
+      ENVIRONMENT "LANG=${_locale}.UTF-8;LC_ALL=${_locale}.UTF-8" RESOURCE_LOCK wine_desktop)
+  endforeach()
+endfunction()
+
 # orvex_fuzz_target(NAME SOURCES f.cpp LIBS lib)  -- only in the fuzz preset (clang, libFuzzer).
 function(orvex_fuzz_target name)
   if(NOT ORVEX_FUZZ OR WIN32)

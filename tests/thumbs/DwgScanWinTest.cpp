@@ -4,12 +4,12 @@
 #include "thumbs/DwgList.h"
 #include "thumbs/NameFold.h"
 
+#include "tests/support/ProcessResources.h"
 #include "tests/support/TempFolder.h"
 
 #include <windows.h>
 
 #include <io.h>
-#include <tlhelp32.h>
 
 #include <gtest/gtest.h>
 
@@ -308,52 +308,6 @@ std::vector<std::string> Described(const std::vector<DwgData>& drawings) {
     return lines;
 }
 
-// Threads of this process now.
-int ThreadCount() {
-    HANDLE snapshot = CreateToolhelp32Snapshot(TH32CS_SNAPTHREAD, 0);
-    if (snapshot == INVALID_HANDLE_VALUE)
-        return -1;
-    THREADENTRY32 entry{};
-    entry.dwSize = sizeof entry;
-    int count = 0;
-    for (BOOL more = Thread32First(snapshot, &entry); more; more = Thread32Next(snapshot, &entry))
-        if (entry.th32OwnerProcessID == GetCurrentProcessId())
-            ++count;
-    CloseHandle(snapshot);
-    return count;
-}
-
-// The handles this process holds now, as the system lists them (GetProcessHandleCount says 0 under Wine).
-int HandleCount() {
-    struct Entry {
-        ULONG process;
-        UCHAR type;
-        UCHAR flags;
-        USHORT handle;
-        PVOID object;
-        ACCESS_MASK access;
-    };
-    struct Handles {
-        ULONG count;
-        Entry entries[1];
-    };
-    using QueryFn = LONG(NTAPI*)(ULONG, PVOID, ULONG, PULONG);
-    const auto query = reinterpret_cast<QueryFn>(
-        reinterpret_cast<void*>(GetProcAddress(GetModuleHandleW(L"ntdll.dll"), "NtQuerySystemInformation")));
-    constexpr ULONG kSystemHandleInformation = 16;
-    std::vector<char> buffer(8 << 20);
-    ULONG length = 0;
-    if (!query ||
-        query(kSystemHandleInformation, buffer.data(), static_cast<ULONG>(buffer.size()), &length) != 0)
-        return -1;
-    const auto* handles = reinterpret_cast<const Handles*>(buffer.data());
-    int count = 0;
-    for (ULONG i = 0; i < handles->count; ++i)
-        if (handles->entries[i].process == GetCurrentProcessId())
-            ++count;
-    return count;
-}
-
 // Waits up to ms for the scan's end.
 bool EndsWithin(const FolderScan& scan, int ms) {
     for (int waited = 0; waited < ms; waited += 5) {
@@ -365,13 +319,13 @@ bool EndsWithin(const FolderScan& scan, int ms) {
 }
 
 // Waits up to ms for the process's threads to come back to count.
-bool ThreadsBackTo(int count, int ms) {
+bool ThreadsBackTo(long count, int ms) {
     for (int waited = 0; waited < ms; waited += 10) {
-        if (ThreadCount() == count)
+        if (testsupport::CountThreads() == count)
             return true;
         Sleep(10);
     }
-    return ThreadCount() == count;
+    return testsupport::CountThreads() == count;
 }
 
 } // namespace
@@ -434,8 +388,8 @@ TEST(DwgScanWin, StartReadsOnAThreadOfItsOwnThatEndsAndLeavesNoHandle) {
     for (int i = 0; i < 300; ++i)
         folder.Write("d" + std::to_string(i) + ".dwg", "AC1018");
     FileSystemFolderReader reader;
-    const int threads = ThreadCount();
-    const int handlesBefore = HandleCount();
+    const long threads = testsupport::CountThreads();
+    const long handlesBefore = testsupport::CountHandles();
     ASSERT_GT(handlesBefore, 0);
 
     // Waited for: it has ended when Start returns.
@@ -460,6 +414,7 @@ TEST(DwgScanWin, StartReadsOnAThreadOfItsOwnThatEndsAndLeavesNoHandle) {
     EXPECT_FALSE(abandoned->read);
     EXPECT_TRUE(abandoned->drawings.empty());
 
-    EXPECT_TRUE(ThreadsBackTo(threads, 5000)) << "threads before " << threads << ", now " << ThreadCount();
-    EXPECT_EQ(HandleCount(), handlesBefore); // no thread or search handle stays open
+    EXPECT_TRUE(ThreadsBackTo(threads, 5000))
+        << "threads before " << threads << ", now " << testsupport::CountThreads();
+    EXPECT_EQ(testsupport::CountHandles(), handlesBefore); // no thread or search handle stays open
 }
