@@ -26,7 +26,10 @@ child_win=$(winpath "$child")
 tree='class=SysTreeView32'
 settings="$WORK/lib/Orvex1.ini"
 ini_value() { tr -d '\r' <"$settings" 2>/dev/null | sed -n "s/^$1=//p"; }
-run() { devhost --script "$(winpath "$WORK/script.txt")" --eval "$1"; }
+run() {
+  devhost --script "$(winpath "$WORK/script.txt")" --eval "$1"
+  expect_host_usable "$1"
+}
 call_at() { printf '(Orvex 1 2 "%s\\\\" "Insert" "Close")' "$(lisppath "$1")"; }
 shot() { printf 'screenshot contains="orvexlong" nth=0 %s' "$(winpath "$WORK/$1")"; }
 texts() { sed -n 's/^\[script\] text //p' <<<"$OUT"; }
@@ -54,12 +57,14 @@ grep -q "cannot be read: its path is" <<<"$status" && pass "the status bar says 
   fail "ShellPath: $(ini_value ShellPath)"
 
 # 3. Opened again with no start folder: the saved one, refused again, and still named by all.
-script_with_host_checks "tree-count $tree at-least=5 timeout=30000" 'sleep 1500' \
+# The walk to the saved folder may take a while on a loaded machine: wait for the title to name it.
+script_with_host_checks "tree-count $tree at-least=5 timeout=30000" 'wait contains="orvexlong" timeout=30000' 'sleep 1000' \
   'text contains="orvexlong" nth=0' 'text class=msctls_statusbar32' "$(shot refused-at-start.png)" 'key escape'
 run '(Orvex 1 2 "" "Insert" "Close")'
 title=$(texts | sed -n 1p | sed 's/\\\\/\\/g')
 status=$(texts | sed -n 2p)
-[ "$title" == "$child_win" ] && pass "opened on the saved folder, the title names it" || fail "title at start: $title"
+[ "$title" == "$child_win" ] && pass "opened on the saved folder, the title names it" || {
+  fail "title at start: $title"; printf '%s\n' "$OUT" | grep -E '^\[script\]|^=>' | tail -12; }
 grep -q "cannot be read: its path is" <<<"$status" && pass "and the status bar says why" || fail "status at start: $status"
 [ "$(ini_value Path)" == "$child_win" ] && [ "$(ini_value ShellPath)" == "$label\\$child_name" ] &&
   pass "Path and ShellPath still name it" || fail "Path: $(ini_value Path); ShellPath: $(ini_value ShellPath)"
